@@ -1,0 +1,36 @@
+// The engine's input system: pointer and key listeners. Key codes are Windows virtual-key codes
+// (0xC0 is the console key); characters are code points of the 16-bit range.
+#pragma once
+#include "qor_interfaces.h"
+#include "qor_math.h"
+
+class IPointerListener {
+public:
+    virtual void on_button_down(unsigned /*_button*/) {} // 0 left, 1 right, 2 middle
+    virtual void on_button_up(unsigned /*_button*/) {}
+    virtual void on_button_repeat(int /*_button*/) {}
+    virtual void on_pointer_move(vec2_t const & /*_movement*/) {} // relative, in screen pixels
+    virtual void on_wheel(float /*_rotation*/) {} // notches, positive away from the user
+
+protected:
+    virtual ~IPointerListener() {}
+};
+
+class IKeyListener {
+public:
+    virtual void on_key_down(unsigned /*_key*/, unsigned /*_extra*/) {}
+    virtual void on_key_up(unsigned /*_key*/) {}
+    virtual void on_key_repeat(int /*_key*/) {}
+    virtual void on_char(unsigned /*_code*/) {}
+
+protected:
+    virtual ~IKeyListener() {}
+};
+
+class IInputSystem : public IInterfaceBase {
+public:
+    virtual void add_pointer_listener(IPointerListener *_p_listener) = 0;
+    virtual void remove_pointer_listener(IPointerListener *_p_listener) = 0;
+    virtual void add_key_listener(IKeyListener *_p_listener) = 0;
+    virtual void remove_key_listener(IKeyListener *_p_listener) = 0;
+};

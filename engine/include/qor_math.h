@@ -1,0 +1,35 @@
+// The engine's small math types that cross module boundaries: texture coordinates, movements and
+// device positions (vec2_t), and vertex colours (rgba_t). Global namespace, as the engine has them.
+#pragma once
+
+struct vec2_t {
+    float x;
+    float y;
+};
+
+// Four bytes r, g, b, a, each 0 to 255.
+class rgba_t {
+public:
+    unsigned char r, g, b, a;
+
+    rgba_t() : r(0), g(0), b(0), a(0) {}
+    rgba_t(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a)
+        : r(_r), g(_g), b(_b), a(_a) {}
+
+    // Each byte times _f, clamped to 0 .. 255 and truncated.
+    rgba_t operator*(float _f) const {
+        return rgba_t(scale(r, _f), scale(g, _f), scale(b, _f), scale(a, _f));
+    }
+    bool operator==(rgba_t const &_o) const {
+        return r == _o.r && g == _o.g && b == _o.b && a == _o.a;
+    }
+    bool operator!=(rgba_t const &_o) const { return !(*this == _o); }
+
+private:
+    static unsigned char scale(unsigned char _c, float _f) {
+        float v = _c * _f;
+        if (!(v > 0.0f)) return 0; // also catches NaN
+        if (v >= 255.0f) return 255;
+        return static_cast<unsigned char>(v);
+    }
+};

@@ -1,0 +1,46 @@
+// The platform layer: the few operating-system calls the engine and the library were written
+// against (tick count, performance counter, module loading, message box), as thin Linux functions.
+#pragma once
+#include <cstdint>
+
+namespace qorplatform {
+
+// Milliseconds of a monotonic clock, 32-bit, wrapping after about 49.7 days.
+uint32_t get_tick_count();
+// Nanoseconds of a monotonic clock; the frequency is 1e9 counts per second.
+int64_t query_performance_counter();
+int64_t query_performance_frequency();
+
+// A clock that replaces the system's: tests set the time themselves, so fades, double clicks
+// and blinks are exact. Null restores the system clock.
+struct IClock {
+    virtual ~IClock() {}
+    virtual uint32_t tick_count() = 0;        // ms
+    virtual int64_t performance_counter() = 0; // ns
+};
+void set_clock(IClock *_p_clock);
+
+// A clock that only moves when told to; a convenience for tests and replayed input.
+class CManualClock : public IClock {
+public:
+    explicit CManualClock(uint32_t _start_ms = 1000) : m_ms(_start_ms), m_ns(int64_t(_start_ms) * 1000000) {}
+    uint32_t tick_count() override { return m_ms; }
+    int64_t performance_counter() override { return m_ns; }
+    void advance_ms(uint32_t _ms) { m_ms += _ms; m_ns += int64_t(_ms) * 1000000; }
+    void advance_ns(int64_t _ns) { m_ns += _ns; m_ms = uint32_t(m_ns / 1000000); }
+
+private:
+    uint32_t m_ms;
+    int64_t m_ns;
+};
+
+// dlopen / dlsym / dlclose. Null on failure; last_module_error() tells why.
+void *load_library(char const *_file_name);
+void *get_proc_address(void *_module, char const *_name);
+void free_library(void *_module);
+char const *last_module_error();
+
+// The message box of a desktop system: here the caption and text go to stderr.
+void message_box(char const *_text, char const *_caption);
+
+} // namespace qorplatform

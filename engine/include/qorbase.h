@@ -1,0 +1,140 @@
+// qorbase: the engine's configuration (the GDF registry) and its virtual file system.
+//
+// The GDF file is INI-like: "[section]" lines, then "key = value" lines; "; " and "# " start a
+// comment line. Values are text; get_int and get_vec2 parse them ("20, 30" for a vec2).
+// set_vec2 changes the value in memory and marks the file; the file is written back once at
+// process end (or by qorbase::flush_gdf), through a temporary file and a rename, so it is never
+// left half-written.
+//
+// File categories select root folders: 2 (stats output), 5 (configuration), 8 (fonts),
+// 16 (interface data). The host sets them; by default all are the current directory.
+#pragma once
+#include "qor_math.h"
+
+class IConfigValue {
+public:
+    virtual vec2_t get_vec2(float _default_x, float _default_y) = 0;
+    virtual int get_int(int _default_value) = 0;
+    // Owned by the value; valid until the value changes or its file is closed.
+    virtual char const *get_string(char const *_default_value) = 0;
+    virtual void set_vec2(float _x, float _y) = 0;
+    // Not used by the UI library:
+    virtual void set_string(char const *_value) = 0;
+    virtual bool has_content() const = 0;
+
+protected:
+    virtual ~IConfigValue() {}
+};
+
+class IConfigSection {
+public:
+    // With _create true a missing key is added without content; otherwise null.
+    virtual IConfigValue *get_value(char const *_name, bool _create) = 0;
+
+protected:
+    virtual ~IConfigSection() {}
+};
+
+class IConfigFile {
+public:
+    // Null when there's no section of that name.
+    virtual IConfigSection *get_section(char const *_name) = 0;
+    // With _destroy true the object is deleted; don't touch it afterwards.
+    virtual void close(bool _destroy) = 0;
+
+protected:
+    virtual ~IConfigFile() {}
+};
+
+class IGDFRegistry {
+public:
+    virtual IConfigFile *get_config() = 0;
+
+protected:
+    virtual ~IGDFRegistry() {}
+};
+
+// A stream over one file. m_size is the file's size in bytes.
+class IFileReader {
+public:
+    unsigned m_size = 0;
+
+    virtual ~IFileReader() {}
+    virtual void seek(unsigned _position) = 0;
+    // Result: bytes read, fewer at the end of the file.
+    virtual unsigned read(unsigned _count, void *_p_buffer) = 0;
+};
+
+class IFileSystem {
+public:
+    // Result: the file's size, 0 when there's none. *_pp_content takes the content, allocated
+    // with MMAllocate; the caller frees it with MMDeallocate. The caller sets *_pp_content to null
+    // first; null after the call means the file couldn't be read. With a null _pp_content and
+    // _quiet true the call only tests whether the file exists. Without _quiet, a missing file is
+    // reported with qordebug::warning.
+    virtual unsigned load_file(int _category, char const *_path, void **_pp_content, bool _quiet) = 0;
+    // Writes through a temporary file and a rename; folders are created as needed.
+    virtual void save_file(int _category, char const *_path, void const *_p_data, unsigned _size,
+                           int _reserved) = 0;
+    // One line to the engine's log (the installed log sink, stdout by default).
+    virtual void log(char const *_format, ...) __attribute__((format(printf, 2, 3))) = 0;
+    // Null when the file can't be opened. The caller deletes the reader.
+    virtual IFileReader *open_file(int _category, char const *_path) = 0;
+
+protected:
+    virtual ~IFileSystem() {}
+};
+
+IGDFRegistry *GetGDFRegistry();
+IFileSystem *GetFileSystem();
+// Parses a configuration file of the GDF format from the category's folder; null when it can't
+// be read. Close it with close(true).
+IConfigFile *ReadConfigFile(int _category, char const *_file_name, int _reserved);
+
+// A buffered reader over an IFileReader, used by the UI library's loaders. The engine provides
+// the cache buffer; the reader itself belongs to the UI library.
+class CCachedFileReader {
+public:
+    CCachedFileReader(IFileReader *_p_fr, bool _owns_reader);
+    ~CCachedFileReader();
+    CCachedFileReader(CCachedFileReader const &) = delete;
+    CCachedFileReader &operator=(CCachedFileReader const &) = delete;
+
+    // True when all _count bytes were delivered; a short read leaves what was copied.
+    bool read(void *_p_dst, unsigned _count);
+
+    // The engine's cache buffers: *_pp_buffer and *_p_size (above 0) on success.
+    static bool cache_create(void **_pp_buffer, unsigned *_p_size);
+    static void cache_release(void *_p_buffer);
+
+private:
+    bool m_owns_reader;
+    IFileReader *mp_reader;
+    void *mp_cache;
+    unsigned m_cache_start;
+    unsigned m_cache_size;
+    unsigned m_cache_filled;
+    unsigned m_pos;
+};
+
+namespace qorbase {
+
+enum { FILE_CATEGORY_STATS = 2, FILE_CATEGORY_CONFIG = 5, FILE_CATEGORY_FONTS = 8, FILE_CATEGORY_UI = 16 };
+
+// The GDF file that GetGDFRegistry reads at its first use, and from then on writes back.
+// Setting a new path drops the loaded registry (after writing back pending changes).
+void set_gdf_path(char const *_path);
+// Writes pending set_vec2 changes now, atomically. Also runs at process end.
+void flush_gdf();
+
+// The folder of a category ("" for the current directory). Unknown categories map to "".
+void set_category_root(int _category, char const *_folder);
+char const *get_category_root(int _category);
+// Full path of a file in a category; result in _p_out, truncated to _size.
+void make_path(int _category, char const *_path, char *_p_out, unsigned _size);
+
+// Where IFileSystem::log writes; null restores stdout.
+typedef void (*log_sink_t)(char const *_line, void *_user);
+void set_log_sink(log_sink_t _sink, void *_user);
+
+} // namespace qorbase

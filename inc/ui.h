@@ -1,0 +1,82 @@
+// The user-interface service: the one object the engine talks to. It owns the desktop and the
+// stats pages, receives the engine's input through two listeners and forwards it to the desktop,
+// and draws the start-up plaque.
+//
+//   construction        RegisterInterface makes one static CUserInterface
+//   lifecycle           init, update, draw, shutdown
+//   input               the pointer and key listeners
+//   stats pages         create_stats_page and the getters
+#pragma once
+#include "qor_memory.h"
+#include "ui_interfaces.h"
+
+#include "qor_input.h"
+
+namespace qorui {
+
+class CStatsPage;
+
+class CUserInterface : public IUserInterface, public IPointerListener, public IKeyListener {
+public:
+    CUserInterface();
+    virtual ~CUserInterface();
+    CUserInterface(CUserInterface const &) = delete;
+    CUserInterface &operator=(CUserInterface const &) = delete;
+
+    SInterfaceUID get_uid() const override { return qor_uid::USER_INTERFACE; }
+    int get_version() const override { return 1; }
+
+    // Lifecycle
+    void init(bool _hide_console) override;
+    void shutdown() override;
+    void update(int _time) override;
+    void draw() override;
+
+    IConsole *get_console() override;
+    CDesktop *get_desktop() override { return mp_desktop; }
+    void on_app_activate(bool _active) override;
+    unsigned short const *get_local_string(char const *_key) override;
+    char const *get_local_key(unsigned short const *_text) override;
+    // The desktop's size over the screen's; 1.0 without a desktop.
+    float get_scale_w() override;
+    float get_scale_h() override;
+    bool get_hide_console() override { return m_hide_console; }
+    void *get_reserved() override { return mp_reserved; }
+
+    // Stats pages
+    IStatsPage *create_stats_page(char const *_name) override;
+    unsigned get_stats_pages_count() override;
+    IStatsPage *get_stats_page(unsigned _idx) override;
+    IStatsPage *get_stats_page(char const *_name) override;
+    IStatsPage *get_current_stats_page() override;
+
+    // Input from the engine
+    void on_button_down(unsigned _button) override;
+    void on_button_up(unsigned _button) override;
+    void on_pointer_move(vec2_t const &_movement) override;
+    void on_wheel(float _rotation) override;
+    void on_key_down(unsigned _key, unsigned _extra) override;
+    void on_key_up(unsigned _key) override;
+    void on_char(unsigned _code) override;
+
+    // The screen size read at init, in real pixels.
+    int get_screen_w() const { return m_scr_w; }
+    int get_screen_h() const { return m_scr_h; }
+
+private:
+    void draw_plaque();
+    void read_screen_size();
+    void load_game_library();
+    void register_commands();
+    void unregister_commands();
+
+    CDesktop *mp_desktop;  // owned
+    CConsole *mp_console;  // a child of the desktop, owned by the window tree
+    void *mp_reserved;     // only the constructor writes it
+    qor_vector<CStatsPage *> m_stats_pages; // in order of creation; owned
+    int m_scr_w;           // "scr_resx" at init
+    int m_scr_h;           // "scr_resy" at init
+    bool m_hide_console;   // the argument of init
+};
+
+} // namespace qorui

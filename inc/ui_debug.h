@@ -1,0 +1,15 @@
+// Contract checks of the library. A broken contract is reported through qordebug::assert_func
+// with the expression, file, line and function; the caller then steps aside with its neutral
+// result:  if (!QOR_CHECK(p_child)) return;
+#pragma once
+
+namespace qorui {
+void report_contract(char const *_expression, char const *_message, char const *_file, int _line,
+                     char const *_function);
+} // namespace qorui
+
+#define QOR_CHECK(_expr)                                                                             \
+    ((_expr) ? true : (::qorui::report_contract(#_expr, nullptr, __FILE__, __LINE__, __func__), false))
+
+#define QOR_CHECK_MSG(_expr, _message)                                                               \
+    ((_expr) ? true : (::qorui::report_contract(#_expr, _message, __FILE__, __LINE__, __func__), false))

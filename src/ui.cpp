@@ -1,0 +1,276 @@
+// The user-interface service.
+//
+//   RegisterInterface   the library's entry point
+//   construction
+//   lifecycle           init (and its steps), update, draw, shutdown
+//   input               the listeners
+//   stats pages
+//   configuration       config_section
+#include "ui.h"
+
+#include "engine_interfaces.h"
+#include "qor_commands.h"
+#include "qor_render.h"
+#include "qorbase.h"
+#include "qordebug.h"
+#include "ui_debug.h"
+#include "ui_stats_page.h"
+#include "ui_time_profiler.h"
+
+#include <cstring>
+
+namespace qorui {
+
+namespace {
+
+// The two characters that the console key types.
+unsigned const k_console_char = 0x60;
+unsigned const k_console_char_shifted = 0x7E;
+
+char const k_default_plaque[] = "ui_init_plaque.tga";
+char const k_no_library[] = "no_lib";
+
+CTimeProfiler *gp_time_profiler = nullptr;
+CUserInterface *gp_user_interface = nullptr;
+
+// The section of the engine's configuration, with the contracts on the way there.
+IConfigSection *config_section(char const *_name) {
+    IGDFRegistry *p_registry = GetGDFRegistry();
+    IConfigFile *p_cfg = p_registry ? p_registry->get_config() : nullptr;
+    if (!QOR_CHECK(p_cfg)) return nullptr;
+    IConfigSection *p_sect = p_cfg->get_section(_name);
+    if (!QOR_CHECK(p_sect)) return nullptr;
+    return p_sect;
+}
+
+// The commands of the service; their work needs the desktop and its layouts.
+void cmd_ui_export(char const *_arguments, void *_user) {
+    if (!_user || !_arguments) return;
+    qordebug::warning("Command '%s' needs the desktop, which this build of the library does not make yet",
+                      "ui_export");
+}
+
+void cmd_ui_import(char const *_arguments, void *_user) {
+    if (!_user || !_arguments) return;
+    qordebug::warning("Command '%s' needs the desktop, which this build of the library does not make yet",
+                      "ui_import");
+}
+
+void cmd_print_stats_page(char const *, void *_user) {
+    if (!_user) return;
+    qordebug::warning("Command '%s' needs the stats pages' log output, which this build of the library "
+                      "does not have yet",
+                      "print_stats_page");
+}
+
+struct SCommand {
+    char const *mp_name;
+    command_callback_t mp_callback;
+};
+SCommand const k_commands[] = {
+    {"ui_export", cmd_ui_export},
+    {"ui_import", cmd_ui_import},
+    {"print_stats_page", cmd_print_stats_page},
+};
+
+} // namespace
+
+// ---------------------------------------------------------------------------------------------
+// RegisterInterface
+// ---------------------------------------------------------------------------------------------
+} // namespace qorui
+
+// Builds the time profiler and the service at the first call and registers both on the server;
+// a later call registers the same two objects again. The service does its work at init.
+extern "C" __attribute__((visibility("default"))) int RegisterInterface(IInterfaceServer *_p_server) {
+    using namespace qorui;
+    if (!QOR_CHECK(_p_server)) return -1;
+    static CTimeProfiler s_time_profiler;
+    gp_time_profiler = &s_time_profiler;
+    _p_server->register_interface(gp_time_profiler);
+    static CUserInterface s_user_interface;
+    gp_user_interface = &s_user_interface;
+    int const result = _p_server->register_interface(gp_user_interface);
+    g_interface_server = _p_server;
+    return result;
+}
+
+namespace qorui {
+
+// ---------------------------------------------------------------------------------------------
+// Construction
+// ---------------------------------------------------------------------------------------------
+
+// Touches neither the engine nor the server.
+CUserInterface::CUserInterface()
+    : mp_desktop(nullptr), mp_console(nullptr), mp_reserved(nullptr), m_scr_w(0), m_scr_h(0),
+      m_hide_console(false) {}
+
+CUserInterface::~CUserInterface() {
+    while (!m_stats_pages.empty()) {
+        delete m_stats_pages.back();
+        m_stats_pages.pop_back();
+    }
+}
+
+// ---------------------------------------------------------------------------------------------
+// Lifecycle
+// ---------------------------------------------------------------------------------------------
+
+// The order is settled: each step relies on the ones before it.
+void CUserInterface::init(bool _hide_console) {
+    engine_interfaces().set_server(g_interface_server);
+    draw_plaque();
+    m_hide_console = _hide_console;
+    engine_interfaces().get_time_profiler(true)->enable();
+    read_screen_size();
+    load_game_library();
+
+    IInputSystem *p_input = engine_interfaces().get_input_system(true);
+    if (p_input) {
+        p_input->add_pointer_listener(this);
+        p_input->add_key_listener(this);
+    }
+    register_commands();
+}
+
+// The start-up plaque goes straight to the renderer, full screen, and is presented at once:
+// nothing else of the library is there to draw yet.
+void CUserInterface::draw_plaque() {
+    char const *name = k_default_plaque;
+    if (IConfigSection *p_sect = config_section("ui")) {
+        IConfigValue *p_background = p_sect->get_value("init_plaque", true);
+        if (QOR_CHECK(p_background)) name = p_background->get_string(k_default_plaque);
+    }
+
+    IRenderQOR *p_render = engine_interfaces().get_render(true);
+    if (!p_render) return;
+    int const material = p_render->create_material("ui_image", name, nullptr, nullptr, nullptr, nullptr, true, false);
+    p_render->begin_2d();
+    p_render->set_material(material);
+    rgba_t const white(255, 255, 255, 255);
+    p_render->draw_quad(vec2_t{-1.0f, 1.0f}, vec2_t{0.0f, 0.0f}, white, vec2_t{-1.0f, -1.0f}, vec2_t{0.0f, 1.0f},
+                        white, vec2_t{1.0f, -1.0f}, vec2_t{1.0f, 1.0f}, white, vec2_t{1.0f, 1.0f},
+                        vec2_t{1.0f, 0.0f}, white);
+    p_render->end_2d();
+    p_render->present();
+    p_render->destroy_material(material);
+}
+
+void CUserInterface::read_screen_size() {
+    IVarManagerBase *p_vars = engine_interfaces().get_var_manager(true);
+    if (!p_vars) return;
+    SVariable const *p_w = p_vars->find_var("scr_resx");
+    SVariable const *p_h = p_vars->find_var("scr_resy");
+    m_scr_w = p_w ? p_w->m_int_value : 0;
+    m_scr_h = p_h ? p_h->m_int_value : 0;
+}
+
+void CUserInterface::load_game_library() {
+    char const *name = k_no_library;
+    if (IConfigSection *p_sect = config_section("ui_libraries")) {
+        IConfigValue *p_library = p_sect->get_value("gameui_library", true);
+        if (QOR_CHECK(p_library)) name = p_library->get_string(k_no_library);
+    }
+    if (strcmp(name, k_no_library) == 0) {
+        qordebug::error("GameUI library name is not specified.\nPlease, specify parameter '%s' in '[%s]' section "
+                        "of GDF file",
+                        "gameui_library", "ui_libraries");
+        return;
+    }
+    g_interface_server->load_module(1, name);
+}
+
+void CUserInterface::register_commands() {
+    ICmdManagerBase *p_commands = engine_interfaces().get_cmd_manager(true);
+    if (!p_commands) return;
+    for (SCommand const &command : k_commands) p_commands->register_command(command.mp_name, command.mp_callback, this);
+}
+
+void CUserInterface::unregister_commands() {
+    ICmdManagerBase *p_commands = engine_interfaces().get_cmd_manager(true);
+    if (!p_commands) return;
+    for (SCommand const &command : k_commands) p_commands->unregister_command(command.mp_name);
+}
+
+// The first of the two calls of a frame. The "ui" page is made at the first update.
+void CUserInterface::update(int) {
+    static IStatsPage *sp_ui_page = create_stats_page("ui");
+    (void)sp_ui_page;
+}
+
+// The second call of a frame: the desktop draws the whole tree. Without a desktop, nothing.
+void CUserInterface::draw() {
+    if (!mp_desktop) return;
+}
+
+void CUserInterface::shutdown() {
+    IInputSystem *p_input = engine_interfaces().get_input_system(true);
+    if (p_input) {
+        p_input->remove_pointer_listener(this);
+        p_input->remove_key_listener(this);
+    }
+    unregister_commands();
+}
+
+IConsole *CUserInterface::get_console() { return nullptr; }
+
+void CUserInterface::on_app_activate(bool) {}
+
+unsigned short const *CUserInterface::get_local_string(char const *) { return nullptr; }
+
+char const *CUserInterface::get_local_key(unsigned short const *) { return nullptr; }
+
+float CUserInterface::get_scale_w() { return 1.0f; }
+
+float CUserInterface::get_scale_h() { return 1.0f; }
+
+// ---------------------------------------------------------------------------------------------
+// Input: everything goes to the desktop, once there is one.
+// ---------------------------------------------------------------------------------------------
+
+void CUserInterface::on_button_down(unsigned) {}
+void CUserInterface::on_button_up(unsigned) {}
+void CUserInterface::on_pointer_move(vec2_t const &) {}
+void CUserInterface::on_wheel(float) {}
+void CUserInterface::on_key_down(unsigned, unsigned) {}
+void CUserInterface::on_key_up(unsigned) {}
+
+// The console key's characters go no further.
+void CUserInterface::on_char(unsigned _code) {
+    if (_code == k_console_char || _code == k_console_char_shifted) return;
+}
+
+// ---------------------------------------------------------------------------------------------
+// Stats pages
+// ---------------------------------------------------------------------------------------------
+
+IStatsPage *CUserInterface::create_stats_page(char const *_name) {
+    if (IStatsPage *p_page = get_stats_page(_name)) return p_page;
+    CStatsPage *p_page = new CStatsPage(this, _name);
+    m_stats_pages.push_back(p_page);
+    return p_page;
+}
+
+unsigned CUserInterface::get_stats_pages_count() { return static_cast<unsigned>(m_stats_pages.size()); }
+
+IStatsPage *CUserInterface::get_stats_page(unsigned _idx) {
+    return _idx < m_stats_pages.size() ? m_stats_pages[_idx] : nullptr;
+}
+
+IStatsPage *CUserInterface::get_stats_page(char const *_name) {
+    if (!_name) return nullptr;
+    for (CStatsPage *p_page : m_stats_pages) {
+        if (!QOR_CHECK(p_page)) continue;
+        if (strcmp(p_page->get_name(), _name) == 0) return p_page;
+    }
+    return nullptr;
+}
+
+IStatsPage *CUserInterface::get_current_stats_page() {
+    for (CStatsPage *p_page : m_stats_pages)
+        if (p_page && p_page->is_show()) return p_page;
+    return nullptr;
+}
+
+} // namespace qorui
