@@ -110,6 +110,7 @@ public:
     void Push() const;
 
 private:
+    friend class LuaState;
     friend bool LuaPlusH_next(LuaState *, LuaObject const &, LuaObject &, LuaObject &);
     void assign_from_stack(LuaState *_p_state); // pops the top value into this object
     void release();
