@@ -1,0 +1,130 @@
+#include "host.h"
+
+#include "qorbase.h"
+#include "qordebug.h"
+#include "ui_interfaces.h"
+
+#include <cstdio>
+#include <sys/stat.h>
+
+namespace qorhost {
+
+namespace {
+unsigned const k_frame_ms = 16;
+
+bool file_exists(std::string const &_path) {
+    struct stat info;
+    return stat(_path.c_str(), &info) == 0;
+}
+
+void copy_file(std::string const &_from, std::string const &_to) {
+    std::string text;
+    FILE *in = fopen(_from.c_str(), "rb");
+    if (!in) return;
+    char buffer[8192];
+    size_t count;
+    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0) text.append(buffer, count);
+    fclose(in);
+    FILE *out = fopen(_to.c_str(), "wb");
+    if (!out) return;
+    fwrite(text.data(), 1, text.size(), out);
+    fclose(out);
+}
+} // namespace
+
+CHost::CHost(SHostOptions const &_options)
+    : m_options(_options), m_commands(&m_vars), mp_engine_logger(nullptr), m_renderer(_options.m_w, _options.m_h),
+      m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0) {
+    m_log.set_quiet(m_options.m_quiet);
+    mp_engine_logger = m_log.create_logger("Engine", "");
+    qorbase::set_log_sink(log_sink, this);
+    if (m_options.m_manual_clock) qorplatform::set_clock(&m_clock);
+    configure_files();
+
+    m_vars.set_var("scr_resx", std::to_string(m_options.m_w).c_str());
+    m_vars.set_var("scr_resy", std::to_string(m_options.m_h).c_str());
+    m_renderer.set_texture_folders({m_options.m_data + "/textures", m_options.m_data});
+    m_renderer.set_frame_sink([this](SImage const &_frame, unsigned _index) { write_frame(_frame, _index); });
+    m_server.set_modules_folder(executable_folder());
+
+    m_server.register_interface(&m_input);
+    m_server.register_interface(&m_vars);
+    m_server.register_interface(&m_commands);
+    m_server.register_interface(&m_level);
+    m_server.register_interface(&m_log);
+    m_server.register_interface(&m_sound);
+    if (m_options.m_record)
+        m_server.register_interface(&m_recorder);
+    else
+        m_server.register_interface(&m_renderer);
+}
+
+// Every interface is withdrawn before it goes, so no module keeps a pointer to it.
+CHost::~CHost() {
+    m_server.withdraw_all();
+    qorbase::set_log_sink(nullptr, nullptr);
+    if (m_options.m_manual_clock) qorplatform::set_clock(nullptr);
+}
+
+// The configuration is worked on as a copy in the output folder, made from the data folder's on
+// the first run: what the interface writes back stays out of the data.
+void CHost::configure_files() {
+    std::string const data = m_options.m_data;
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_CONFIG, data.c_str());
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
+    std::string gdf = data + "/qor.gdf";
+    if (!m_options.m_out.empty()) {
+        mkdir(m_options.m_out.c_str(), 0755);
+        qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_options.m_out.c_str());
+        std::string const copy = m_options.m_out + "/qor.gdf";
+        if (!file_exists(copy)) copy_file(gdf, copy);
+        if (file_exists(copy)) gdf = copy;
+    }
+    qorbase::set_gdf_path(gdf.c_str());
+}
+
+void CHost::log_sink(char const *_line, void *_user) {
+    CHost *p_host = static_cast<CHost *>(_user);
+    p_host->mp_engine_logger->write(_line, 0);
+}
+
+bool CHost::load_ui() {
+    if (!m_server.open_module("libqorui.so")) return false;
+    mp_ui = static_cast<qorui::IUserInterface *>(m_server.query_interface(qor_uid::USER_INTERFACE, 1));
+    if (!mp_ui) qordebug::error("libqorui.so registered no user interface");
+    return mp_ui != nullptr;
+}
+
+std::string CHost::frame_path(unsigned _index) const {
+    char name[32];
+    snprintf(name, sizeof(name), "frame_%04u.png", _index);
+    return m_options.m_out + "/" + name;
+}
+
+void CHost::write_frame(SImage const &_frame, unsigned _index) {
+    if (m_options.m_out.empty()) return;
+    if (!write_png(frame_path(_index), _frame)) qordebug::warning("Cannot write '%s'", frame_path(_index).c_str());
+}
+
+void CHost::frame() {
+    if (!mp_ui) return;
+    m_renderer.begin_frame(rgba_t(0, 0, 0, 255));
+    mp_ui->update(static_cast<int>(m_frame_time));
+    mp_ui->draw();
+    m_renderer.present();
+    if (m_options.m_manual_clock) m_clock.advance_ms(k_frame_ms);
+    m_frame_time += k_frame_ms;
+}
+
+int CHost::run() {
+    if (!mp_ui && !load_ui()) return 1;
+    mp_ui->init(false);
+    for (std::string const &line : m_options.m_commands) m_commands.run_line(line.c_str());
+    for (unsigned i = 0; i < m_options.m_frames; ++i) frame();
+    mp_ui->shutdown();
+    qorbase::flush_gdf();
+    return 0;
+}
+
+} // namespace qorhost

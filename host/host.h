@@ -1,0 +1,91 @@
+// The reference engine: it owns the engine's interfaces, puts them on the interface server, loads
+// the UI library as an engine does, and runs its frames.
+//
+//   interfaces    server, input, commands and variables, level, log, sound, renderer
+//   lifecycle     load_ui, init, frames of update and draw, shutdown
+#pragma once
+#include "commands.h"
+#include "input_system.h"
+#include "interface_server.h"
+#include "level_description.h"
+#include "log_manager.h"
+#include "qor_platform.h"
+#include "recording_renderer.h"
+#include "software_renderer.h"
+#include "sound_system.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace qorui {
+class IUserInterface;
+}
+
+namespace qorhost {
+
+struct SHostOptions {
+    std::string m_data = "data";  // the data folder
+    int m_w = 1024;               // screen size in pixels
+    int m_h = 768;
+    unsigned m_frames = 3;
+    std::string m_out = "out";    // frames, stats and the working copy of the configuration; "" for none
+    bool m_quiet = false;         // the log isn't printed
+    bool m_record = false;        // a recorder stands in front of the renderer
+    bool m_manual_clock = true;   // time moves 16 ms a frame, so runs repeat exactly
+    std::vector<std::string> m_commands; // run after init, "name arguments"
+};
+
+class CHost {
+public:
+    explicit CHost(SHostOptions const &_options);
+    ~CHost();
+    CHost(CHost const &) = delete;
+    CHost &operator=(CHost const &) = delete;
+
+    // Opens libqorui.so and fetches its service; false, with a message, when either fails.
+    bool load_ui();
+    qorui::IUserInterface *ui() const { return mp_ui; }
+
+    // init, the commands, the frames, shutdown. Result 0, or 1 without a service.
+    int run();
+    // One frame: clear, update, draw, present.
+    void frame();
+
+    CInterfaceServer &server() { return m_server; }
+    CInputSystem &input() { return m_input; }
+    CCmdManager &commands() { return m_commands; }
+    CVarManager &vars() { return m_vars; }
+    CLogManager &log() { return m_log; }
+    CSoundSystem &sound() { return m_sound; }
+    CSoftwareRenderer &renderer() { return m_renderer; }
+    CRecordingRenderer &recorder() { return m_recorder; }
+    CLevelDescription &level() { return m_level; }
+    qorplatform::CManualClock &clock() { return m_clock; }
+    SHostOptions const &options() const { return m_options; }
+
+    // Path of a presented frame's file.
+    std::string frame_path(unsigned _index) const;
+
+private:
+    void configure_files();
+    void write_frame(SImage const &_frame, unsigned _index);
+    static void log_sink(char const *_line, void *_user);
+
+    SHostOptions m_options;
+    CInterfaceServer m_server;
+    CInputSystem m_input;
+    CVarManager m_vars;
+    CCmdManager m_commands;
+    CLevelDescription m_level;
+    CLogManager m_log;
+    ILogger *mp_engine_logger;
+    CSoundSystem m_sound;
+    CSoftwareRenderer m_renderer;
+    CRecordingRenderer m_recorder;
+    qorplatform::CManualClock m_clock;
+    qorui::IUserInterface *mp_ui;
+    unsigned m_frame_time;
+};
+
+} // namespace qorhost

@@ -1,0 +1,44 @@
+// The host's interface server: modules register their interfaces and find each other's by
+// identifier and version; listeners hear of withdrawals; further modules load by file name.
+#pragma once
+#include "qor_interfaces.h"
+
+#include <string>
+#include <vector>
+
+namespace qorhost {
+
+class CInterfaceServer : public IInterfaceServer {
+public:
+    CInterfaceServer();
+    virtual ~CInterfaceServer();
+
+    IInterfaceBase *query_interface(SInterfaceUID _uid, int _version) override;
+    int register_interface(IInterfaceBase *_p_interface) override;
+    void load_module(int _flag, char const *_library_name) override;
+    void add_listener(IInterfaceServerListener *_p_listener) override;
+    void remove_listener(IInterfaceServerListener *_p_listener) override;
+    void withdraw_interface(IInterfaceBase *_p_interface) override;
+
+    // Where modules are looked for first (the folder of the host's executable).
+    void set_modules_folder(std::string const &_folder) { m_modules_folder = _folder; }
+    // Opens a module and calls its RegisterInterface with this server; null on failure, with a
+    // warning that names the module.
+    void *open_module(char const *_library_name);
+    // Withdraws every interface, newest first.
+    void withdraw_all();
+
+    unsigned get_interfaces_count() const { return static_cast<unsigned>(m_interfaces.size()); }
+    unsigned get_listeners_count() const { return static_cast<unsigned>(m_listeners.size()); }
+
+private:
+    std::vector<IInterfaceBase *> m_interfaces;
+    std::vector<IInterfaceServerListener *> m_listeners;
+    std::vector<void *> m_modules;
+    std::string m_modules_folder;
+};
+
+// The folder of the running executable.
+std::string executable_folder();
+
+} // namespace qorhost

@@ -1,0 +1,63 @@
+// qorhost: the reference engine. Loads libqorui.so, runs its frames headless and writes each
+// presented frame as a PNG file.
+#include "host.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <string>
+
+namespace {
+
+void usage() {
+    fprintf(stderr, "usage: qorhost [--data DIR] [--size WxH] [--frames N] [--out DIR] [--quiet] "
+                    "[+command args ...]\n");
+}
+
+// Result false on a bad argument.
+bool parse(int _argc, char **_argv, qorhost::SHostOptions &_options) {
+    for (int i = 1; i < _argc; ++i) {
+        std::string const argument = _argv[i];
+        bool const has_value = i + 1 < _argc;
+        if (argument == "--data" && has_value) {
+            _options.m_data = _argv[++i];
+        } else if (argument == "--out" && has_value) {
+            _options.m_out = _argv[++i];
+        } else if (argument == "--frames" && has_value) {
+            char *end = nullptr;
+            long const frames = strtol(_argv[++i], &end, 10);
+            if (*end || frames < 0) return false;
+            _options.m_frames = static_cast<unsigned>(frames);
+        } else if (argument == "--size" && has_value) {
+            if (sscanf(_argv[++i], "%dx%d", &_options.m_w, &_options.m_h) != 2 || _options.m_w <= 0 ||
+                _options.m_h <= 0)
+                return false;
+        } else if (argument == "--quiet") {
+            _options.m_quiet = true;
+        } else if (argument.size() > 1 && argument[0] == '+') {
+            // "+name" and the words up to the next "+..." make one command line.
+            std::string line = argument.substr(1);
+            while (i + 1 < _argc && _argv[i + 1][0] != '+') line += std::string(" ") + _argv[++i];
+            _options.m_commands.push_back(line);
+        } else {
+            return false;
+        }
+    }
+    return true;
+}
+
+} // namespace
+
+int main(int _argc, char **_argv) {
+    qorhost::SHostOptions options;
+    if (!parse(_argc, _argv, options)) {
+        usage();
+        return 2;
+    }
+    qorhost::CHost host(options);
+    if (!host.load_ui()) {
+        fprintf(stderr, "qorhost: libqorui.so could not be loaded\n");
+        return 1;
+    }
+    return host.run();
+}
