@@ -49,8 +49,8 @@ int qor_heap_id();
 namespace fixed_pool_helpers {
 
 // A handle on the manager's pool record for one element size and block count. Built during
-// static initialisation; it acquires its record at construction or at the first take, whichever
-// comes first, so a pooled object made by an earlier static constructor still works.
+// static initialisation; a take that comes before the construction (from an earlier static
+// constructor) acquires the record itself.
 struct SPool {
     SFixedPool *mp_pool; // zero before construction: statics are zeroed before any constructor runs
 

@@ -205,9 +205,10 @@ size_t pointer_aligned(size_t _size) {
 }
 } // namespace
 
-SPool::SPool(size_t _element_size, size_t _block_elements) {
-    // A pooled object made by an earlier static constructor may have acquired the record already.
-    if (!mp_pool) acquire(_element_size, _block_elements);
+// A take by an earlier static constructor may have acquired the record already; the manager hands
+// out the same record for the same sizes, so acquiring again keeps those elements in it.
+SPool::SPool(size_t _element_size, size_t _block_elements) : mp_pool(nullptr) {
+    acquire(_element_size, _block_elements);
 }
 
 SPool::~SPool() {

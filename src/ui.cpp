@@ -14,7 +14,6 @@
 #include "qorbase.h"
 #include "qordebug.h"
 #include "ui_debug.h"
-#include "ui_stats_page.h"
 #include "ui_time_profiler.h"
 
 #include <cstring>
@@ -107,10 +106,7 @@ CUserInterface::CUserInterface()
       m_hide_console(false) {}
 
 CUserInterface::~CUserInterface() {
-    while (!m_stats_pages.empty()) {
-        delete m_stats_pages.back();
-        m_stats_pages.pop_back();
-    }
+
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -245,32 +241,10 @@ void CUserInterface::on_char(unsigned _code) {
 // Stats pages
 // ---------------------------------------------------------------------------------------------
 
-IStatsPage *CUserInterface::create_stats_page(char const *_name) {
-    if (IStatsPage *p_page = get_stats_page(_name)) return p_page;
-    CStatsPage *p_page = new CStatsPage(this, _name);
-    m_stats_pages.push_back(p_page);
-    return p_page;
-}
-
-unsigned CUserInterface::get_stats_pages_count() { return static_cast<unsigned>(m_stats_pages.size()); }
-
-IStatsPage *CUserInterface::get_stats_page(unsigned _idx) {
-    return _idx < m_stats_pages.size() ? m_stats_pages[_idx] : nullptr;
-}
-
-IStatsPage *CUserInterface::get_stats_page(char const *_name) {
-    if (!_name) return nullptr;
-    for (CStatsPage *p_page : m_stats_pages) {
-        if (!QOR_CHECK(p_page)) continue;
-        if (strcmp(p_page->get_name(), _name) == 0) return p_page;
-    }
-    return nullptr;
-}
-
-IStatsPage *CUserInterface::get_current_stats_page() {
-    for (CStatsPage *p_page : m_stats_pages)
-        if (p_page && p_page->is_show()) return p_page;
-    return nullptr;
-}
+IStatsPage *CUserInterface::create_stats_page(char const *) { return nullptr; }
+unsigned CUserInterface::get_stats_pages_count() { return 0; }
+IStatsPage *CUserInterface::get_stats_page(unsigned) { return nullptr; }
+IStatsPage *CUserInterface::get_stats_page(char const *) { return nullptr; }
+IStatsPage *CUserInterface::get_current_stats_page() { return nullptr; }
 
 } // namespace qorui

@@ -1,0 +1,81 @@
+// qorhost on the default data, as the main job runs it: the first frame is the start-up plaque.
+#include "image_io.h"
+#include "test_support.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+namespace {
+
+struct SRun {
+    qortest::SChildResult m_result;
+    std::string m_out;
+};
+
+SRun run_host(std::vector<std::string> _arguments) {
+    SRun run;
+    run.m_out = qortest::make_temp_dir();
+    std::vector<std::string> arguments = {"--data", qortest::source_dir() + "/data", "--out", run.m_out};
+    arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
+    run.m_result = qortest::run_child("qorhost", {}, arguments);
+    return run;
+}
+
+} // namespace
+
+TEST(HostEndToEnd, FirstFrameIsThePlaque) {
+    SRun const run = run_host({"--frames", "2"});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
+    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/plaque_1024x768.png", golden));
+    std::string const diff = run.m_out + "/plaque_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+
+    // The plaque is the picture itself, texel for texel.
+    qorhost::SImage picture;
+    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/data/textures/ui_init_plaque.tga", picture));
+    EXPECT_EQ(0, qorhost::compare_images(frame, picture, 0));
+
+    // Two frames of the host follow the plaque.
+    qorhost::SImage last;
+    EXPECT_TRUE(qorhost::load_image(run.m_out + "/frame_0002.png", last));
+    EXPECT_FALSE(qorhost::load_image(run.m_out + "/frame_0003.png", last));
+}
+
+TEST(HostEndToEnd, GameLibraryIsLoadedAndCommandsRun) {
+    SRun const run = run_host({"--frames", "0", "+gameui_demo", "hello", "there", "+no_such_command"});
+    EXPECT_EQ(0, run.m_result.m_exit_code);
+    std::string const &output = run.m_result.m_output;
+    EXPECT_NE(std::string::npos, output.find("GameUI: Demo game interface library attached")) << output;
+    EXPECT_NE(std::string::npos, output.find("GameUI: gameui_demo hello there")) << output;
+    EXPECT_NE(std::string::npos, output.find("Unknown command 'no_such_command'")) << output;
+}
+
+TEST(HostEndToEnd, BadArgumentsGiveUsage) {
+    SRun const run = run_host({"--size", "wide"});
+    EXPECT_EQ(2, run.m_result.m_exit_code);
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("usage: qorhost")) << run.m_result.m_output;
+}
+
+TEST(HostEndToEnd, MissingPlaqueShowsTheMissingTextureAndGoesOn) {
+    std::string const data = qortest::make_temp_dir();
+    qortest::write_file(data + "/qor.gdf", "[ui]\ninit_plaque = nowhere.tga\n[ui_libraries]\n");
+    SRun run;
+    run.m_out = qortest::make_temp_dir();
+    run.m_result = qortest::run_child("qorhost", {}, {"--data", data, "--out", run.m_out, "--frames", "1"});
+    EXPECT_EQ(0, run.m_result.m_exit_code);
+    std::string const &output = run.m_result.m_output;
+    EXPECT_NE(std::string::npos, output.find("Cannot load texture 'nowhere.tga'")) << output;
+    EXPECT_NE(std::string::npos, output.find("GameUI library name is not specified.\nPlease, specify parameter "
+                                             "'gameui_library' in '[ui_libraries]' section of GDF file"))
+        << output;
+    qorhost::SImage frame;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
+    uint8_t const *corner = frame.pixel(0, 0);
+    EXPECT_EQ(255, corner[0]); // the missing texture's magenta
+    EXPECT_EQ(0, corner[1]);
+    EXPECT_EQ(255, corner[2]);
+}
