@@ -1,0 +1,171 @@
+// The user-interface service on the test host: what init does, in its order, and what shutdown
+// takes back.
+#include "ui.h"
+
+#include "host.h"
+#include "qorbase.h"
+#include "test_support.h"
+#include "ui_time_profiler.h"
+
+#include <gtest/gtest.h>
+
+using namespace qorui;
+
+namespace {
+
+// One host for the whole test program: the library's statics hold on to its server until the
+// process ends, so the host must outlive them.
+qorhost::CHost &shared_host() {
+    static qorhost::CHost *sp_host = [] {
+        qorhost::SHostOptions options;
+        options.m_data = qortest::source_dir() + "/data";
+        options.m_out = qortest::make_temp_dir();
+        options.m_quiet = true;
+        options.m_record = true;
+        qorhost::CHost *p_host = new qorhost::CHost(options);
+        if (!p_host->load_ui()) ADD_FAILURE() << "libqorui.so did not load";
+        return p_host;
+    }();
+    return *sp_host;
+}
+
+class ServiceTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        m_dir = qortest::make_temp_dir();
+        use_gdf("[ui]\ninit_plaque = ui_init_plaque.tga\n[ui_libraries]\ngameui_library = libgameui_demo.so\n");
+        host().recorder().clear();
+    }
+    void TearDown() override {
+        if (m_initialised) service().shutdown();
+        qorbase::set_gdf_path(nullptr);
+    }
+
+    void use_gdf(std::string const &_text) {
+        qortest::write_file(m_dir + "/qor.gdf", _text);
+        qorbase::set_gdf_path((m_dir + "/qor.gdf").c_str());
+    }
+    void init(bool _hide_console = false) {
+        service().init(_hide_console);
+        m_initialised = true;
+    }
+
+    qorhost::CHost &host() { return shared_host(); }
+    CUserInterface &service() { return *static_cast<CUserInterface *>(host().ui()); }
+
+    std::string m_dir;
+    bool m_initialised = false;
+};
+
+} // namespace
+
+TEST_F(ServiceTest, InitDrawsThePlaqueStraightThroughTheRenderer) {
+    init();
+    std::vector<qorhost::SRenderCall> const &calls = host().recorder().calls();
+    EXPECT_EQ("create_material begin_2d set_material draw_quad end_2d present destroy_material",
+              host().recorder().sequence());
+    ASSERT_EQ(7u, calls.size());
+    EXPECT_EQ((std::vector<std::string>{"ui_image", "ui_init_plaque.tga", "", "", "", ""}), calls[0].m_names);
+    int const material = calls[0].m_handle;
+    EXPECT_EQ(material, calls[2].m_handle);
+    EXPECT_EQ(material, calls[6].m_handle);
+
+    // Full screen in device coordinates, each corner with its texture corner, opaque white.
+    qorhost::SRenderCall const &quad = calls[3];
+    float const expected[4][4] = {{-1, 1, 0, 0}, {-1, -1, 0, 1}, {1, -1, 1, 1}, {1, 1, 1, 0}};
+    for (int i = 0; i < 4; ++i) {
+        EXPECT_EQ(expected[i][0], quad.m_points[i].x) << "vertex " << i;
+        EXPECT_EQ(expected[i][1], quad.m_points[i].y) << "vertex " << i;
+        EXPECT_EQ(expected[i][2], quad.m_uvs[i].x) << "vertex " << i;
+        EXPECT_EQ(expected[i][3], quad.m_uvs[i].y) << "vertex " << i;
+        EXPECT_EQ(rgba_t(255, 255, 255, 255), quad.m_colours[i]) << "vertex " << i;
+    }
+}
+
+TEST_F(ServiceTest, PlaqueNameDefaultsWithoutItsKeyAndWithoutItsSection) {
+    use_gdf("[ui]\n[ui_libraries]\ngameui_library = libgameui_demo.so\n");
+    init();
+    EXPECT_EQ("ui_init_plaque.tga", host().recorder().calls()[0].m_names[1]);
+    service().shutdown();
+    m_initialised = false;
+
+    use_gdf("[ui_libraries]\ngameui_library = libgameui_demo.so\n");
+    host().recorder().clear();
+    qortest::CReportCapture capture;
+    init();
+    EXPECT_EQ("ui_init_plaque.tga", host().recorder().calls()[0].m_names[1]);
+    std::vector<std::string> const contracts = capture.texts(qordebug::REPORT_ASSERT);
+    ASSERT_EQ(1u, contracts.size());
+    EXPECT_EQ(0u, contracts[0].find("Expression:   p_sect, \nFile: ")) << contracts[0];
+}
+
+TEST_F(ServiceTest, InitPutsListenersAndCommandsInPlaceAndShutdownTakesThemBack) {
+    init();
+    EXPECT_EQ(1u, host().input().get_pointer_listeners_count());
+    EXPECT_EQ(1u, host().input().get_key_listeners_count());
+    for (char const *name : {"ui_export", "ui_import", "print_stats_page"})
+        EXPECT_TRUE(host().commands().has_command(name)) << name;
+
+    service().shutdown();
+    m_initialised = false;
+    EXPECT_EQ(0u, host().input().get_pointer_listeners_count());
+    EXPECT_EQ(0u, host().input().get_key_listeners_count());
+    for (char const *name : {"ui_export", "ui_import", "print_stats_page"})
+        EXPECT_FALSE(host().commands().has_command(name)) << name;
+}
+
+TEST_F(ServiceTest, InitSwitchesTheTimeProfilerOnThroughTheServer) {
+    CTimeProfiler *p_profiler =
+        static_cast<CTimeProfiler *>(host().server().query_interface(qor_uid::TIME_PROFILER, 1));
+    ASSERT_NE(nullptr, p_profiler);
+    p_profiler->disable();
+    init();
+    EXPECT_TRUE(p_profiler->is_enabled());
+}
+
+TEST_F(ServiceTest, InitReadsTheScreenSizeOnce) {
+    host().vars().set_var("scr_resx", "1600");
+    host().vars().set_var("scr_resy", "1200");
+    init();
+    host().vars().set_var("scr_resx", "640");
+    EXPECT_EQ(1600, service().get_screen_w());
+    EXPECT_EQ(1200, service().get_screen_h());
+    host().vars().set_var("scr_resx", "1024");
+    host().vars().set_var("scr_resy", "768");
+}
+
+TEST_F(ServiceTest, MissingGameLibraryIsReportedAndInitGoesOn) {
+    use_gdf("[ui]\n[ui_libraries]\n");
+    qortest::CReportCapture capture;
+    init();
+    std::vector<std::string> const errors = capture.texts(qordebug::REPORT_ERROR);
+    ASSERT_EQ(1u, errors.size());
+    EXPECT_EQ("GameUI library name is not specified.\nPlease, specify parameter 'gameui_library' in "
+              "'[ui_libraries]' section of GDF file",
+              errors[0]);
+    EXPECT_TRUE(host().commands().has_command("ui_export")); // the later steps ran
+}
+
+TEST_F(ServiceTest, GameLibraryIsLoadedThroughTheServer) {
+    host().commands().unregister_command("gameui_demo");
+    init();
+    EXPECT_TRUE(host().commands().has_command("gameui_demo"));
+}
+
+TEST_F(ServiceTest, RegisterInterfaceTwiceKeepsOneService) {
+    IInterfaceBase *p_first = host().server().query_interface(qor_uid::USER_INTERFACE, 1);
+    EXPECT_EQ(0, RegisterInterface(&host().server())); // already there
+    EXPECT_EQ(p_first, host().server().query_interface(qor_uid::USER_INTERFACE, 1));
+}
+
+TEST_F(ServiceTest, ServiceWithoutDesktopAnswersNeutrally) {
+    init();
+    EXPECT_EQ(1.0f, service().get_scale_w());
+    EXPECT_EQ(1.0f, service().get_scale_h());
+    EXPECT_EQ(nullptr, service().get_desktop());
+    EXPECT_EQ(nullptr, service().get_reserved());
+    EXPECT_FALSE(service().get_hide_console());
+    host().recorder().clear();
+    service().draw(); // no desktop: nothing reaches the renderer
+    EXPECT_TRUE(host().recorder().calls().empty());
+}
