@@ -59,9 +59,11 @@ CHost::CHost(SHostOptions const &_options)
         m_server.register_interface(&m_renderer);
 }
 
-// Every interface is withdrawn before it goes, so no module keeps a pointer to it.
+// Every interface is withdrawn before it goes, so no module keeps a pointer to it; then the
+// modules close while the server they hold on to still stands.
 CHost::~CHost() {
     m_server.withdraw_all();
+    m_server.close_modules();
     qorbase::set_log_sink(nullptr, nullptr);
     if (m_options.m_manual_clock) qorplatform::set_clock(nullptr);
 }

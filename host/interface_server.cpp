@@ -10,8 +10,14 @@ namespace qorhost {
 
 CInterfaceServer::CInterfaceServer() {}
 
-// Modules stay loaded until the process ends: their statics may still be in use.
-CInterfaceServer::~CInterfaceServer() {}
+CInterfaceServer::~CInterfaceServer() { close_modules(); }
+
+void CInterfaceServer::close_modules() {
+    while (!m_modules.empty()) {
+        qorplatform::free_library(m_modules.back());
+        m_modules.pop_back();
+    }
+}
 
 IInterfaceBase *CInterfaceServer::query_interface(SInterfaceUID _uid, int _version) {
     for (IInterfaceBase *p_interface : m_interfaces)

@@ -27,6 +27,9 @@ public:
     void *open_module(char const *_library_name);
     // Withdraws every interface, newest first.
     void withdraw_all();
+    // Closes the loaded modules, newest first, while the server still stands: their statics end
+    // now, and may still call the server as they go.
+    void close_modules();
 
     unsigned get_interfaces_count() const { return static_cast<unsigned>(m_interfaces.size()); }
     unsigned get_listeners_count() const { return static_cast<unsigned>(m_listeners.size()); }
