@@ -1,28 +1,36 @@
 // qorbase: the GDF registry, the file system with its categories, configuration files and the
-// file reader cache.
+// file reader's cache.
+//
+//   GDF registry ..... the engine's configuration file, read at first use, written back at exit
+//   File system ...... category roots, whole-file loads and atomic saves, readers, the log
+//   Entry points ..... the module's exported functions
 #include "qorbase.h"
 
 #include "config_file.h"
 #include "qorMemoryManager.h"
 #include "qordebug.h"
 
+#include <cerrno>
+#include <climits>
 #include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <map>
 #include <string>
+#include <unistd.h>
 
 namespace qorbase {
 
 namespace {
 
 // ---------------------------------------------------------------------------------------------
-// The GDF registry
+// GDF registry
 // ---------------------------------------------------------------------------------------------
 
 class CGDFRegistry : public IGDFRegistry {
 public:
+    // A missing file gives an empty registry: every section is missing and getters give defaults.
     explicit CGDFRegistry(std::string const &_path) : m_path(_path) {
         std::string text;
         if (read_text_file(m_path, text))
@@ -34,14 +42,15 @@ public:
 
     IConfigFile *get_config() override { return &m_file; }
 
-    // Pending changes to the file, atomically.
+    // Pending changes go to the file at once, or not at all.
     void flush() {
         if (!m_file.is_dirty()) return;
         std::string const text = m_file.write();
         if (write_file_atomically(m_path, text.data(), text.size()))
             m_file.clear_dirty();
         else
-            qordebug::warning("Cannot write the configuration file '%s'", m_path.c_str());
+            qordebug::warning("Cannot write the configuration file '%s': %s", m_path.c_str(),
+                              strerror(errno));
     }
 
 private:
@@ -59,7 +68,8 @@ std::string g_gdf_path;
 bool g_gdf_path_set = false;
 CGDFRegistry *gp_registry = nullptr;
 
-// The registry's file is written back once at process end.
+// Deleting the registry at process end writes back what was set. Defined after g_gdf_path, so
+// it is destroyed before it.
 struct SRegistryKeeper {
     ~SRegistryKeeper() {
         delete gp_registry;
@@ -74,7 +84,7 @@ std::string gdf_path() {
 }
 
 // ---------------------------------------------------------------------------------------------
-// The file system
+// File system
 // ---------------------------------------------------------------------------------------------
 
 std::map<int, std::string> &category_roots() {
@@ -85,88 +95,115 @@ std::map<int, std::string> &category_roots() {
 log_sink_t gp_log_sink = nullptr;
 void *gp_log_user = nullptr;
 
-// The heap of this module, for the contents handed out by load_file.
+// This module's heap, for the contents that load_file hands out. Should the manager refuse a
+// heap, the id -1 makes it use its default heap.
 int file_heap() {
     static int s_heap = MMHeapCreate(0x100000, 0x100000);
     return s_heap;
 }
 
+std::string full_path(int _category, char const *_path) {
+    char path[4096];
+    make_path(_category, _path, path, sizeof(path));
+    return path;
+}
+
 class CFileReader : public IFileReader {
 public:
-    CFileReader(FILE *_p_file, unsigned _size) : mp_file(_p_file) { m_size = _size; }
-    ~CFileReader() override { fclose(mp_file); }
+    CFileReader(int _fd, unsigned _size) : m_fd(_fd) { m_size = _size; }
+    ~CFileReader() override { close(m_fd); }
 
-    void seek(unsigned _position) override { fseek(mp_file, static_cast<long>(_position), SEEK_SET); }
+    void seek(unsigned _position) override { lseek(m_fd, static_cast<off_t>(_position), SEEK_SET); }
+
     unsigned read(unsigned _count, void *_p_buffer) override {
-        return _p_buffer ? static_cast<unsigned>(fread(_p_buffer, 1, _count, mp_file)) : 0;
+        if (!_p_buffer) return 0;
+        char *p = static_cast<char *>(_p_buffer);
+        unsigned done = 0;
+        while (done < _count) {
+            ssize_t const count = ::read(m_fd, p + done, _count - done);
+            if (count < 0 && errno == EINTR) continue;
+            if (count <= 0) break; // the end of the file, or an error: what was read counts
+            done += static_cast<unsigned>(count);
+        }
+        return done;
     }
 
 private:
-    FILE *mp_file;
+    int m_fd;
 };
 
 class CFileSystem : public IFileSystem {
 public:
     unsigned load_file(int _category, char const *_path, void **_pp_content, bool _quiet) override {
         std::string const path = full_path(_category, _path);
-        FILE *in = _path ? fopen(path.c_str(), "rb") : nullptr;
-        if (!in) {
+        size_t size = 0;
+        int const fd = _path ? open_regular_file(path, &size) : -1;
+        if (fd < 0) {
             if (!_quiet) qordebug::warning("Cannot load file '%s'", path.c_str());
             return 0;
         }
-        fseek(in, 0, SEEK_END);
-        long const size = ftell(in);
-        fseek(in, 0, SEEK_SET);
-        if (size < 0) {
-            fclose(in);
+        if (size >= UINT_MAX) { // the size has to fit the result, with the terminator behind it
+            close(fd);
+            qordebug::warning("Cannot load file '%s': too large", path.c_str());
             return 0;
         }
-        if (_pp_content) {
-            MMHeapSelect(file_heap());
-            char *p_content = static_cast<char *>(MMAllocate(static_cast<size_t>(size) + 1, 0));
-            size_t const read = fread(p_content, 1, static_cast<size_t>(size), in);
-            p_content[read] = '\0'; // a terminator behind the content, for text readers
-            *_pp_content = p_content;
+        if (!_pp_content) { // the existence test
+            close(fd);
+            return static_cast<unsigned>(size);
         }
-        fclose(in);
+        MMHeapSelect(file_heap());
+        char *p_content = static_cast<char *>(MMAllocate(size + 1, 0));
+        bool const read = p_content && read_exactly(fd, p_content, size);
+        close(fd);
+        if (!read) {
+            MMDeallocate(p_content);
+            qordebug::warning("Cannot read file '%s'", path.c_str());
+            return 0;
+        }
+        p_content[size] = '\0'; // behind the content, so text parsers can stop at it
+        *_pp_content = p_content;
         return static_cast<unsigned>(size);
     }
 
     void save_file(int _category, char const *_path, void const *_p_data, unsigned _size, int) override {
-        if (!_path) return;
+        if (!_path || (!_p_data && _size)) {
+            qordebug::assert_func("Expression:   %s, \nFile: %s \nLine: %d\nFunction %s",
+                                  "_path && (_p_data || !_size)", __FILE__, __LINE__, __func__);
+            return;
+        }
         std::string const path = full_path(_category, _path);
-        if (!write_file_atomically(path, _p_data, _size)) qordebug::warning("Cannot save file '%s'", path.c_str());
+        if (!write_file_atomically(path, _p_data, _size))
+            qordebug::warning("Cannot save file '%s': %s", path.c_str(), strerror(errno));
     }
 
+    // The sink gets the line without its line break; stdout gets one after every line.
     void log(char const *_format, ...) override {
         char line[2048];
         va_list args;
         va_start(args, _format);
         vsnprintf(line, sizeof(line), _format ? _format : "", args);
         va_end(args);
+        size_t length = strlen(line);
+        while (length > 0 && (line[length - 1] == '\n' || line[length - 1] == '\r'))
+            line[--length] = '\0';
         if (gp_log_sink) {
             gp_log_sink(line, gp_log_user);
         } else {
-            fputs(line, stdout);
+            printf("%s\n", line);
             fflush(stdout);
         }
     }
 
     IFileReader *open_file(int _category, char const *_path) override {
         if (!_path) return nullptr;
-        FILE *in = fopen(full_path(_category, _path).c_str(), "rb");
-        if (!in) return nullptr;
-        fseek(in, 0, SEEK_END);
-        long const size = ftell(in);
-        fseek(in, 0, SEEK_SET);
-        return new CFileReader(in, size > 0 ? static_cast<unsigned>(size) : 0);
-    }
-
-private:
-    static std::string full_path(int _category, char const *_path) {
-        char path[4096];
-        make_path(_category, _path ? _path : "", path, sizeof(path));
-        return path;
+        size_t size = 0;
+        int const fd = open_regular_file(full_path(_category, _path), &size);
+        if (fd < 0) return nullptr;
+        if (size >= UINT_MAX) {
+            close(fd);
+            return nullptr;
+        }
+        return new CFileReader(fd, static_cast<unsigned>(size));
     }
 };
 
@@ -174,11 +211,13 @@ unsigned const k_cache_size = 64 * 1024;
 
 } // namespace
 
+// ---------------------------------------------------------------------------------------------
+// Entry points
+// ---------------------------------------------------------------------------------------------
+
 void set_gdf_path(char const *_path) {
-    if (gp_registry) {
-        delete gp_registry; // writes back what is pending
-        gp_registry = nullptr;
-    }
+    delete gp_registry; // writes back what is pending
+    gp_registry = nullptr;
     g_gdf_path = _path ? _path : "";
     g_gdf_path_set = _path != nullptr;
 }
@@ -187,7 +226,9 @@ void flush_gdf() {
     if (gp_registry) gp_registry->flush();
 }
 
-void set_category_root(int _category, char const *_folder) { category_roots()[_category] = _folder ? _folder : ""; }
+void set_category_root(int _category, char const *_folder) {
+    category_roots()[_category] = _folder ? _folder : "";
+}
 
 char const *get_category_root(int _category) {
     auto found = category_roots().find(_category);
@@ -198,10 +239,8 @@ void make_path(int _category, char const *_path, char *_p_out, unsigned _size) {
     if (!_p_out || !_size) return;
     char const *root = get_category_root(_category);
     char const *path = _path ? _path : "";
-    if (*root && path[0] != '/')
-        snprintf(_p_out, _size, "%s%s%s", root, root[strlen(root) - 1] == '/' ? "" : "/", path);
-    else
-        snprintf(_p_out, _size, "%s", path);
+    bool const needs_slash = *root && root[strlen(root) - 1] != '/';
+    snprintf(_p_out, _size, "%s%s%s", root, needs_slash ? "/" : "", path);
 }
 
 void set_log_sink(log_sink_t _sink, void *_user) {
@@ -224,15 +263,15 @@ IFileSystem *GetFileSystem() {
 
 IConfigFile *ReadConfigFile(int _category, char const *_file_name, int) {
     if (!_file_name) return nullptr;
-    char path[4096];
-    qorbase::make_path(_category, _file_name, path, sizeof(path));
     std::string text;
-    if (!qorbase::read_text_file(path, text)) return nullptr;
+    if (!qorbase::read_text_file(qorbase::full_path(_category, _file_name), text)) return nullptr;
     qorbase::CConfigFile *p_file = new qorbase::CConfigFile;
     p_file->parse(text);
     return p_file;
 }
 
+// The cache buffers come from the C heap: they never cross into the UI library's allocator, as
+// cache_release is the only way back.
 bool CCachedFileReader::cache_create(void **_pp_buffer, unsigned *_p_size) {
     if (!_pp_buffer || !_p_size) return false;
     *_pp_buffer = malloc(qorbase::k_cache_size);
@@ -241,4 +280,6 @@ bool CCachedFileReader::cache_create(void **_pp_buffer, unsigned *_p_size) {
     return true;
 }
 
-void CCachedFileReader::cache_release(void *_p_buffer) { free(_p_buffer); }
+void CCachedFileReader::cache_release(void *_p_buffer) {
+    free(_p_buffer);
+}

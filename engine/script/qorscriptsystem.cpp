@@ -20,40 +20,53 @@ namespace LuaPlus {
 // LuaState
 // ---------------------------------------------------------------------------------------------
 
-LuaState::LuaState() : mp_l(luaL_newstate()) { m_last_error[0] = '\0'; }
+LuaState::LuaState() : mp_l(luaL_newstate()) {
+    m_last_error[0] = '\0';
+}
 
 LuaState::~LuaState() {
     if (mp_l) lua_close(mp_l);
 }
 
-LuaState *LuaState::Create(bool _init_standard_library, bool) {
+// The standard libraries are always opened: every script of the engine may use them.
+LuaState *LuaState::Create(bool, bool) {
     LuaState *p_state = new LuaState;
-    if (_init_standard_library) luaL_openlibs(p_state->mp_l);
+    if (!p_state->mp_l) {
+        qordebug::error("Cannot create a Lua state");
+        delete p_state;
+        return nullptr;
+    }
+    luaL_openlibs(p_state->mp_l);
     return p_state;
 }
 
-void LuaState::Destroy(LuaState *_p_state) { delete _p_state; }
+void LuaState::Destroy(LuaState *_p_state) {
+    delete _p_state;
+}
 
 namespace {
 
-// Runs the chunk on top of the stack (or the load error under it) and reports a failure.
-int finish_call(LuaState &_state, lua_State *_l, int _status, bool _quiet, char *_p_error, size_t _error_size) {
+// After luaL_loadbuffer: runs the loaded chunk, or takes the load error. A failure leaves its
+// message in _p_error and is reported unless _quiet.
+int run_loaded_chunk(lua_State *_l, int _status, bool _quiet, char *_p_error, size_t _error_size) {
     if (_status == 0) _status = lua_pcall(_l, 0, 0, 0);
     if (_status == 0) return 0;
     char const *message = lua_tostring(_l, -1);
-    snprintf(_p_error, _error_size, "%s", message ? message : "unknown Lua error");
+    snprintf(_p_error, _error_size, "%s", message ? message : "(error object is not a string)");
     lua_pop(_l, 1);
     if (!_quiet) qordebug::warning("Lua error: %s", _p_error);
-    (void)_state;
     return _status;
 }
 
 } // namespace
 
 int LuaState::DoString(char const *_code, bool _quiet) {
-    if (!_code) return LUA_ERRRUN;
+    if (!_code) {
+        snprintf(m_last_error, sizeof(m_last_error), "no code");
+        return LUA_ERRRUN;
+    }
     int const status = luaL_loadbuffer(mp_l, _code, strlen(_code), _code);
-    return finish_call(*this, mp_l, status, _quiet, m_last_error, sizeof(m_last_error));
+    return run_loaded_chunk(mp_l, status, _quiet, m_last_error, sizeof(m_last_error));
 }
 
 int LuaState::DoFile(int _category, char const *_file_name, bool _quiet) {
@@ -66,7 +79,7 @@ int LuaState::DoFile(int _category, char const *_file_name, bool _quiet) {
     std::string const chunk_name = std::string("@") + _file_name;
     int const status = luaL_loadbuffer(mp_l, static_cast<char const *>(p_content), size, chunk_name.c_str());
     MMDeallocate(p_content);
-    return finish_call(*this, mp_l, status, _quiet, m_last_error, sizeof(m_last_error));
+    return run_loaded_chunk(mp_l, status, _quiet, m_last_error, sizeof(m_last_error));
 }
 
 LuaObject LuaState::GetGlobals() {
@@ -76,7 +89,9 @@ LuaObject LuaState::GetGlobals() {
     return globals;
 }
 
-char const *LuaState::GetLastError() const { return m_last_error; }
+char const *LuaState::GetLastError() const {
+    return m_last_error;
+}
 
 // ---------------------------------------------------------------------------------------------
 // LuaObject: construction and assignment
@@ -105,7 +120,9 @@ LuaObject &LuaObject::operator=(LuaObject const &_o) {
     return *this;
 }
 
-LuaObject::~LuaObject() { release(); }
+LuaObject::~LuaObject() {
+    release();
+}
 
 void LuaObject::release() {
     if (mp_state && m_ref != LUA_NOREF) luaL_unref(mp_state->GetCState(), LUA_REGISTRYINDEX, m_ref);
@@ -140,7 +157,9 @@ LuaObject &LuaObject::AssignNewTable(LuaState *_p_state, int _narr, int _nrec) {
     return *this;
 }
 
-LuaObject &LuaObject::AssignNewTable(int _narr, int _nrec) { return AssignNewTable(mp_state, _narr, _nrec); }
+LuaObject &LuaObject::AssignNewTable(int _narr, int _nrec) {
+    return AssignNewTable(mp_state, _narr, _nrec);
+}
 
 LuaObject &LuaObject::AssignString(LuaState *_p_state, char const *_value) {
     if (!_p_state) return *this;
@@ -152,7 +171,9 @@ LuaObject &LuaObject::AssignString(LuaState *_p_state, char const *_value) {
     return *this;
 }
 
-LuaObject &LuaObject::AssignInteger(LuaState *_p_state, int _value) { return AssignNumber(_p_state, _value); }
+LuaObject &LuaObject::AssignInteger(LuaState *_p_state, int _value) {
+    return AssignNumber(_p_state, _value);
+}
 
 LuaObject &LuaObject::AssignNumber(LuaState *_p_state, double _value) {
     if (!_p_state) return *this;
@@ -187,16 +208,26 @@ int LuaObject::Type() const {
     return type;
 }
 
-bool LuaObject::IsNil() const { return Type() == LUA_TNIL; }
-bool LuaObject::IsTable() const { return Type() == LUA_TTABLE; }
-bool LuaObject::IsString() const { return Type() == LUA_TSTRING; }
-bool LuaObject::IsNumber() const { return Type() == LUA_TNUMBER; }
-bool LuaObject::IsBoolean() const { return Type() == LUA_TBOOLEAN; }
+bool LuaObject::IsNil() const {
+    return Type() == LUA_TNIL;
+}
+bool LuaObject::IsTable() const {
+    return Type() == LUA_TTABLE;
+}
+bool LuaObject::IsString() const {
+    return Type() == LUA_TSTRING;
+}
+bool LuaObject::IsNumber() const {
+    return Type() == LUA_TNUMBER;
+}
+bool LuaObject::IsBoolean() const {
+    return Type() == LUA_TBOOLEAN;
+}
 
 bool LuaObject::IsInteger() const {
     if (!IsNumber()) return false;
     double const value = GetNumber();
-    return std::floor(value) == value;
+    return std::isfinite(value) && std::floor(value) == value;
 }
 
 // The string stays alive while this object holds it: the registry keeps the value.
@@ -224,7 +255,9 @@ int LuaObject::GetInteger() const {
     return static_cast<int>(value); // truncation toward zero
 }
 
-float LuaObject::GetFloat() const { return static_cast<float>(GetNumber()); }
+float LuaObject::GetFloat() const {
+    return static_cast<float>(GetNumber());
+}
 
 bool LuaObject::GetBoolean() const {
     if (Type() != LUA_TBOOLEAN) return false;
@@ -238,8 +271,18 @@ bool LuaObject::GetBoolean() const {
 // ---------------------------------------------------------------------------------------------
 // Tables
 // ---------------------------------------------------------------------------------------------
+//
+// Access is raw: a metamethod that raised an error here would have no protected call to catch it.
 
 namespace {
+
+// A value can go into a table only within its own state; nil of no state goes anywhere.
+bool fits_state(LuaObject const &_value, LuaState *_p_state) {
+    if (!_value.GetState() || _value.GetState() == _p_state) return true;
+    qordebug::assert_func("Expression:   %s\n%s\nFile: %s \nLine: %d\nFunction %s", "same state",
+                          "a Lua value can't move to another state", __FILE__, __LINE__, __func__);
+    return false;
+}
 
 } // namespace
 
@@ -248,7 +291,8 @@ LuaObject LuaObject::GetByName(char const *_key) const {
     if (!_key || !IsTable()) return result;
     lua_State *l = mp_state->GetCState();
     Push();
-    lua_getfield(l, -1, _key);
+    lua_pushstring(l, _key);
+    lua_rawget(l, -2);
     result.assign_from_stack(mp_state);
     lua_pop(l, 1);
     return result;
@@ -267,11 +311,11 @@ LuaObject LuaObject::GetByIndex(int _index) const {
 
 LuaObject LuaObject::GetByObject(LuaObject const &_key) const {
     LuaObject result(mp_state);
-    if (!IsTable() || _key.IsNil()) return result;
+    if (!IsTable() || _key.IsNil() || !fits_state(_key, mp_state)) return result;
     lua_State *l = mp_state->GetCState();
     Push();
     _key.Push();
-    lua_gettable(l, -2);
+    lua_rawget(l, -2);
     result.assign_from_stack(mp_state);
     lua_pop(l, 1);
     return result;
@@ -310,7 +354,7 @@ void set_field(LuaObject &_table, PushKey _push_key, PushValue _push_value) {
     _table.Push();
     _push_key(l);
     _push_value(l);
-    lua_settable(l, -3);
+    lua_rawset(l, -3);
     lua_pop(l, 1);
 }
 
@@ -365,7 +409,7 @@ LuaObject &LuaObject::SetBoolean(char const *_key, bool _value) {
     return *this;
 }
 LuaObject &LuaObject::SetObject(char const *_key, LuaObject const &_value) {
-    if (_key) set_field(*this, name_key(_key), object_value(_value));
+    if (_key && fits_state(_value, mp_state)) set_field(*this, name_key(_key), object_value(_value));
     return *this;
 }
 LuaObject &LuaObject::SetNil(char const *_key) {
@@ -389,7 +433,7 @@ LuaObject &LuaObject::SetBoolean(int _key, bool _value) {
     return *this;
 }
 LuaObject &LuaObject::SetObject(int _key, LuaObject const &_value) {
-    set_field(*this, index_key(_key), object_value(_value));
+    if (fits_state(_value, mp_state)) set_field(*this, index_key(_key), object_value(_value));
     return *this;
 }
 LuaObject &LuaObject::SetNil(int _key) {
@@ -397,10 +441,13 @@ LuaObject &LuaObject::SetNil(int _key) {
     return *this;
 }
 
-LuaObject &LuaObject::Insert(LuaObject const &_value) { return SetObject(GetN() + 1, _value); }
+LuaObject &LuaObject::Insert(LuaObject const &_value) {
+    return SetObject(GetN() + 1, _value);
+}
 
 bool LuaPlusH_next(LuaState *_p_state, LuaObject const &_table, LuaObject &_key, LuaObject &_value) {
-    if (!_p_state || !_table.IsTable()) return false;
+    if (!_p_state || _table.GetState() != _p_state || !_table.IsTable() || !fits_state(_key, _p_state))
+        return false;
     lua_State *l = _p_state->GetCState();
     _table.Push();
     _key.Push();
@@ -423,18 +470,24 @@ bool LuaPlusH_next(LuaState *_p_state, LuaObject const &_table, LuaObject &_key,
 namespace {
 
 bool is_keyword(std::string const &_name) {
-    static char const *const s_keywords[] = {"and",   "break", "do",  "else", "elseif", "end",   "false",
-                                             "for",   "function", "if", "in",  "local",  "nil",  "not",
-                                             "or",    "repeat", "return", "then", "true", "until", "while"};
+    static char const *const s_keywords[] = {"and", "break",    "do",     "else", "elseif", "end",   "false",
+                                             "for", "function", "if",     "in",   "local",  "nil",   "not",
+                                             "or",  "repeat",   "return", "then", "true",   "until", "while"};
     for (char const *keyword : s_keywords)
         if (_name == keyword) return true;
     return false;
 }
 
+// Lua's own identifier characters, independent of the C locale.
+bool is_name_char(char _c, bool _first) {
+    return _c == '_' || (_c >= 'a' && _c <= 'z') || (_c >= 'A' && _c <= 'Z') ||
+           (!_first && _c >= '0' && _c <= '9');
+}
+
 bool is_identifier(std::string const &_name) {
-    if (_name.empty() || isdigit(static_cast<unsigned char>(_name[0]))) return false;
-    for (char c : _name)
-        if (!isalnum(static_cast<unsigned char>(c)) && c != '_') return false;
+    if (_name.empty()) return false;
+    for (size_t i = 0; i < _name.size(); ++i)
+        if (!is_name_char(_name[i], i == 0)) return false;
     return !is_keyword(_name);
 }
 
@@ -443,11 +496,18 @@ void write_string(std::ostream &_out, char const *_text, size_t _length) {
     for (size_t i = 0; i < _length; ++i) {
         unsigned char const c = static_cast<unsigned char>(_text[i]);
         switch (c) {
-        case '"': _out << "\\\""; break;
-        case '\\': _out << "\\\\"; break;
-        case '\n': _out << "\\n"; break;
-        case '\r': _out << "\\r"; break;
-        case '\t': _out << "\\t"; break;
+        case '"':
+            _out << "\\\"";
+            break;
+        case '\\':
+            _out << "\\\\";
+            break;
+        case '\n':
+            _out << "\\n";
+            break;
+        case '\r':
+            _out << "\\r";
+            break;
         default:
             if (c < 32 || c == 127) {
                 char code[8];
@@ -488,13 +548,22 @@ bool key_less(SKey const &_a, SKey const &_b) {
     return _a.m_number < _b.m_number;
 }
 
-void write_value(lua_State *_l, int _index, std::ostream &_out, int _indent, std::vector<void const *> &_open);
+void write_value(lua_State *_l, int _index, std::ostream &_out, int _indent,
+                 std::vector<void const *> &_open);
 
-// The table at the top of the stack.
+// Tables nested deeper are written as nil: the writer recurses once per level, and Lua's parser
+// refuses chunks of about 200 nested levels.
+size_t const k_max_depth = 100;
+
+// The table at the top of the stack. _open holds the tables being written around it.
 void write_table(lua_State *_l, std::ostream &_out, int _indent, std::vector<void const *> &_open) {
     void const *identity = lua_topointer(_l, -1);
     if (std::find(_open.begin(), _open.end(), identity) != _open.end()) {
         _out << "nil --[[ a table that contains itself ]]";
+        return;
+    }
+    if (_open.size() >= k_max_depth || !lua_checkstack(_l, 4)) {
+        _out << "nil --[[ a table nested too deep ]]";
         return;
     }
     _open.push_back(identity);
@@ -560,11 +629,18 @@ void write_table(lua_State *_l, std::ostream &_out, int _indent, std::vector<voi
     _open.pop_back();
 }
 
-void write_value(lua_State *_l, int _index, std::ostream &_out, int _indent, std::vector<void const *> &_open) {
+void write_value(lua_State *_l, int _index, std::ostream &_out, int _indent,
+                 std::vector<void const *> &_open) {
     switch (lua_type(_l, _index)) {
-    case LUA_TNIL: _out << "nil"; break;
-    case LUA_TBOOLEAN: _out << (lua_toboolean(_l, _index) ? "true" : "false"); break;
-    case LUA_TNUMBER: write_number(_out, lua_tonumber(_l, _index)); break;
+    case LUA_TNIL:
+        _out << "nil";
+        break;
+    case LUA_TBOOLEAN:
+        _out << (lua_toboolean(_l, _index) ? "true" : "false");
+        break;
+    case LUA_TNUMBER:
+        write_number(_out, lua_tonumber(_l, _index));
+        break;
     case LUA_TSTRING: {
         size_t length = 0;
         char const *text = lua_tolstring(_l, _index, &length);
@@ -576,7 +652,9 @@ void write_value(lua_State *_l, int _index, std::ostream &_out, int _indent, std
         write_table(_l, _out, _indent, _open);
         lua_pop(_l, 1);
         break;
-    default: _out << "nil --[[ " << lua_typename(_l, lua_type(_l, _index)) << " ]]"; break;
+    default:
+        _out << "nil --[[ " << lua_typename(_l, lua_type(_l, _index)) << " ]]";
+        break;
     }
 }
 

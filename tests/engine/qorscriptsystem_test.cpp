@@ -1,0 +1,373 @@
+// qorscriptsystem: LuaObject values and tables, running code and files, walking tables, and dump.
+#include "qorscriptsystem.h"
+
+#include "qorbase.h"
+#include "qordebug.h"
+
+#include <gtest/gtest.h>
+#include <lua.hpp>
+
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <set>
+#include <sstream>
+#include <string>
+#include <vector>
+
+using LuaPlus::LuaObject;
+using LuaPlus::LuaState;
+
+namespace {
+
+struct SReport {
+    qordebug::EReportKind m_kind;
+    std::string m_text;
+};
+
+void capture_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
+    static_cast<std::vector<SReport> *>(_user)->push_back(SReport{_kind, _text});
+}
+
+std::string dump_text(LuaObject const &_object, char const *_name, int _indent = 0) {
+    std::ostringstream out;
+    _object.dump(_name, out, _indent);
+    return out.str();
+}
+
+// The bytes of a string value, zeros included.
+std::string string_of(LuaObject const &_object) {
+    lua_State *l = _object.GetState()->GetCState();
+    _object.Push();
+    size_t length = 0;
+    char const *text = lua_tolstring(l, -1, &length);
+    std::string const bytes(text ? text : "", length);
+    lua_pop(l, 1);
+    return bytes;
+}
+
+// A state of its own for every test, and captured reports.
+class LuaTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        mp_state = LuaState::Create(true, true);
+        ASSERT_NE(mp_state, nullptr);
+        qordebug::set_report_handler(capture_report, &m_reports, false, &mp_previous_handler,
+                                     &mp_previous_user);
+    }
+    void TearDown() override {
+        qordebug::set_report_handler(mp_previous_handler, mp_previous_user);
+        LuaState::Destroy(mp_state);
+    }
+
+    LuaObject global(char const *_name) { return mp_state->GetGlobals()[_name]; }
+    // Runs code that has to succeed.
+    void run(char const *_code) { ASSERT_EQ(mp_state->DoString(_code), 0) << mp_state->GetLastError(); }
+
+    LuaState *mp_state = nullptr;
+    std::vector<SReport> m_reports;
+    qordebug::report_handler_t mp_previous_handler = nullptr;
+    void *mp_previous_user = nullptr;
+};
+
+// ---------------------------------------------------------------------------------------------
+// Values and types
+// ---------------------------------------------------------------------------------------------
+
+TEST_F(LuaTest, ValuesReportTheirTypesAndContent) {
+    run("t = {7, 2.75, -2.75, 'text', true, {}}");
+    LuaObject t = global("t");
+    ASSERT_TRUE(t.IsTable());
+    EXPECT_EQ(t.Type(), LUA_TTABLE);
+
+    EXPECT_TRUE(t[1].IsNumber());
+    EXPECT_TRUE(t[1].IsInteger());
+    EXPECT_EQ(t[1].GetInteger(), 7);
+    EXPECT_TRUE(t[2].IsNumber());
+    EXPECT_FALSE(t[2].IsInteger());
+    EXPECT_EQ(t[2].GetNumber(), 2.75);
+    EXPECT_EQ(t[2].GetFloat(), 2.75f);
+    EXPECT_EQ(t[2].GetInteger(), 2); // truncation toward zero
+    EXPECT_EQ(t[3].GetInteger(), -2);
+    EXPECT_TRUE(t[4].IsString());
+    EXPECT_STREQ(t[4].GetString(), "text");
+    EXPECT_TRUE(t[5].IsBoolean());
+    EXPECT_TRUE(t[5].GetBoolean());
+    EXPECT_TRUE(t[6].IsTable());
+    EXPECT_TRUE(t[7].IsNil());
+    EXPECT_EQ(t[7].Type(), LUA_TNIL);
+}
+
+TEST_F(LuaTest, WrongTypesGiveNeutralValuesWithoutReport) {
+    run("t = {s = '12', n = 12, b = true}");
+    LuaObject t = global("t");
+    EXPECT_EQ(t["n"].GetString(), nullptr); // a number is no string
+    EXPECT_FALSE(t["n"].IsString());
+    EXPECT_EQ(t["s"].GetInteger(), 0); // a string is no number
+    EXPECT_EQ(t["s"].GetNumber(), 0.0);
+    EXPECT_FALSE(t["s"].IsNumber());
+    EXPECT_FALSE(t["n"].GetBoolean());
+    EXPECT_EQ(t["b"].GetInteger(), 0);
+    EXPECT_EQ(t.GetString(), nullptr);
+
+    LuaObject n = t["n"];
+    EXPECT_TRUE(n["x"].IsNil()); // table access on a non-table
+    EXPECT_TRUE(n[1].IsNil());
+    EXPECT_EQ(n.GetN(), 0);
+    EXPECT_EQ(n.GetTableCount(), 0);
+    n.SetString("x", "y").SetInteger(1, 2).Insert(t);
+    EXPECT_EQ(n.GetInteger(), 12);
+
+    LuaObject unbound; // nil of no state
+    EXPECT_TRUE(unbound.IsNil());
+    EXPECT_EQ(unbound.GetState(), nullptr);
+    EXPECT_TRUE(unbound["x"].IsNil());
+    unbound.SetString("x", "y");
+    EXPECT_TRUE(m_reports.empty());
+}
+
+TEST_F(LuaTest, CopiesShareTablesAndOutliveTheOriginal) {
+    LuaObject original(mp_state);
+    original.AssignNewTable();
+    LuaObject copy = original;
+    copy.SetString("name", "shared");
+    EXPECT_STREQ(original["name"].GetString(), "shared");
+
+    LuaObject text;
+    text.AssignString(mp_state, "kept");
+    LuaObject text_copy(text);
+    original.AssignNil();
+    text.AssignInteger(mp_state, 5);
+    run("collectgarbage('collect')");
+    EXPECT_STREQ(copy["name"].GetString(), "shared");
+    EXPECT_STREQ(text_copy.GetString(), "kept");
+    EXPECT_TRUE(original.IsNil());
+}
+
+// ---------------------------------------------------------------------------------------------
+// Tables
+// ---------------------------------------------------------------------------------------------
+
+TEST_F(LuaTest, IntegerAndStringKeysAreDistinct) {
+    LuaObject t;
+    t.AssignNewTable(mp_state);
+    t.SetInteger(1, 10).SetString("1", "one").SetNumber("ratio", 0.25).SetBoolean(2, false);
+    LuaObject child;
+    child.AssignNewTable(mp_state).SetString("k", "v");
+    t.SetObject("child", child);
+    mp_state->GetGlobals().SetObject("t", t);
+
+    EXPECT_EQ(t[1].GetInteger(), 10);
+    EXPECT_STREQ(t["1"].GetString(), "one");
+    EXPECT_TRUE(t[2].IsBoolean());
+    run("assert(t[1] == 10 and t['1'] == 'one' and t.ratio == 0.25 and t[2] == false and t.child.k == 'v')");
+
+    LuaObject key;
+    key.AssignString(mp_state, "ratio");
+    EXPECT_EQ(t.GetByObject(key).GetNumber(), 0.25);
+    key.AssignInteger(mp_state, 1);
+    EXPECT_EQ(t.GetByObject(key).GetInteger(), 10);
+}
+
+TEST_F(LuaTest, InsertAppendsAndCountsFollowTheKeys) {
+    LuaObject t;
+    t.AssignNewTable(mp_state);
+    LuaObject value;
+    for (char const *text : {"a", "b", "c"})
+        t.Insert(value.AssignString(mp_state, text));
+    EXPECT_EQ(t.GetN(), 3);
+    EXPECT_STREQ(t[3].GetString(), "c");
+    t.SetString("x", "1").SetString("y", "2");
+    EXPECT_EQ(t.GetN(), 3);
+    EXPECT_EQ(t.GetTableCount(), 5);
+    t.SetNil("x").SetNil(3);
+    EXPECT_EQ(t.GetN(), 2);
+    EXPECT_EQ(t.GetTableCount(), 3);
+}
+
+TEST_F(LuaTest, NextWalksEveryPairOnce) {
+    run("t = {10, 20, a = 'x', b = true}");
+    LuaObject t = global("t");
+    LuaObject key, value;
+    std::multiset<std::string> seen;
+    while (LuaPlus::LuaPlusH_next(mp_state, t, key, value)) {
+        std::string const name = key.IsString() ? key.GetString() : std::to_string(key.GetInteger());
+        seen.insert(name + "=" + (value.IsString() ? value.GetString() : std::to_string(value.GetInteger())));
+    }
+    EXPECT_EQ(seen, (std::multiset<std::string>{"1=10", "2=20", "a=x", "b=0"}));
+    EXPECT_TRUE(key.IsNil());
+    EXPECT_FALSE(LuaPlus::LuaPlusH_next(mp_state, t["a"], key, value)); // not a table
+}
+
+TEST_F(LuaTest, ObjectsOfAnotherStateAreRefused) {
+    LuaState *p_other = LuaState::Create();
+    {
+        LuaObject foreign;
+        foreign.AssignString(p_other, "foreign");
+        LuaObject t;
+        t.AssignNewTable(mp_state).SetString("k", "kept");
+        t.SetObject("k", foreign);
+        EXPECT_STREQ(t["k"].GetString(), "kept");
+        ASSERT_EQ(m_reports.size(), 1u);
+        EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_ASSERT);
+    }
+    LuaState::Destroy(p_other);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Running code and files
+// ---------------------------------------------------------------------------------------------
+
+TEST_F(LuaTest, DoStringReportsSyntaxAndRuntimeErrors) {
+    EXPECT_NE(mp_state->DoString("x = = 1"), 0);
+    ASSERT_EQ(m_reports.size(), 1u);
+    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
+    EXPECT_NE(m_reports[0].m_text.find(mp_state->GetLastError()), std::string::npos);
+    EXPECT_NE(std::string(mp_state->GetLastError()).find("unexpected symbol near '='"), std::string::npos)
+        << mp_state->GetLastError();
+
+    EXPECT_EQ(mp_state->DoString("y = 1; error('boom')"), LUA_ERRRUN);
+    EXPECT_NE(std::string(mp_state->GetLastError()).find("boom"), std::string::npos);
+    EXPECT_EQ(global("y").GetInteger(), 1); // what ran before the error stays
+    EXPECT_EQ(m_reports.size(), 2u);
+
+    EXPECT_EQ(mp_state->DoString("error('quiet one')", true), LUA_ERRRUN);
+    EXPECT_NE(std::string(mp_state->GetLastError()).find("quiet one"), std::string::npos);
+    EXPECT_EQ(m_reports.size(), 2u);
+    EXPECT_EQ(mp_state->DoString("z = string.format('%03d', 7)"), 0); // standard libraries are open
+    EXPECT_STREQ(global("z").GetString(), "007");
+}
+
+class LuaFileTest : public LuaTest {
+protected:
+    void SetUp() override {
+        LuaTest::SetUp();
+        char pattern[] = "/tmp/qorscript_test_XXXXXX";
+        ASSERT_NE(mkdtemp(pattern), nullptr);
+        m_dir = pattern;
+        qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
+    }
+    void TearDown() override {
+        qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, "");
+        std::filesystem::remove_all(m_dir);
+        LuaTest::TearDown();
+    }
+    void save(char const *_name, std::string const &_text) {
+        GetFileSystem()->save_file(qorbase::FILE_CATEGORY_UI, _name, _text.data(),
+                                   static_cast<unsigned>(_text.size()), 0);
+    }
+
+    std::string m_dir;
+};
+
+TEST_F(LuaFileTest, DoFileRunsAFileOfTheCategory) {
+    save("layouts/main.lua", "ui_windows_ini = {name = 'desktop', count = 2}\n");
+    EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "layouts/main.lua"), 0) << mp_state->GetLastError();
+    EXPECT_STREQ(global("ui_windows_ini")["name"].GetString(), "desktop");
+    EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_FONTS, "layouts/main.lua", true), LUA_ERRFILE);
+    EXPECT_TRUE(m_reports.empty());
+}
+
+TEST_F(LuaFileTest, DoFileOfMissingFileFailsAndReportsUnlessQuiet) {
+    EXPECT_NE(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "absent.lua", true), 0);
+    EXPECT_TRUE(m_reports.empty());
+    EXPECT_NE(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "absent.lua"), 0);
+    ASSERT_EQ(m_reports.size(), 1u);
+    EXPECT_NE(m_reports[0].m_text.find("absent.lua"), std::string::npos);
+}
+
+TEST_F(LuaFileTest, DoFileErrorNamesTheFileAndLine) {
+    save("broken.lua", "a = 1\nb = nil + 1\n");
+    EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "broken.lua"), LUA_ERRRUN);
+    EXPECT_EQ(std::string(mp_state->GetLastError()).rfind("broken.lua:2:", 0), 0u)
+        << mp_state->GetLastError();
+    ASSERT_EQ(m_reports.size(), 1u);
+    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
+}
+
+// ---------------------------------------------------------------------------------------------
+// dump
+// ---------------------------------------------------------------------------------------------
+
+TEST_F(LuaTest, DumpWritesKeysInStableOrder) {
+    run("t = {x = 1.5, 'two', sub = {k = 'v', [3] = 3}, ['not id'] = true, ['end'] = false, [1.5] = 0,"
+        " [-1] = -1, _under = 0, [false] = 'f', [10] = 2^53}");
+    EXPECT_EQ(dump_text(global("t"), "t"), "t = {\n"
+                                           "    [-1] = -1,\n"
+                                           "    [1] = \"two\",\n"
+                                           "    [10] = 9007199254740992,\n"
+                                           "    _under = 0,\n"
+                                           "    [\"end\"] = false,\n"
+                                           "    [\"not id\"] = true,\n"
+                                           "    sub = {\n"
+                                           "        [3] = 3,\n"
+                                           "        k = \"v\",\n"
+                                           "    },\n"
+                                           "    x = 1.5,\n"
+                                           "    [1.5] = 0,\n"
+                                           "    [false] = \"f\",\n"
+                                           "}\n");
+}
+
+TEST_F(LuaTest, DumpOfPlainValuesAndIndent) {
+    run("e = {} n = 0.1 s = 'a' b = true t = {k = {}}");
+    EXPECT_EQ(dump_text(global("e"), "e"), "e = {}\n");
+    EXPECT_EQ(dump_text(global("n"), "n"), "n = 0.10000000000000001\n");
+    EXPECT_EQ(dump_text(global("s"), "s"), "s = \"a\"\n");
+    EXPECT_EQ(dump_text(global("b"), "b"), "b = true\n");
+    EXPECT_EQ(dump_text(global("absent"), "absent"), "absent = nil\n");
+    EXPECT_EQ(dump_text(global("t"), "t", 1), "    t = {\n        k = {},\n    }\n");
+}
+
+TEST_F(LuaTest, DumpRoundTripsNestedTables) {
+    run("layout = {name = 'desktop', pos = {x = 20, y = -30.25}, small = 1e-300, big = 1e300, third = 1/3,"
+        " children = {{class = 'CButton', size = {100, 20}, visible = true},"
+        "             {class = 'CListBox', items = {'a', 'b', {deep = {deeper = {deepest = 'end'}}}}}}}");
+    std::string const first = dump_text(global("layout"), "layout");
+
+    LuaState *p_fresh = LuaState::Create();
+    ASSERT_EQ(p_fresh->DoString(first.c_str()), 0) << p_fresh->GetLastError() << "\n" << first;
+    std::string const second = dump_text(p_fresh->GetGlobals()["layout"], "layout");
+    EXPECT_EQ(second, first);
+    EXPECT_EQ(p_fresh->GetGlobals()["layout"]["third"].GetNumber(), 1.0 / 3.0);
+    EXPECT_EQ(p_fresh->DoString("assert(layout.children[2].items[3].deep.deeper.deepest == 'end')"), 0);
+    LuaState::Destroy(p_fresh);
+}
+
+TEST_F(LuaTest, DumpedStringsSurviveQuotesNewlinesAndBinaryBytes) {
+    run("s = 'say \"hi\"\\\\ back\\nnew\\rline\\0nul\\0001digit\\ttab\\127del\\255high\\1'");
+    std::string const original = string_of(global("s"));
+    ASSERT_EQ(original.size(), 48u) << original;
+
+    std::string const text = dump_text(global("s"), "s");
+    EXPECT_EQ(text, "s = \"say \\\"hi\\\"\\\\ back\\nnew\\rline\\000nul\\0001digit\\009tab\\127del\xff"
+                    "high\\001\"\n");
+    LuaState *p_fresh = LuaState::Create();
+    ASSERT_EQ(p_fresh->DoString(text.c_str()), 0) << p_fresh->GetLastError();
+    EXPECT_EQ(string_of(p_fresh->GetGlobals()["s"]), original);
+    LuaState::Destroy(p_fresh);
+}
+
+TEST_F(LuaTest, DumpWritesCyclesAndFunctionsAsNil) {
+    run("t = {name = 'loop', f = print}; t.self = t; t.child = {parent = t}");
+    std::string const text = dump_text(global("t"), "t");
+    EXPECT_EQ(text, "t = {\n"
+                    "    child = {\n"
+                    "        parent = nil --[[ a table that contains itself ]],\n"
+                    "    },\n"
+                    "    f = nil --[[ function ]],\n"
+                    "    name = \"loop\",\n"
+                    "    self = nil --[[ a table that contains itself ]],\n"
+                    "}\n");
+    EXPECT_EQ(mp_state->DoString(text.c_str()), 0) << mp_state->GetLastError();
+}
+
+// Kept for the sanitizer run: a chain deeper than the writer follows ends in nil, no overflow.
+TEST_F(LuaTest, DumpOfVeryDeepTableEnds) {
+    run("deep = {} local t = deep for i = 1, 5000 do t.next = {} t = t.next end");
+    std::string const text = dump_text(global("deep"), "deep");
+    EXPECT_NE(text.find("nil --[[ a table nested too deep ]]"), std::string::npos);
+    EXPECT_EQ(mp_state->DoString(text.c_str()), 0) << mp_state->GetLastError();
+}
+
+} // namespace
