@@ -1,6 +1,7 @@
 // qordebug: formats a report, hands it to the installed handler, writes it to stderr, and returns.
 #include "qordebug.h"
 
+#include <atomic>
 #include <cstdarg>
 #include <cstdio>
 
@@ -11,7 +12,7 @@ namespace {
 report_handler_t gp_handler = nullptr;
 void *gp_user = nullptr;
 bool g_echo = true;
-unsigned g_counts[3] = {0, 0, 0};
+std::atomic<unsigned> g_counts[3] = {}; // reports may come from any thread
 
 char const *const k_prefixes[3] = {"[assert] ", "[warning] ", "[error] "};
 
@@ -60,6 +61,8 @@ void set_report_handler(report_handler_t _handler, void *_user, bool _echo, repo
     g_echo = _handler ? _echo : true;
 }
 
-unsigned report_count(EReportKind _kind) { return _kind >= REPORT_ASSERT && _kind <= REPORT_ERROR ? g_counts[_kind] : 0; }
+unsigned report_count(EReportKind _kind) {
+    return _kind >= REPORT_ASSERT && _kind <= REPORT_ERROR ? g_counts[_kind].load() : 0u;
+}
 
 } // namespace qordebug

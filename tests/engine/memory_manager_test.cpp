@@ -1,0 +1,497 @@
+// The memory manager: entry points by name, heaps and their statistics, blocks that crossed a module
+// boundary, the heap checks, small blocks and the fixed pool records. The backend is the one that
+// QOR_MM_BACKEND names for this process; one test runs the backend-neutral suites again in a child
+// process with the other backend.
+#include "qorMemoryManager.h"
+
+#include <gtest/gtest.h>
+
+#include <cstddef>
+#include <cstdlib>
+#include <cstring>
+#include <dlfcn.h>
+#include <fstream>
+#include <malloc.h>
+#include <sstream>
+#include <spawn.h>
+#include <string>
+#include <sys/wait.h>
+#include <unistd.h>
+#include <vector>
+
+extern char **environ;
+
+namespace {
+
+bool is_system_backend() {
+    char const *backend = getenv("QOR_MM_BACKEND");
+    return backend && strcmp(backend, "system") == 0;
+}
+
+int new_heap() {
+    return MMHeapCreate(0x1000000, 0x800000);
+}
+
+void *allocate_on(int _heap, size_t _size) {
+    MMHeapSelect(_heap);
+    return MMAllocate(_size, 0);
+}
+
+std::vector<SMMHeapStats> all_heap_stats() {
+    std::vector<SMMHeapStats> stats(MMGetStatsForModules(nullptr, 0));
+    MMGetStatsForModules(stats.data(), static_cast<int>(stats.size()));
+    return stats;
+}
+
+SMMHeapStats heap_stats(int _heap) {
+    return all_heap_stats().at(_heap);
+}
+
+SMMHeapStats totals() {
+    SMMHeapStats total = {};
+    MMGetMemoryStatus(&total);
+    return total;
+}
+
+std::string read_file(std::string const &_path) {
+    std::ifstream in(_path);
+    std::stringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+std::string dump_text() {
+    std::string const path = testing::TempDir() + "mm_dump_" + std::to_string(getpid()) + ".txt";
+    MMDumpMemoryStats(path.c_str());
+    std::string text = read_file(path);
+    remove(path.c_str());
+    return text;
+}
+
+// The pool line of the dump for element size and count, or "" when there is no such pool.
+std::string pool_line(uint32_t _element_size, uint32_t _block_elements) {
+    std::string const text = dump_text();
+    std::string const head =
+        "pool " + std::to_string(_element_size) + " x " + std::to_string(_block_elements) + ":";
+    size_t const at = text.find(head);
+    return at == std::string::npos ? "" : text.substr(at, text.find('\n', at) - at);
+}
+
+// Allocates a block as the pool's client does and links it into the record.
+void add_client_block(SFixedPool &_pool, int _heap) {
+    size_t const bytes = size_t(_pool.m_element_size) * _pool.m_block_elements + sizeof(void *);
+    void *p_block = allocate_on(_heap, bytes);
+    *static_cast<void **>(p_block) = _pool.mp_blocks;
+    _pool.mp_blocks = p_block;
+    ++_pool.m_blocks;
+    _pool.m_total_bytes += static_cast<uint32_t>(bytes);
+}
+
+// Runs this test program again with the other backend and a filter; true when the child ran at
+// least one test and all of them passed.
+bool child_passes(char const *_filter, char const *_backend) {
+    char self[4096] = {};
+    if (readlink("/proc/self/exe", self, sizeof(self) - 1) <= 0) return false;
+    std::string const report = testing::TempDir() + "mm_child_" + std::to_string(getpid()) + ".json";
+    std::string filter_arg = std::string("--gtest_filter=") + _filter;
+    std::string output_arg = "--gtest_output=json:" + report;
+    char *argv[] = {self, &filter_arg[0], &output_arg[0], nullptr};
+
+    std::vector<std::string> env_text;
+    for (char **p_entry = environ; *p_entry; ++p_entry)
+        if (strncmp(*p_entry, "QOR_MM_BACKEND=", 15) != 0) env_text.push_back(*p_entry);
+    env_text.push_back(std::string("QOR_MM_BACKEND=") + _backend);
+    std::vector<char *> envp;
+    for (std::string &entry : env_text)
+        envp.push_back(&entry[0]);
+    envp.push_back(nullptr);
+
+    pid_t child = 0;
+    if (posix_spawn(&child, self, nullptr, nullptr, argv, envp.data()) != 0) return false;
+    int status = 0;
+    waitpid(child, &status, 0);
+    std::string const json = read_file(report);
+    remove(report.c_str());
+    size_t const count_at = json.find("\"tests\": "); // the first one is the whole run's
+    int const tests_run = count_at == std::string::npos ? 0 : atoi(json.c_str() + count_at + 9);
+    return WIFEXITED(status) && WEXITSTATUS(status) == 0 && tests_run > 0;
+}
+
+} // namespace
+
+// ---------------------------------------------------------------------------------------------
+// Entry points and backend
+// ---------------------------------------------------------------------------------------------
+
+TEST(MemoryManagerEntryPoints, AllSeventeenAreFoundByTheirCNames) {
+    void *module = dlopen("libqorMemoryManager.so", RTLD_NOW | RTLD_LOCAL);
+    ASSERT_NE(nullptr, module) << dlerror();
+    char const *const names[] = {"MMHeapCreate",
+                                 "MMHeapSelect",
+                                 "MMAllocate",
+                                 "MMDeallocate",
+                                 "MMExpand",
+                                 "MMGetBlockSize",
+                                 "MMGetMemoryStatus",
+                                 "MMGetStatsForModules",
+                                 "MMCheckMemoryCorrupt",
+                                 "MMGetMemoryBlockStatus",
+                                 "MMDumpMemoryStats",
+                                 "MMSmallAlloc",
+                                 "MMSmallRealloc",
+                                 "MMSmallFree",
+                                 "MMSmallMsize",
+                                 "MMGetFixedPool",
+                                 "MMReleaseFixedPool"};
+    for (char const *name : names)
+        EXPECT_NE(nullptr, dlsym(module, name)) << name;
+    EXPECT_EQ(reinterpret_cast<void *>(&MMAllocate), dlsym(module, "MMAllocate"));
+    dlclose(module);
+}
+
+TEST(MemoryManagerBackend, IsTheOneTheEnvironmentNames) {
+    std::string const expected = is_system_backend() ? "backend system," : "backend mimalloc,";
+    EXPECT_EQ(0u, dump_text().rfind(expected, 0)) << dump_text();
+}
+
+TEST(MemoryManagerBackend, OtherBackendPassesTheSameSuitesInAChildProcess) {
+    char const *const filter = "MemoryManagerBackend.IsTheOneTheEnvironmentNames:MemoryManagerHeaps.*:"
+                               "MemoryManagerForeignBlocks.*:MemoryManagerChecks.*:MemoryManagerFixedPools.*";
+    EXPECT_TRUE(child_passes(filter, is_system_backend() ? "mimalloc" : "system"));
+}
+
+// ---------------------------------------------------------------------------------------------
+// Heaps
+// ---------------------------------------------------------------------------------------------
+
+TEST(MemoryManagerHeaps, CreateGivesConsecutiveIdsWithARecordEach) {
+    int const first = new_heap();
+    int const second = new_heap();
+    ASSERT_GE(first, 0);
+    EXPECT_EQ(first + 1, second);
+    EXPECT_EQ(second + 1, MMGetStatsForModules(nullptr, 0));
+    SMMHeapStats const stats = heap_stats(second);
+    EXPECT_EQ(second, stats.m_heap);
+    EXPECT_EQ(0u, stats.m_allocations);
+    EXPECT_EQ(0u, stats.m_live_bytes);
+}
+
+TEST(MemoryManagerHeaps, BlocksAreCountedOnTheHeapThatMadeThemWhicheverIsSelected) {
+    int const a = new_heap();
+    int const b = new_heap();
+    void *p_a = allocate_on(a, 100);
+    void *p_b1 = allocate_on(b, 40);
+    void *p_b2 = allocate_on(b, 40);
+    ASSERT_TRUE(p_a && p_b1 && p_b2);
+
+    EXPECT_EQ(1u, heap_stats(a).m_allocations);
+    EXPECT_EQ(MMGetBlockSize(p_a), heap_stats(a).m_live_bytes);
+    EXPECT_EQ(2u, heap_stats(b).m_allocations);
+    if (is_system_backend()) {
+        EXPECT_EQ(80u, heap_stats(b).m_live_bytes); // requested sizes
+    }
+
+    MMHeapSelect(b); // freeing doesn't depend on the selection
+    MMDeallocate(p_a);
+    EXPECT_EQ(1u, heap_stats(a).m_deallocations);
+    EXPECT_EQ(0u, heap_stats(a).m_live_bytes);
+    EXPECT_EQ(0u, heap_stats(b).m_deallocations);
+    MMDeallocate(p_b1);
+    MMDeallocate(p_b2);
+    EXPECT_EQ(2u, heap_stats(b).m_deallocations);
+    EXPECT_EQ(0u, heap_stats(b).m_live_bytes);
+}
+
+TEST(MemoryManagerHeaps, AllocationWithoutAValidSelectionUsesOneDefaultHeap) {
+    int const heaps_before = MMGetStatsForModules(nullptr, 0);
+    MMHeapSelect(-1);
+    void *p_first = MMAllocate(16, 0);
+    int const heaps_after_first = MMGetStatsForModules(nullptr, 0);
+    MMHeapSelect(heaps_after_first + 100);
+    void *p_second = MMAllocate(16, 0);
+    MMHeapSelect(-1);
+    void *p_third = MMAllocate(16, 0);
+
+    ASSERT_TRUE(p_first && p_second && p_third);
+    EXPECT_LE(heaps_after_first, heaps_before + 1);
+    EXPECT_EQ(heaps_after_first, MMGetStatsForModules(nullptr, 0));
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_second));
+    MMDeallocate(p_first);
+    MMDeallocate(p_second);
+    MMDeallocate(p_third);
+}
+
+TEST(MemoryManagerHeaps, BlockSizeCoversTheRequestAndEveryByteIsUsable) {
+    int const heap = new_heap();
+    for (size_t size : {size_t(1), size_t(24), size_t(100), size_t(4096), size_t(100000)}) {
+        char *p = static_cast<char *>(allocate_on(heap, size));
+        ASSERT_NE(nullptr, p) << size;
+        size_t const block_size = MMGetBlockSize(p);
+        EXPECT_GE(block_size, size);
+        if (is_system_backend()) {
+            EXPECT_EQ(size, block_size);
+        }
+        memset(p, 0x5a, block_size);
+        MMDeallocate(p);
+    }
+    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
+}
+
+TEST(MemoryManagerHeaps, ExpandSucceedsWithinTheBlockAndFailsBeyondWithoutChangingIt) {
+    int const heap = new_heap();
+    char *p = static_cast<char *>(allocate_on(heap, 100));
+    size_t const size = MMGetBlockSize(p);
+    EXPECT_EQ(1, MMExpand(p, 50)); // no shrinking: the block stays as it is
+    EXPECT_EQ(size, MMGetBlockSize(p));
+    EXPECT_EQ(0, MMExpand(p, 1 << 20));
+    EXPECT_EQ(size, MMGetBlockSize(p));
+    EXPECT_EQ(size, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ(0, MMExpand(nullptr, 10));
+    MMDeallocate(p);
+}
+
+TEST(MemoryManagerHeaps, ExpandOnTheCHeapGrowsIntoRoomTheBlockAlreadyHas) {
+    if (!is_system_backend()) GTEST_SKIP() << "C heap only";
+    int const heap = new_heap();
+    void *p = allocate_on(heap, 100);
+    size_t const room = malloc_usable_size(p); // 100 under the sanitizers, a little more without
+    EXPECT_EQ(1, MMExpand(p, room));
+    EXPECT_EQ(room, MMGetBlockSize(p));
+    EXPECT_EQ(room, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ(0, MMExpand(p, room + 1));
+    MMDeallocate(p);
+    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
+}
+
+// Bigger than a heap's pages: mimalloc gives such a block a segment of its own.
+TEST(MemoryManagerHeaps, BigBlocksAreCountedAndFreedOnTheirHeap) {
+    int const heap = new_heap();
+    size_t const size = size_t(40) << 20;
+    void *p = allocate_on(heap, size);
+    ASSERT_NE(nullptr, p);
+    EXPECT_GE(heap_stats(heap).m_live_bytes, size);
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p));
+    EXPECT_NE(0, MMCheckMemoryCorrupt());
+    MMDeallocate(p);
+    EXPECT_EQ(1u, heap_stats(heap).m_deallocations);
+    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
+    EXPECT_NE(0, MMCheckMemoryCorrupt());
+}
+
+// ---------------------------------------------------------------------------------------------
+// Blocks the manager didn't make
+// ---------------------------------------------------------------------------------------------
+
+TEST(MemoryManagerForeignBlocks, DeallocateGivesACHeapBlockBackWithoutCountingIt) {
+    SMMHeapStats const before = totals();
+    void *p = malloc(64);
+    memset(p, 1, 64);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
+    EXPECT_EQ(0, MMExpand(p, 32));
+    MMDeallocate(p); // the sanitizers see a wrong allocator here; mimalloc would crash
+    SMMHeapStats const after = totals();
+    EXPECT_EQ(before.m_deallocations, after.m_deallocations);
+    EXPECT_EQ(before.m_live_bytes, after.m_live_bytes);
+}
+
+TEST(MemoryManagerForeignBlocks, DeallocateGivesASmallBlockBackToItsAllocator) {
+    SMMHeapStats const before = totals();
+    void *p = MMSmallAlloc(48);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
+    MMDeallocate(p);
+    EXPECT_EQ(before.m_deallocations, totals().m_deallocations);
+}
+
+TEST(MemoryManagerForeignBlocks, NullAndStackAddressesAreNoBlocks) {
+    int on_stack = 0;
+    MMDeallocate(nullptr);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(nullptr));
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(&on_stack));
+    EXPECT_EQ(0u, MMGetBlockSize(nullptr));
+}
+
+// ---------------------------------------------------------------------------------------------
+// Statistics and checks
+// ---------------------------------------------------------------------------------------------
+
+TEST(MemoryManagerChecks, StatusIsTheSumOfTheHeapRecords) {
+    int const heap = new_heap();
+    void *p = allocate_on(heap, 200);
+    SMMHeapStats sum = {};
+    for (SMMHeapStats const &stats : all_heap_stats()) {
+        sum.m_allocations += stats.m_allocations;
+        sum.m_deallocations += stats.m_deallocations;
+        sum.m_live_bytes += stats.m_live_bytes;
+    }
+    SMMHeapStats const total = totals();
+    EXPECT_EQ(-1, total.m_heap);
+    EXPECT_EQ(sum.m_allocations, total.m_allocations);
+    EXPECT_EQ(sum.m_deallocations, total.m_deallocations);
+    EXPECT_EQ(sum.m_live_bytes, total.m_live_bytes);
+    EXPECT_EQ(0, MMGetMemoryStatus(nullptr));
+    MMDeallocate(p);
+}
+
+TEST(MemoryManagerChecks, StatsForModulesWritesAtMostMaxRecordsAndRejectsBadArguments) {
+    new_heap();
+    new_heap();
+    int const count = MMGetStatsForModules(nullptr, 0);
+    ASSERT_GE(count, 2);
+    SMMHeapStats records[2] = {};
+    records[1].m_heap = 12345;
+    EXPECT_EQ(count, MMGetStatsForModules(records, 1));
+    EXPECT_EQ(0, records[0].m_heap);
+    EXPECT_EQ(12345, records[1].m_heap); // untouched
+    EXPECT_EQ(-1, MMGetStatsForModules(nullptr, 3));
+    EXPECT_EQ(-1, MMGetStatsForModules(records, -1));
+}
+
+TEST(MemoryManagerChecks, SmallAllocationsAreCountedProcessWideAndKeepTheirContent) {
+    uint64_t const before = totals().m_small_allocations;
+    char *p_a = static_cast<char *>(MMSmallAlloc(10));
+    void *p_b = MMSmallAlloc(0);
+    void *p_c = MMSmallAlloc(300);
+    ASSERT_TRUE(p_a && p_b && p_c);
+    EXPECT_EQ(before + 3, totals().m_small_allocations);
+    for (SMMHeapStats const &stats : all_heap_stats())
+        EXPECT_EQ(before + 3, stats.m_small_allocations);
+    EXPECT_GE(MMSmallMsize(p_a), 10u);
+    EXPECT_GE(MMSmallMsize(p_c), 300u);
+
+    memcpy(p_a, "ten bytes", 10);
+    p_a = static_cast<char *>(MMSmallRealloc(p_a, 5000));
+    ASSERT_NE(nullptr, p_a);
+    EXPECT_STREQ("ten bytes", p_a);
+    EXPECT_GE(MMSmallMsize(p_a), 5000u);
+    EXPECT_EQ(before + 3, totals().m_small_allocations); // realloc isn't an MMSmallAlloc call
+
+    MMSmallFree(p_a);
+    MMSmallFree(p_b);
+    MMSmallFree(p_c);
+    MMSmallFree(nullptr);
+    EXPECT_EQ(0u, MMSmallMsize(nullptr));
+}
+
+TEST(MemoryManagerChecks, NothingIsCorruptAfterOrdinaryUse) {
+    int const a = new_heap();
+    int const b = new_heap();
+    std::vector<void *> blocks;
+    for (int i = 0; i < 200; ++i)
+        blocks.push_back(allocate_on(i % 2 ? a : b, size_t(16 + i * 8)));
+    for (size_t i = 0; i < blocks.size(); i += 3)
+        MMDeallocate(blocks[i]);
+    EXPECT_NE(0, MMCheckMemoryCorrupt());
+    for (size_t i = 0; i < blocks.size(); ++i)
+        if (i % 3) MMDeallocate(blocks[i]);
+    EXPECT_NE(0, MMCheckMemoryCorrupt());
+}
+
+TEST(MemoryManagerChecks, BlockFreedBehindTheManagersBackIsFound) {
+    if (is_system_backend()) GTEST_SKIP() << "the C heap's blocks are checked by the sanitizers";
+    // In a child, since the heap stays inconsistent for the rest of the process.
+    EXPECT_EXIT(
+        {
+            void *p = allocate_on(new_heap(), 64);
+            MMSmallFree(p); // the small-block allocator frees it without the heap knowing
+            exit(MMCheckMemoryCorrupt() == 0 ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
+}
+
+TEST(MemoryManagerChecks, BlockStatusTellsLiveBlocksFromFreedOnes) {
+    int const heap = new_heap();
+    void *p_kept = allocate_on(heap, 32);
+    void *p_freed = allocate_on(heap, 32);
+    MMDeallocate(p_freed);
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_kept));
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_freed));
+    MMDeallocate(p_kept);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_kept));
+}
+
+TEST(MemoryManagerChecks, DumpWritesALinePerHeap) {
+    int const heap = new_heap();
+    void *p = allocate_on(heap, 64);
+    void *p_gone = allocate_on(heap, 64);
+    MMDeallocate(p_gone);
+    std::string const text = dump_text();
+    std::string const line = "heap " + std::to_string(heap) + ": 2 allocations, 1 deallocations, " +
+                             std::to_string(MMGetBlockSize(p)) + " live bytes\n";
+    EXPECT_NE(std::string::npos, text.find(line)) << text;
+    std::string const heaps = std::to_string(MMGetStatsForModules(nullptr, 0)) + " heaps, ";
+    EXPECT_NE(std::string::npos, text.find(heaps)) << text;
+    MMDeallocate(p);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Fixed pools
+// ---------------------------------------------------------------------------------------------
+
+TEST(MemoryManagerFixedPools, RecordFieldsLieInTheirContractOrder) {
+    EXPECT_EQ(0u, offsetof(SFixedPool, m_blocks));
+    EXPECT_EQ(4u, offsetof(SFixedPool, m_used));
+    EXPECT_EQ(8u, offsetof(SFixedPool, m_total_bytes));
+    EXPECT_EQ(12u, offsetof(SFixedPool, m_element_size));
+    EXPECT_EQ(16u, offsetof(SFixedPool, m_block_elements));
+    EXPECT_EQ(24u, offsetof(SFixedPool, mp_free));
+    EXPECT_EQ(32u, offsetof(SFixedPool, mp_blocks));
+}
+
+TEST(MemoryManagerFixedPools, NewRecordIsEmptyWithAtLeastAPointerPerElement) {
+    SFixedPool *p_pool = MMGetFixedPool(3, 50);
+    ASSERT_NE(nullptr, p_pool);
+    EXPECT_EQ(sizeof(void *), p_pool->m_element_size);
+    EXPECT_EQ(50u, p_pool->m_block_elements);
+    EXPECT_EQ(0u, p_pool->m_blocks);
+    EXPECT_EQ(0u, p_pool->m_used);
+    EXPECT_EQ(0u, p_pool->m_total_bytes);
+    EXPECT_EQ(nullptr, p_pool->mp_free);
+    EXPECT_EQ(nullptr, p_pool->mp_blocks);
+    MMReleaseFixedPool(p_pool);
+}
+
+TEST(MemoryManagerFixedPools, EqualSizeAndCountShareOneRecord) {
+    SFixedPool *p_a = MMGetFixedPool(24, 77);
+    SFixedPool *p_b = MMGetFixedPool(24, 77);
+    SFixedPool *p_other_count = MMGetFixedPool(24, 78);
+    SFixedPool *p_other_size = MMGetFixedPool(32, 77);
+    SFixedPool *p_small = MMGetFixedPool(2, 77); // both come to one pointer per element
+    SFixedPool *p_word = MMGetFixedPool(sizeof(void *), 77);
+    EXPECT_EQ(p_a, p_b);
+    EXPECT_NE(p_a, p_other_count);
+    EXPECT_NE(p_a, p_other_size);
+    EXPECT_EQ(p_small, p_word);
+    EXPECT_EQ("pool 24 x 77: 2 references, 0 blocks, 0 used, 0 bytes", pool_line(24, 77));
+    for (SFixedPool *p : {p_a, p_b, p_other_count, p_other_size, p_small, p_word})
+        MMReleaseFixedPool(p);
+    EXPECT_EQ("", pool_line(24, 77));
+}
+
+TEST(MemoryManagerFixedPools, LastReleaseGivesTheClientsBlocksBackToTheirHeap) {
+    int const heap = new_heap();
+    SFixedPool *p_pool = MMGetFixedPool(40, 4);
+    SFixedPool *p_shared = MMGetFixedPool(40, 4);
+    add_client_block(*p_pool, heap);
+    add_client_block(*p_pool, heap);
+    void *p_block = p_pool->mp_blocks;
+    EXPECT_EQ(2u, heap_stats(heap).m_allocations);
+
+    MMReleaseFixedPool(p_shared);
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_block));
+    EXPECT_EQ(0u, heap_stats(heap).m_deallocations);
+
+    MMReleaseFixedPool(p_pool);
+    EXPECT_EQ(2u, heap_stats(heap).m_deallocations);
+    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ("", pool_line(40, 4));
+}
+
+TEST(MemoryManagerFixedPools, ReleaseOfAnUnknownRecordChangesNothing) {
+    SFixedPool *p_pool = MMGetFixedPool(56, 9);
+    SFixedPool stranger = *p_pool;
+    MMReleaseFixedPool(&stranger);
+    MMReleaseFixedPool(nullptr);
+    EXPECT_EQ("pool 56 x 9: 1 references, 0 blocks, 0 used, 0 bytes", pool_line(56, 9));
+    MMReleaseFixedPool(p_pool);
+}

@@ -1,0 +1,95 @@
+// The platform layer: the clocks and their replacement, module loading and its errors, the message
+// box on stderr.
+#include "qorMemoryManager.h"
+#include "qor_platform.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <ctime>
+#include <string>
+
+using namespace qorplatform;
+
+namespace {
+
+int64_t monotonic_ns() {
+    timespec now;
+    clock_gettime(CLOCK_MONOTONIC, &now);
+    return int64_t(now.tv_sec) * 1000000000 + now.tv_nsec;
+}
+
+// Puts the system clock back whatever a test does.
+class PlatformClockTest : public testing::Test {
+protected:
+    void TearDown() override { set_clock(nullptr); }
+};
+
+} // namespace
+
+TEST_F(PlatformClockTest, SystemClocksAreTheMonotonicClock) {
+    int64_t const before = monotonic_ns();
+    int64_t const counter = query_performance_counter();
+    uint32_t const ticks = get_tick_count();
+    int64_t const after = monotonic_ns();
+
+    EXPECT_EQ(1000000000, query_performance_frequency());
+    EXPECT_LE(before, counter);
+    EXPECT_LE(counter, after);
+    // Tick counts wrap, so they compare by their distance modulo 2^32.
+    EXPECT_LE(uint32_t(ticks - uint32_t(before / 1000000)), uint32_t((after - before) / 1000000 + 1));
+}
+
+TEST_F(PlatformClockTest, InstalledClockReplacesBothCountersUntilRemoved) {
+    CManualClock clock(5000);
+    set_clock(&clock);
+    EXPECT_EQ(5000u, get_tick_count());
+    EXPECT_EQ(int64_t(5000) * 1000000, query_performance_counter());
+    clock.advance_ms(16);
+    EXPECT_EQ(5016u, get_tick_count());
+    EXPECT_EQ(int64_t(5016) * 1000000, query_performance_counter());
+
+    set_clock(nullptr);
+    int64_t const before = monotonic_ns();
+    EXPECT_GE(query_performance_counter(), before);
+}
+
+TEST(PlatformModules, LoadsTheMemoryManagerAndFindsItsEntryPoint) {
+    void *module = load_library("libqorMemoryManager.so");
+    ASSERT_NE(nullptr, module) << last_module_error();
+    // The module is already a neighbour of this program, so it is the same code.
+    EXPECT_EQ(reinterpret_cast<void *>(&MMAllocate), get_proc_address(module, "MMAllocate"));
+    free_library(module);
+}
+
+TEST(PlatformModules, MissingFileFailsWithTheLoadersMessage) {
+    EXPECT_EQ(nullptr, load_library("libqorNoSuchModule.so"));
+    EXPECT_NE(std::string::npos, std::string(last_module_error()).find("libqorNoSuchModule.so"))
+        << last_module_error();
+}
+
+TEST(PlatformModules, MissingSymbolFailsWithTheLoadersMessage) {
+    void *module = load_library("libqorMemoryManager.so");
+    ASSERT_NE(nullptr, module);
+    EXPECT_EQ(nullptr, get_proc_address(module, "MMNoSuchEntry"));
+    EXPECT_NE(std::string::npos, std::string(last_module_error()).find("MMNoSuchEntry"))
+        << last_module_error();
+    free_library(module);
+}
+
+TEST(PlatformModules, NullArgumentsFailWithAMessage) {
+    EXPECT_EQ(nullptr, load_library(nullptr));
+    EXPECT_STREQ("no file name", last_module_error());
+    EXPECT_EQ(nullptr, get_proc_address(nullptr, "MMAllocate"));
+    EXPECT_STREQ("no module", last_module_error());
+    free_library(nullptr);
+}
+
+TEST(PlatformMessageBox, WritesCaptionAndTextToStderr) {
+    EXPECT_EXIT(
+        {
+            message_box("libqorMemoryManager.so load error!", "MemoryManager");
+            exit(0);
+        },
+        testing::ExitedWithCode(0), "^MemoryManager: libqorMemoryManager.so load error!\n$");
+}
