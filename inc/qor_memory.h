@@ -93,7 +93,9 @@ public:
     }
     static void *operator new[](size_t, void *_p) noexcept { return _p; }
     static void operator delete[](void *_p) { ::operator delete[](_p); }
-    static void operator delete[](void *_p, std::nothrow_t const &_nt) noexcept { ::operator delete[](_p, _nt); }
+    static void operator delete[](void *_p, std::nothrow_t const &_nt) noexcept {
+        ::operator delete[](_p, _nt);
+    }
     static void operator delete[](void *, void *) noexcept {}
 
     static fixed_pool_helpers::SPool m_pool;
@@ -129,15 +131,45 @@ public:
     }
 };
 
+// A standard allocator over the library's operator new: the routed heap. Containers of the
+// library's public types carry it, so that storage allocated in the library and freed by inline
+// code in another module (or the other way round) always meets the same heap.
 template <class T>
-using qor_vector = std::vector<T>;
+class qor_allocator {
+public:
+    typedef T value_type;
+
+    qor_allocator() noexcept {}
+    template <class U>
+    qor_allocator(qor_allocator<U> const &) noexcept {}
+
+    T *allocate(size_t _n) {
+        void *p = qor_malloc(_n * sizeof(T));
+        if (!p) throw std::bad_alloc();
+        return static_cast<T *>(p);
+    }
+    void deallocate(T *_p, size_t) noexcept { qor_free(_p); }
+
+    template <class U>
+    bool operator==(qor_allocator<U> const &) const noexcept {
+        return true;
+    }
+    template <class U>
+    bool operator!=(qor_allocator<U> const &) const noexcept {
+        return false;
+    }
+};
+
+template <class T>
+using qor_vector = std::vector<T, qor_allocator<T>>;
 
 template <class K, class V, class Compare = std::less<K>>
 using qor_map = std::map<K, V, Compare, qor_small_allocator<std::pair<K const, V>>>;
 
 typedef std::basic_string<char, std::char_traits<char>, qor_small_allocator<char>> string;
 // 16-bit text units; never wchar_t, which has 32 bits here.
-typedef std::basic_string<unsigned short, std::char_traits<unsigned short>, qor_small_allocator<unsigned short>>
+typedef std::basic_string<unsigned short, std::char_traits<unsigned short>,
+                          qor_small_allocator<unsigned short>>
     wstring;
 
 } // namespace qorui

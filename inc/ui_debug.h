@@ -8,8 +8,12 @@ void report_contract(char const *_expression, char const *_message, char const *
                      char const *_function);
 } // namespace qorui
 
-#define QOR_CHECK(_expr)                                                                             \
+#define QOR_CHECK(_expr)                                                                                     \
     ((_expr) ? true : (::qorui::report_contract(#_expr, nullptr, __FILE__, __LINE__, __func__), false))
 
-#define QOR_CHECK_MSG(_expr, _message)                                                               \
+#define QOR_CHECK_MSG(_expr, _message)                                                                       \
     ((_expr) ? true : (::qorui::report_contract(#_expr, _message, __FILE__, __LINE__, __func__), false))
+
+// For a contract whose C++ needs casts that its reported expression doesn't show.
+#define QOR_CHECK_AS(_expr, _text)                                                                           \
+    ((_expr) ? true : (::qorui::report_contract(_text, nullptr, __FILE__, __LINE__, __func__), false))
