@@ -14,22 +14,25 @@ namespace qorui {
 // library's profilers.
 int64_t profiler_frequency();
 
+class CTimeProfilerNode;
+typedef std::list<CTimeProfilerNode, qor_allocator<CTimeProfilerNode>> CTimeProfilerNodes;
+
 class CTimeProfilerNode {
 public:
     explicit CTimeProfilerNode(char const *_name);
 
     enum { N_SAMPLES = 64 };
 
-    char const *mp_name; // the caller's text, not copied; must outlive the node
-    int64_t m_start;     // counter at the last begin
-    int64_t m_end;       // counter at the last end
-    int64_t m_samples[N_SAMPLES]; // the last 64 durations in counter ticks, a ring
-    int64_t m_sum;       // sum of the ring
-    int32_t m_count;     // samples in the ring, up to 64
-    int32_t m_index;     // the ring's last written slot
-    int64_t m_total_us;  // total time in microseconds since the node was made
-    int64_t m_average_us; // mean of the ring in microseconds
-    std::list<CTimeProfilerNode> m_children; // in order of creation; addresses stay valid
+    char const *mp_name;           // the caller's text, not copied; must outlive the node
+    int64_t m_start;               // counter at the last begin
+    int64_t m_end;                 // counter at the last end
+    int64_t m_samples[N_SAMPLES];  // the last 64 durations in counter ticks, a ring
+    int64_t m_sum;                 // sum of the ring
+    int32_t m_count;               // samples in the ring, up to 64
+    int32_t m_index;               // the ring's last written slot
+    int64_t m_total_us;            // total time in microseconds since the node was made
+    int64_t m_average_us;          // mean of the ring in microseconds
+    CTimeProfilerNodes m_children; // in order of creation; addresses stay valid
 
     // Adds one measured duration of _ticks counter ticks.
     void add_sample(int64_t _ticks);
@@ -54,10 +57,11 @@ public:
     bool is_enabled() const { return m_enabled; }
 
 private:
-    void dump_node(IStatsPage *_p_page, CTimeProfilerNode const &_node, unsigned _depth, unsigned &_line) const;
+    void dump_node(IStatsPage *_p_page, CTimeProfilerNode const &_node, unsigned _depth,
+                   unsigned &_line) const;
 
     bool m_enabled;
-    std::list<CTimeProfilerNode> m_roots;  // top-level nodes, in order of creation
+    CTimeProfilerNodes m_roots;              // top-level nodes, in order of creation
     qor_vector<CTimeProfilerNode *> m_stack; // the nodes open now, innermost last
 };
 

@@ -14,6 +14,7 @@
 #include "qorbase.h"
 #include "qordebug.h"
 #include "ui_debug.h"
+#include "ui_stats_page.h"
 #include "ui_time_profiler.h"
 
 #include <cstring>
@@ -105,8 +106,12 @@ CUserInterface::CUserInterface()
     : mp_desktop(nullptr), mp_console(nullptr), mp_reserved(nullptr), m_scr_w(0), m_scr_h(0),
       m_hide_console(false) {}
 
+// The pages go from the last to the first.
 CUserInterface::~CUserInterface() {
-
+    while (!m_stats_pages.empty()) {
+        delete m_stats_pages.back();
+        m_stats_pages.pop_back();
+    }
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -141,13 +146,14 @@ void CUserInterface::draw_plaque() {
 
     IRenderQOR *p_render = engine_interfaces().get_render(true);
     if (!p_render) return;
-    int const material = p_render->create_material("ui_image", name, nullptr, nullptr, nullptr, nullptr, true, false);
+    int const material =
+        p_render->create_material("ui_image", name, nullptr, nullptr, nullptr, nullptr, true, false);
     p_render->begin_2d();
     p_render->set_material(material);
     rgba_t const white(255, 255, 255, 255);
-    p_render->draw_quad(vec2_t{-1.0f, 1.0f}, vec2_t{0.0f, 0.0f}, white, vec2_t{-1.0f, -1.0f}, vec2_t{0.0f, 1.0f},
-                        white, vec2_t{1.0f, -1.0f}, vec2_t{1.0f, 1.0f}, white, vec2_t{1.0f, 1.0f},
-                        vec2_t{1.0f, 0.0f}, white);
+    p_render->draw_quad(vec2_t{-1.0f, 1.0f}, vec2_t{0.0f, 0.0f}, white, vec2_t{-1.0f, -1.0f},
+                        vec2_t{0.0f, 1.0f}, white, vec2_t{1.0f, -1.0f}, vec2_t{1.0f, 1.0f}, white,
+                        vec2_t{1.0f, 1.0f}, vec2_t{1.0f, 0.0f}, white);
     p_render->end_2d();
     p_render->present();
     p_render->destroy_material(material);
@@ -169,9 +175,10 @@ void CUserInterface::load_game_library() {
         if (QOR_CHECK(p_library)) name = p_library->get_string(k_no_library);
     }
     if (strcmp(name, k_no_library) == 0) {
-        qordebug::error("GameUI library name is not specified.\nPlease, specify parameter '%s' in '[%s]' section "
-                        "of GDF file",
-                        "gameui_library", "ui_libraries");
+        qordebug::error(
+            "GameUI library name is not specified.\nPlease, specify parameter '%s' in '[%s]' section "
+            "of GDF file",
+            "gameui_library", "ui_libraries");
         return;
     }
     g_interface_server->load_module(1, name);
@@ -180,13 +187,15 @@ void CUserInterface::load_game_library() {
 void CUserInterface::register_commands() {
     ICmdManagerBase *p_commands = engine_interfaces().get_cmd_manager(true);
     if (!p_commands) return;
-    for (SCommand const &command : k_commands) p_commands->register_command(command.mp_name, command.mp_callback, this);
+    for (SCommand const &command : k_commands)
+        p_commands->register_command(command.mp_name, command.mp_callback, this);
 }
 
 void CUserInterface::unregister_commands() {
     ICmdManagerBase *p_commands = engine_interfaces().get_cmd_manager(true);
     if (!p_commands) return;
-    for (SCommand const &command : k_commands) p_commands->unregister_command(command.mp_name);
+    for (SCommand const &command : k_commands)
+        p_commands->unregister_command(command.mp_name);
 }
 
 // The first of the two calls of a frame. The "ui" page is made at the first update.
@@ -209,17 +218,27 @@ void CUserInterface::shutdown() {
     unregister_commands();
 }
 
-IConsole *CUserInterface::get_console() { return nullptr; }
+IConsole *CUserInterface::get_console() {
+    return nullptr;
+}
 
 void CUserInterface::on_app_activate(bool) {}
 
-unsigned short const *CUserInterface::get_local_string(char const *) { return nullptr; }
+unsigned short const *CUserInterface::get_local_string(char const *) {
+    return nullptr;
+}
 
-char const *CUserInterface::get_local_key(unsigned short const *) { return nullptr; }
+char const *CUserInterface::get_local_key(unsigned short const *) {
+    return nullptr;
+}
 
-float CUserInterface::get_scale_w() { return 1.0f; }
+float CUserInterface::get_scale_w() {
+    return 1.0f;
+}
 
-float CUserInterface::get_scale_h() { return 1.0f; }
+float CUserInterface::get_scale_h() {
+    return 1.0f;
+}
 
 // ---------------------------------------------------------------------------------------------
 // Input: everything goes to the desktop, once there is one.
@@ -241,10 +260,37 @@ void CUserInterface::on_char(unsigned _code) {
 // Stats pages
 // ---------------------------------------------------------------------------------------------
 
-IStatsPage *CUserInterface::create_stats_page(char const *) { return nullptr; }
-unsigned CUserInterface::get_stats_pages_count() { return 0; }
-IStatsPage *CUserInterface::get_stats_page(unsigned) { return nullptr; }
-IStatsPage *CUserInterface::get_stats_page(char const *) { return nullptr; }
-IStatsPage *CUserInterface::get_current_stats_page() { return nullptr; }
+// A name that exists gives its page again.
+IStatsPage *CUserInterface::create_stats_page(char const *_name) {
+    if (IStatsPage *p_page = get_stats_page(_name)) return p_page;
+    CStatsPage *p_page = new CStatsPage(this, _name);
+    m_stats_pages.push_back(p_page);
+    return p_page;
+}
+
+unsigned CUserInterface::get_stats_pages_count() {
+    return static_cast<unsigned>(m_stats_pages.size());
+}
+
+IStatsPage *CUserInterface::get_stats_page(unsigned _idx) {
+    return _idx < m_stats_pages.size() ? m_stats_pages[_idx] : nullptr;
+}
+
+// Exact, case-sensitive names; the first page of that name in creation order.
+IStatsPage *CUserInterface::get_stats_page(char const *_name) {
+    if (!_name) return nullptr;
+    for (CStatsPage *p_page : m_stats_pages) {
+        if (!QOR_CHECK(p_page)) continue;
+        if (std::strcmp(p_page->get_name(), _name) == 0) return p_page;
+    }
+    return nullptr;
+}
+
+// The earliest page that is shown.
+IStatsPage *CUserInterface::get_current_stats_page() {
+    for (CStatsPage *p_page : m_stats_pages)
+        if (p_page && p_page->is_show()) return p_page;
+    return nullptr;
+}
 
 } // namespace qorui

@@ -56,7 +56,7 @@ void CTimeProfilerNode::add_sample(int64_t _ticks) {
 CTimeProfiler::CTimeProfiler() : m_enabled(false) {}
 
 CTimeProfilerNode *CTimeProfiler::create_node(char const *_name) {
-    std::list<CTimeProfilerNode> &siblings = m_stack.empty() ? m_roots : m_stack.back()->m_children;
+    CTimeProfilerNodes &siblings = m_stack.empty() ? m_roots : m_stack.back()->m_children;
     siblings.emplace_back(_name);
     return &siblings.back();
 }
@@ -100,7 +100,8 @@ void CTimeProfiler::dump_node(IStatsPage *_p_page, CTimeProfilerNode const &_nod
         memcpy(buffer + length, name, name_length);
         length += name_length;
     }
-    while (length < k_numbers_column) buffer[length++] = '.';
+    while (length < k_numbers_column)
+        buffer[length++] = '.';
     if (length > k_numbers_column) length = k_numbers_column; // numbers stand at column 65 always
     snprintf(buffer + length, k_numbers_size, " %.3f, %.3f", _node.m_average_us * 0.001f,
              _node.m_total_us * 0.001f);

@@ -1,0 +1,126 @@
+// Events: the vocabulary, the event object that carries a type, a dispatch type, two window links
+// and a typed data stream, the names that layouts use, and the per-object table of callbacks.
+// Events are plain synchronous calls; there is no queue.
+#pragma once
+#include "data_stream_base.h"
+#include "ui_geometry.h"
+#include "ui_huid.h"
+
+#include <loki/Functor.h>
+#include <loki/Threads.h>
+#include <list>
+
+namespace qorui {
+
+class CWindow;
+class CEventDispatcher;
+
+// The data each event carries stands beside it.
+enum EEventType : int {
+    EVENT_UPDATE = 0,               // int: the value given to the desktop's update
+    EVENT_DRAW = 1,                 //
+    EVENT_HIDE = 2,                 //
+    EVENT_SHOW = 3,                 //
+    EVENT_SHOW_MAXIMIZED = 4,       //
+    EVENT_SHOW_NORMAL = 5,          //
+    EVENT_ACTIVATE = 6,             //
+    EVENT_DEACTIVATE = 7,           //
+    EVENT_LOST_FOCUS = 8,           //
+    EVENT_ENABLE = 9,               //
+    EVENT_DISABLE = 10,             //
+    EVENT_RESIZE = 11,              // int width, int height; handlers may overwrite them in place
+    EVENT_RESIZED = 12,             //
+    EVENT_DRAG_BEGIN = 13,          //
+    EVENT_DRAG = 14,                // point_t: the pointer's movement
+    EVENT_DRAG_END = 15,            //
+    EVENT_REPORT_POINT_INSIDE = 16, // point_t: a position on the desktop
+    EVENT_POINTER_ENTER = 17,       //
+    EVENT_POINTER_EXIT = 18,        //
+    EVENT_POINTER_MOVE = 19,        // vec2_t: the movement as the engine gave it
+    EVENT_POINTER_POS = 20,         // point_t: the new pointer position
+    EVENT_POINTER_DOWN = 21,        // int: the button
+    EVENT_POINTER_UP = 22,          // int: the button
+    EVENT_WHEEL_ROTATED = 23,       // float: the rotation
+    EVENT_CLICK = 24,               //
+    EVENT_DOUBLE_CLICK = 25,        //
+    EVENT_CHANGED = 26,             //
+    EVENT_SET_TEXT = 27,            // wstring
+    EVENT_SET_STR = 28,             // string
+    // 29 and 30 are gaps that the values below depend on.
+    EVENT_KEY_DOWN = 31,           // int: the key code; int: a second value of the engine
+    EVENT_KEY_UP = 32,             // int: the key code
+    EVENT_CHAR = 33,               // int: the character code
+    EVENT_LINE_UP = 34,            //
+    EVENT_LINE_DOWN = 35,          //
+    EVENT_PAGE_UP = 36,            //
+    EVENT_PAGE_DOWN = 37,          //
+    EVENT_SCROLL_SMALL_STEP = 38,  // int: direction, -1 or +1
+    EVENT_SCROLL_LARGE_STEP = 39,  // int: direction, -1 or +1
+    EVENT_CHECKED = 40,            //
+    EVENT_UNCHECKED = 41,          //
+    EVENT_HIGHLIGHTED = 42,        //
+    EVENT_RESOURCE_INVALIDATE = 43 //
+};
+
+class CWndEvent : public CWindowDataStream {
+public:
+    // Where an event goes behind its receiver.
+    enum EDispatchType : int { DISPATCH_NONE = 0, DISPATCH_CHILDREN = 1, DISPATCH_PARENT = 2 };
+
+    explicit CWndEvent(EEventType _id);
+    // Copying moves the stream: the source is left empty. Type, dispatch type and links are copied.
+    CWndEvent(CWndEvent const &_o) = default;
+    CWndEvent &operator=(CWndEvent const &_o) = default;
+    virtual ~CWndEvent() {}
+
+    EEventType get_id() const { return m_id; }
+    CWindow *get_receiver() const;
+    CWindow *get_activator() const { return mp_activator; }
+    // Handlers hold the event as const and still redirect it.
+    void set_activator(CWindow *_p_activator) const { mp_activator = _p_activator; }
+    EDispatchType get_dispatch_type() const { return m_dispatch_type; }
+    void set_dispatch_type(EDispatchType _type) const { m_dispatch_type = _type; }
+
+    // The names of layouts. A name is registered once; a later registration changes nothing.
+    static bool register_event_name(string const &_name, EEventType _id);
+    static bool get_id_by_name(string const &_name, EEventType &_id);
+    // The first name in sort order with that value.
+    static bool get_name_by_id(EEventType _id, string &_name);
+    static qor_map<string, EEventType, std::less<string>> m_events_names;
+
+private:
+    friend class CEventDispatcher;
+
+    mutable EDispatchType m_dispatch_type;
+    EEventType m_id;
+    mutable CEventDispatcher *mp_receiver; // the dispatcher whose callback is running
+    mutable CWindow *mp_activator;         // the window that last sent the event
+};
+
+typedef Loki::Functor<void, LOKI_TYPELIST_1(CWndEvent const *), Loki::SingleThreaded> CEventCallback;
+
+// Per event type, callbacks in order of registration. A callback lives as long as its dispatcher;
+// the object it is bound to isn't owned.
+class CEventDispatcher {
+public:
+    CEventDispatcher() {}
+    virtual ~CEventDispatcher() {}
+
+    virtual void on_event(CWndEvent const *_p_event) = 0;
+    virtual void send_event(CWindow *_p_receiver, CWndEvent const *_p_event,
+                            CWndEvent::EDispatchType _type) = 0;
+
+    // The same functor registered twice runs twice.
+    void register_callback(EEventType const &_id, CEventCallback const &_callback);
+
+protected:
+    // Each callback reads the stream from its head and sees what earlier ones overwrote; one
+    // registered during the pass runs in the same pass.
+    void dispatch_event(CWndEvent const *_p_event);
+
+private:
+    typedef std::list<CEventCallback, qor_allocator<CEventCallback>> CCallbacks;
+    qor_map<EEventType, CCallbacks> m_callbacks;
+};
+
+} // namespace qorui
