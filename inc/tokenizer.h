@@ -45,7 +45,7 @@ public:
 
 private:
     void advance(unsigned _n);
-    bool at(string const &_s) const;
+    bool at(char const *_p_s, size_t _length) const;
     bool at_any(CTokenSet const &_set, unsigned *_p_length) const;
     char current() const { return mp_rules->mp_text[m_pos]; }
     bool skip_comment();

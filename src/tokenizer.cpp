@@ -1,5 +1,6 @@
 #include "tokenizer.h"
 #include <cstdlib>
+#include <cstring>
 
 namespace qorui {
 
@@ -47,14 +48,16 @@ void CTokenizer::advance(unsigned _n) {
     }
 }
 
-bool CTokenizer::at(string const &_s) const {
-    if (_s.empty() || m_pos >= mp_rules->m_length || _s.size() > mp_rules->m_length - m_pos) return false;
-    return _s.compare(0, _s.size(), mp_rules->mp_text + m_pos, _s.size()) == 0;
+bool CTokenizer::at(char const *_p_s, size_t _length) const {
+    if (_length == 0 || m_pos >= mp_rules->m_length || _length > mp_rules->m_length - m_pos) return false;
+    return std::memcmp(mp_rules->mp_text + m_pos, _p_s, _length) == 0;
 }
 
 bool CTokenizer::at_any(CTokenSet const &_set, unsigned *_p_length) const {
+    if (m_pos >= mp_rules->m_length) return false;
+    char const first = current();
     for (string const &entry : _set) {
-        if (at(entry)) {
+        if (!entry.empty() && entry[0] == first && at(entry.data(), entry.size())) {
             if (_p_length) *_p_length = static_cast<unsigned>(entry.size());
             return true;
         }
@@ -64,7 +67,7 @@ bool CTokenizer::at_any(CTokenSet const &_set, unsigned *_p_length) const {
 
 bool CTokenizer::skip_comment() {
     if (m_eof) return false;
-    if ((m_flags & LINE_COMMENTS) && at("//")) {
+    if ((m_flags & LINE_COMMENTS) && at("//", 2)) {
         advance(2);
         while (!m_eof && current() != '\n')
             advance(1);
@@ -72,9 +75,9 @@ bool CTokenizer::skip_comment() {
         advance(1);
         return true;
     }
-    if ((m_flags & BLOCK_COMMENTS) && at("/*")) {
+    if ((m_flags & BLOCK_COMMENTS) && at("/*", 2)) {
         advance(2);
-        while (!at("*/")) {
+        while (!at("*/", 2)) {
             if (m_eof) fail();
             advance(1);
         }
