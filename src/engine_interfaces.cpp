@@ -26,7 +26,14 @@ CEngineInterfaces::~CEngineInterfaces() {
     if (mp_server) mp_server->remove_listener(this);
 }
 
+// Another server drops everything fetched from the old one.
 void CEngineInterfaces::set_server(IInterfaceServer *_p_server) {
+    if (mp_server && mp_server != _p_server) {
+        mp_server->remove_listener(this);
+        for (IInterfaceBase **pp_cached : m_cached)
+            *pp_cached = nullptr;
+        m_cached.clear();
+    }
     mp_server = _p_server;
     if (mp_server) mp_server->add_listener(this);
 }
@@ -35,7 +42,8 @@ template <class T>
 T *CEngineInterfaces::fetch(T *&_p_field, SInterfaceUID const &_uid, char const *_name, bool _critical) {
     if (_p_field) return _p_field;
     if (mp_server) _p_field = static_cast<T *>(mp_server->query_interface(_uid, 1));
-    if (!_p_field && _critical) qordebug::error("Can't get interface \"%s\" version %i. Critical Error.", _name, 1);
+    if (!_p_field && _critical)
+        qordebug::error("Can't get interface \"%s\" version %i. Critical Error.", _name, 1);
     // Every interface derives from IInterfaceBase alone, so the field's address holds one.
     if (_p_field) m_cached.push_back(reinterpret_cast<IInterfaceBase **>(&_p_field));
     return _p_field;
@@ -89,8 +97,8 @@ ILevelDescription *CEngineInterfaces::get_level_description(bool _critical) {
     return fetch(mp_level_description, qor_uid::LEVEL_DESCRIPTION, "ILevelDescription", _critical);
 }
 IResourcesPrecacheManager *CEngineInterfaces::get_resources_precache_manager(bool _critical) {
-    return fetch(mp_resources_precache_manager, qor_uid::RESOURCES_PRECACHE_MANAGER, "IResourcesPrecacheManager",
-                 _critical);
+    return fetch(mp_resources_precache_manager, qor_uid::RESOURCES_PRECACHE_MANAGER,
+                 "IResourcesPrecacheManager", _critical);
 }
 IServerGameAPI *CEngineInterfaces::get_server_game_api(bool _critical) {
     return fetch(mp_server_game_api, qor_uid::SERVER_GAME_API, "IServerGameAPI", _critical);

@@ -7,6 +7,17 @@ struct vec2_t {
     float y;
 };
 
+struct vec3_t {
+    float x;
+    float y;
+    float z;
+};
+
+// A 4 by 4 matrix of floats, row after row: 64 bytes.
+struct matr4_t {
+    float m[4][4];
+};
+
 // Four bytes r, g, b, a, each 0 to 255.
 class rgba_t {
 public:
@@ -20,9 +31,7 @@ public:
     rgba_t operator*(float _f) const {
         return rgba_t(scale(r, _f), scale(g, _f), scale(b, _f), scale(a, _f));
     }
-    bool operator==(rgba_t const &_o) const {
-        return r == _o.r && g == _o.g && b == _o.b && a == _o.a;
-    }
+    bool operator==(rgba_t const &_o) const { return r == _o.r && g == _o.g && b == _o.b && a == _o.a; }
     bool operator!=(rgba_t const &_o) const { return !(*this == _o); }
 
 private:

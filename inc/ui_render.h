@@ -1,0 +1,79 @@
+// The render bridge: the one place that talks to the engine's renderer. Above it everything is in
+// whole pixels of the desktop's resolution; the bridge turns them into device coordinates, (-1, 1)
+// top left to (1, -1) bottom right, and forwards material, clip and drawing calls.
+#pragma once
+#include "qor_render.h"
+#include "ui_geometry.h"
+
+namespace qorui {
+
+class IRender {
+public:
+    virtual ~IRender() {}
+    virtual void set_resolution(int _w, int _h) = 0;
+    virtual void begin_draw() = 0;
+    virtual void end_draw() = 0;
+    virtual int create_material(char const *_material_template, char const *_diffuse, char const *_bump,
+                                char const *_specular, char const *_luminosity, char const *_reflection,
+                                bool _precache_enable, bool _load_textures_from_game_save) = 0;
+    virtual void destroy_material(int _handle) = 0;
+    virtual void set_material(int _handle) = 0;
+    virtual void set_clip_area(int _x, int _y, int _w, int _h) = 0;
+    virtual void push_clip_area() = 0;
+    virtual void pop_clip_area() = 0;
+    virtual void draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_p2, point_t const &_p3,
+                           vec2_t const &_t0, vec2_t const &_t1, vec2_t const &_t2, vec2_t const &_t3,
+                           rgba_t const &_c0, rgba_t const &_c1, rgba_t const &_c2, rgba_t const &_c3) = 0;
+    virtual void draw_line(point_t const &_from, point_t const &_to, rgba_t const &_c_from,
+                           rgba_t const &_c_to) = 0;
+    // A 3D view in the middle of a 2D frame: the 2D batch closes round it and opens again.
+    virtual void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) = 0;
+    virtual IAviTexture *get_avi_texture(int _id) = 0;
+};
+
+class CRender : public IRender {
+public:
+    CRender();
+
+    void set_resolution(int _w, int _h) override;
+    // begin_2d at every level of nesting, not only the outermost.
+    void begin_draw() override;
+    void end_draw() override;
+    int create_material(char const *_material_template, char const *_diffuse, char const *_bump,
+                        char const *_specular, char const *_luminosity, char const *_reflection,
+                        bool _precache_enable, bool _load_textures_from_game_save) override;
+    void destroy_material(int _handle) override;
+    void set_material(int _handle) override;
+    void set_clip_area(int _x, int _y, int _w, int _h) override;
+    void push_clip_area() override;
+    void pop_clip_area() override;
+    void draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_p2, point_t const &_p3,
+                   vec2_t const &_t0, vec2_t const &_t1, vec2_t const &_t2, vec2_t const &_t3,
+                   rgba_t const &_c0, rgba_t const &_c1, rgba_t const &_c2, rgba_t const &_c3) override;
+    void draw_line(point_t const &_from, point_t const &_to, rgba_t const &_c_from,
+                   rgba_t const &_c_to) override;
+    void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) override;
+    IAviTexture *get_avi_texture(int _id) override;
+
+    // Attaches the engine's renderer and reads the real screen size from "scr_resx", "scr_resy".
+    virtual void init(IRenderQOR *_p_render);
+
+private:
+    virtual void begin_draw_3d();
+    virtual void end_draw_3d();
+
+    vec2_t to_device(point_t const &_p) const;
+    bool has_render() const;
+
+    IRenderQOR *mp_render; // not owned
+    int m_in_draw_2d;
+    int m_in_draw_3d;
+    int m_res_w;
+    int m_res_h;
+    float m_scale_x; // 2 / m_res_w
+    float m_scale_y; // 2 / m_res_h
+    int m_scr_w;
+    int m_scr_h;
+};
+
+} // namespace qorui
