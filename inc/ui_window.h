@@ -20,6 +20,7 @@ class LuaObject;
 namespace qorui {
 
 class CWindow;
+class CMaterial;
 
 // What a window asks of the desktop of its tree: the desktop implements these, and a window is
 // constructed with the desktop that it will hang from.
@@ -35,6 +36,8 @@ public:
     virtual void report_pointer_inside(CWindow *_p_wnd) = 0;
     // Keyboard and wheel events to a window whether it is active or not.
     virtual void input_subscribe(CWindow *_p_wnd, bool _subscribe) = 0;
+    // A new material over the desktop's render bridge, without a handle yet; the caller owns it.
+    virtual CMaterial *create_material() = 0;
 
 protected:
     ~IWindowDesktop() {}

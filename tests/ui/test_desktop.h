@@ -1,11 +1,18 @@
 // The smallest desktop a tree of windows can hang from: it records what the windows ask of it.
 #pragma once
+#include "ui_material.h"
 #include "ui_window.h"
 
 #include <string>
 #include <vector>
 
 namespace qortest {
+
+// The desktop makes materials; a test makes them the same way over a bridge of its own.
+class CBridgeMaterial : public qorui::CMaterial {
+public:
+    explicit CBridgeMaterial(qorui::IRender *_p_render) : CMaterial(_p_render) {}
+};
 
 class CTestDesktop : public qorui::IWindowDesktop {
 public:
@@ -17,6 +24,9 @@ public:
         record(_subscribe ? "subscribe" : "unsubscribe", _p_wnd);
     }
 
+    qorui::CMaterial *create_material() override { return new CBridgeMaterial(mp_render); }
+
+    qorui::IRender *mp_render = nullptr; // the bridge of create_material
     // "call window" in order.
     std::vector<std::string> m_calls;
 

@@ -5,6 +5,7 @@
 #include "engine_interfaces.h"
 #include "qorscriptsystem.h"
 #include "recording_renderer.h"
+#include "test_desktop.h"
 #include "test_support.h"
 #include "ui_render.h"
 
@@ -16,11 +17,7 @@ using namespace qorui;
 
 namespace {
 
-// The desktop makes materials; a test makes them the same way over its own bridge.
-class CBridgeMaterial : public CMaterial {
-public:
-    explicit CBridgeMaterial(IRender *_p_render) : CMaterial(_p_render) {}
-};
+using qortest::CBridgeMaterial;
 
 class MaterialTest : public ::testing::Test {
 protected:

@@ -1,0 +1,97 @@
+// Bitmap fonts: a charset is the metrics of a square grid of character cells in one texture, read
+// from a "nehe" font file; a font is a charset, one material that shows the texture, and a size
+// in pixels per unit of texture space. The factory makes both from the tables of "fonts.lua".
+//
+// A character of width w (texture space) in a charset of height h drawn by a font of size s is a
+// quad of trunc(w * s) by trunc(h * s) pixels showing the texture rectangle (x, y, w, h).
+#pragma once
+#include "qor_memory.h"
+
+#include <map>
+
+namespace LuaPlus {
+class LuaObject;
+}
+
+namespace qorui {
+
+class CMaterial;
+class IWindowDesktop;
+class CFontsFactory;
+
+class CCharset {
+public:
+    struct SChar {
+        float x; // left edge of the cell
+        float y; // upper edge of the cell
+        float w; // the character's width
+    };
+
+    char const *get_name() const { return m_name.c_str(); }
+    float get_height() const { return m_height; }
+    // Null for a charset without characters; a code that is missing gets the lowest code's cell.
+    SChar const *get_char_description(unsigned short _code) const;
+
+protected:
+    friend class CFontsFactory;
+    CCharset();
+    virtual ~CCharset() {}
+    void init(char const *_p_name, LuaPlus::LuaObject _lo);
+
+private:
+    // Reads what it can; any bad or missing token ends the reading quietly.
+    void load_from_nehe(char const *_file_name);
+    void read_nehe(char const *_p_text, unsigned _length);
+
+    string m_name;
+    std::map<unsigned short, SChar, std::less<unsigned short>,
+             qor_small_allocator<std::pair<unsigned short const, SChar>>>
+        m_chars;
+    float m_height; // of every character, in texture space
+};
+
+class CFont {
+public:
+    virtual ~CFont();
+
+    char const *get_name() const { return m_name.c_str(); }
+    float get_size() const { return m_size; }
+    void set_size(float _size) { m_size = _size; }
+    CCharset::SChar const *get_char_description(unsigned short _code) const;
+    // The one material, for any code.
+    CMaterial *get_char_material(unsigned short _code);
+    float get_height() const;
+
+protected:
+    friend class CFontsFactory;
+    CFont(CCharset *_p_charset, char const *_name);
+
+private:
+    string m_name;
+    float m_size;                        // pixels per unit of texture space
+    CCharset *mp_charset;                // shared, owned by the factory
+    qor_vector<CMaterial *> m_materials; // owned
+};
+
+class CFontsFactory {
+public:
+    CFontsFactory() {}
+    // The charsets live to the end of the process.
+    virtual ~CFontsFactory() {}
+
+    // Fresh tables "charsets" and "fonts", then "fonts.lua" of the interface folder.
+    void init();
+    // A new font with its own material, its charset shared by name; null after a warning when the
+    // tables don't describe it. The caller owns the font.
+    CFont *create(char const *_name, IWindowDesktop *_p_desktop);
+
+private:
+    CCharset *find_charset(char const *_name);
+    CCharset *load_charset(char const *_name);
+
+    qor_vector<CCharset *> m_charsets;
+};
+
+CFontsFactory &get_fonts_factory();
+
+} // namespace qorui

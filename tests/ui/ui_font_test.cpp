@@ -1,0 +1,156 @@
+// Fonts: the "nehe" reader and its quiet stops, the factory's tables and messages, shared
+// charsets, and the two fonts of the data folder.
+#include "ui_font.h"
+
+#include "engine_interfaces.h"
+#include "qorbase.h"
+#include "qorscriptsystem.h"
+#include "recording_renderer.h"
+#include "test_desktop.h"
+#include "test_support.h"
+#include "ui_material.h"
+#include "ui_render.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+
+using namespace qorui;
+
+namespace {
+
+class FontTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        qortest::CReportCapture quiet; // the bridge asks for the screen size, which may be absent here
+        m_render.init(&m_recorder);
+        m_desktop.mp_render = &m_render;
+        m_dir = qortest::make_temp_dir();
+        qorbase::set_category_root(8, m_dir.c_str());
+        qorbase::set_category_root(16, m_dir.c_str());
+    }
+
+    // A charset "name" over the file "name.fnt" with that content, and a font "name" on it.
+    std::unique_ptr<CFont> font_from(std::string const &_name, std::string const &_content,
+                                     char const *_p_extra = "") {
+        qortest::write_file(m_dir + "/" + _name + ".fnt", _content);
+        lua_machine().DoString(("charsets = charsets or {}; fonts = fonts or {};"
+                                "charsets['" +
+                                _name + "'] = { file_type = 'nehe', file_name = '" + _name +
+                                ".fnt' }; fonts['" + _name + "'] = { charset_name = '" + _name +
+                                "', material = { material_template = 'ui_image' } " + _p_extra + " }")
+                                   .c_str());
+        return std::unique_ptr<CFont>(get_fonts_factory().create(_name.c_str(), &m_desktop));
+    }
+
+    static std::string entries(int _count, int _first_code = 32) {
+        std::string text;
+        for (int i = 0; i < _count; ++i)
+            text += std::to_string(_first_code + i) + " = 0.5\n";
+        return text;
+    }
+
+    qorhost::CRecordingRenderer m_recorder;
+    CRender m_render;
+    qortest::CTestDesktop m_desktop;
+    std::string m_dir;
+};
+
+} // namespace
+
+TEST_F(FontTest, CellsRunRowByRowAndMissingCodesGetTheLowestCodesCell) {
+    std::unique_ptr<CFont> font =
+        font_from("grid", "[common]\nfont1 = x\ndimension = 4\nfont_h = 1\n[chars]\n" + entries(16, 40));
+    ASSERT_TRUE(font);
+    CCharset::SChar const *p_char = font->get_char_description(46); // the 7th entry: row 1, column 2
+    ASSERT_NE(nullptr, p_char);
+    EXPECT_FLOAT_EQ(0.5f, p_char->x);
+    EXPECT_FLOAT_EQ(0.25f, p_char->y);
+    EXPECT_FLOAT_EQ(0.125f, p_char->w);
+    EXPECT_FLOAT_EQ(0.25f, font->get_height());
+    EXPECT_EQ(font->get_char_description(40), font->get_char_description('z'));
+    EXPECT_FLOAT_EQ(320.0f, font->get_size()); // no "size" in the table
+    ASSERT_NE(nullptr, font->get_char_material('a'));
+    EXPECT_NE(-1, font->get_char_material('a')->get_material_handle());
+}
+
+TEST_F(FontTest, ReadingStopsQuietlyWhereTheFileEndsOrBreaks) {
+    qortest::CReportCapture capture;
+    // 255 of 256 entries: all are kept, the end of the text ends the reading.
+    std::unique_ptr<CFont> short_file = font_from("short", "[common] dimension = 16 [chars] " + entries(255));
+    EXPECT_EQ(short_file->get_char_description(32 + 254)->w, 0.5f / 16);
+    // An unknown key: no characters, the default height divided by the dimension.
+    std::unique_ptr<CFont> unknown = font_from("unknown", "[common] dimension = 8 size = 3 [chars] 32 = 1");
+    EXPECT_EQ(nullptr, unknown->get_char_description(32));
+    EXPECT_FLOAT_EQ(0.0625f / 8, unknown->get_height());
+    // "dimension=16" is one token, and so an unknown key.
+    std::unique_ptr<CFont> glued = font_from("glued", "[common] dimension=16 [chars] 32 = 1");
+    EXPECT_EQ(nullptr, glued->get_char_description(32));
+    // Text behind the last entry isn't read; a code given twice keeps its last place.
+    std::unique_ptr<CFont> tail =
+        font_from("tail", "[common] dimension = 2 [chars] 65 = 1 65 = 1 66 = 1 67 = 1 68 = 1 garbage");
+    EXPECT_FLOAT_EQ(0.5f, tail->get_char_description(65)->x);
+    EXPECT_EQ(tail->get_char_description(65), tail->get_char_description(68)); // 68 was never read
+    EXPECT_TRUE(capture.reports().empty());
+}
+
+TEST_F(FontTest, TheFactoryExplainsWhatItCannotLoad) {
+    qortest::CReportCapture capture;
+    lua_machine().DoString(
+        "charsets = { broken = 5, typeless = { file_name = 'x.fnt' },"
+        " nameless = { file_type = 'nehe' }, other = { file_type = 'bmfont', file_name = 'o.fnt' },"
+        " absent = { file_type = 'NeHe', file_name = 'absent.fnt' } }"
+        "fonts = { no_charset = { material = {} }, no_material = { charset_name = 'absent' },"
+        " lost = { charset_name = 'missing', material = {} },"
+        " broken = { charset_name = 'broken', material = {} },"
+        " typeless = { charset_name = 'typeless', material = {} },"
+        " nameless = { charset_name = 'nameless', material = {} },"
+        " other = { charset_name = 'other', material = {} } }");
+    for (char const *p_name : {"nothing", "no_charset", "no_material", "lost", "broken"})
+        EXPECT_EQ(nullptr, get_fonts_factory().create(p_name, &m_desktop)) << p_name;
+    EXPECT_EQ(
+        (std::vector<std::string>{
+            "Cannot load the font 'nothing'", "Cannot load the font 'no_charset'\n'charset' record not found",
+            "Cannot open 'absent.fnt'", "Cannot load the font 'no_material'\n'material' record not found",
+            "Cannot load the charset 'missing'", "Cannot load the charset 'broken'"}),
+        capture.texts(qordebug::REPORT_WARNING));
+
+    // Bad charsets are errors, and the fonts on them still come, without characters.
+    for (char const *p_name : {"typeless", "nameless", "other"})
+        delete get_fonts_factory().create(p_name, &m_desktop);
+    EXPECT_EQ((std::vector<std::string>{"Cannot load the charset 'typeless'\nunknown 'file_type' record",
+                                        "Cannot load the charset 'nameless'\nunknown 'file_name' record",
+                                        "Cannot load the charset 'other'\nunknown 'file_type' "
+                                        "record\nfile_type 'bmfont'\nfile_name 'o.fnt'"}),
+              capture.texts(qordebug::REPORT_ERROR));
+}
+
+TEST_F(FontTest, FontsShareTheirCharsetAndScaleItBySize) {
+    std::string const file = "[common] dimension = 2 font_h = 1 [chars] 65 = 1 66 = 0.5 67 = 1 68 = 1";
+    std::unique_ptr<CFont> small = font_from("shared", file, ", size = 64");
+    qortest::write_file(m_dir + "/shared.fnt", "[common] [chars]"); // read once per process: ignored
+    std::unique_ptr<CFont> large(get_fonts_factory().create("shared", &m_desktop));
+    large->set_size(128);
+    EXPECT_EQ(small->get_char_description('B'), large->get_char_description('B'));
+    EXPECT_NE(small->get_char_material('B'), large->get_char_material('B'));
+    EXPECT_EQ(16, static_cast<int>(small->get_char_description('B')->w * small->get_size()));
+    EXPECT_EQ(32, static_cast<int>(large->get_char_description('B')->w * large->get_size()));
+}
+
+TEST_F(FontTest, TheDefaultFontsOfTheDataFolderLoad) {
+    qorbase::set_category_root(8, (qortest::source_dir() + "/data/fonts").c_str());
+    qorbase::set_category_root(16, (qortest::source_dir() + "/data/ui").c_str());
+    qortest::CReportCapture capture;
+    get_fonts_factory().init();
+    for (char const *p_name : {"arial_white", "courier"}) {
+        std::unique_ptr<CFont> font(get_fonts_factory().create(p_name, &m_desktop));
+        ASSERT_TRUE(font) << p_name;
+        EXPECT_GT(font->get_char_description('A')->w, 0.0f);
+        EXPECT_NE(font->get_char_description(0x416), font->get_char_description(0x20)); // Cyrillic
+        int const line_h = static_cast<int>(font->get_height() * font->get_size());
+        EXPECT_GE(line_h, 14) << p_name;
+        EXPECT_LE(line_h, 24) << p_name;
+    }
+    EXPECT_TRUE(capture.reports().empty());
+}
