@@ -1,0 +1,277 @@
+#include "ui_canvas.h"
+#include "qordebug.h"
+#include "ui_debug.h"
+#include "ui_font.h"
+#include "ui_material.h"
+#include "ui_render.h"
+#include "ui_string.h"
+#include "ui_text.h"
+
+#include <cmath>
+#include <cstdio>
+
+namespace qorui {
+
+CCanvas::CCanvas(ICanvasOwner *_p_owner) : mp_owner(_p_owner), m_tags_enable(true) {}
+
+IRender *CCanvas::get_render() const {
+    IRender *p_render = mp_owner ? mp_owner->get_canvas_render() : nullptr;
+    QOR_CHECK_AS(p_render, "mp_owner && mp_owner->mp_desktop && mp_owner->mp_desktop->mp_render");
+    return p_render;
+}
+
+point_t CCanvas::origin() const {
+    return mp_owner ? mp_owner->get_canvas_origin() : point_t{0, 0};
+}
+
+// Colour and alpha alike: a window fading out darkens while it goes transparent.
+void CCanvas::fade_color(rgba_t &_color) const {
+    if (!QOR_CHECK(mp_owner)) return;
+    float const f = mp_owner->get_transparency();
+    if (f >= 1.0f) return;
+    _color = _color * f;
+}
+
+void CCanvas::set_clip_area(int _x, int _y, int _w, int _h) {
+    point_t const o = origin();
+    if (IRender *p_render = get_render()) p_render->set_clip_area(_x + o.x, _y + o.y, _w, _h);
+}
+
+void CCanvas::set_clip_area_all() {
+    if (mp_owner) set_clip_area(0, 0, mp_owner->get_canvas_w(), mp_owner->get_canvas_h());
+}
+
+void CCanvas::push_clip_area() {
+    if (IRender *p_render = get_render()) p_render->push_clip_area();
+}
+
+void CCanvas::pop_clip_area() {
+    if (IRender *p_render = get_render()) p_render->pop_clip_area();
+}
+
+void CCanvas::render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) {
+    if (IRender *p_render = get_render()) p_render->render_view(_x, _y, _w, _h, _p_camera);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Lines and rectangles
+// ---------------------------------------------------------------------------------------------
+
+void CCanvas::draw_line(int _x0, int _y0, int _x1, int _y1, CMaterial *_p_material) {
+    if (!_p_material) return;
+    IRender *p_render = get_render();
+    if (!p_render) return;
+    rgba_t color = _p_material->get_color();
+    fade_color(color);
+    point_t const o = origin();
+    p_render->set_material(_p_material->get_material_handle());
+    p_render->draw_line(point_t{_x0 + o.x, _y0 + o.y}, point_t{_x1 + o.x, _y1 + o.y}, color, color);
+}
+
+void CCanvas::quad(IRender *_p_render, int _l, int _t, int _r, int _b, float _u0, float _v0, float _u1,
+                   float _v1, rgba_t const &_color) {
+    _p_render->draw_quad(point_t{_l, _t}, point_t{_l, _b}, point_t{_r, _b}, point_t{_r, _t}, vec2_t{_u0, _v0},
+                         vec2_t{_u0, _v1}, vec2_t{_u1, _v1}, vec2_t{_u1, _v0}, _color, _color, _color,
+                         _color);
+}
+
+void CCanvas::draw_rect(int _x, int _y, int _w, int _h, float _tex_x, float _tex_y, float _tex_w,
+                        float _tex_h, CMaterial *_p_material) {
+    if (!_p_material) return;
+    IRender *p_render = get_render();
+    if (!p_render) return;
+    rgba_t color = _p_material->get_color();
+    fade_color(color);
+    point_t const o = origin();
+    int const l = _x + o.x, t = _y + o.y;
+    p_render->set_material(_p_material->get_material_handle());
+    quad(p_render, l, t, l + _w, t + _h, _tex_x, _tex_y, _tex_x + _tex_w, _tex_y + _tex_h, color);
+}
+
+void CCanvas::draw_rect(int _x, int _y, int _w, int _h, CMaterial *_p_material) {
+    if (!_p_material) return;
+    IRender *p_render = get_render();
+    if (!p_render) return;
+    rgba_t color = _p_material->get_color();
+    fade_color(color);
+    p_render->set_material(_p_material->get_material_handle());
+    point_t const o = origin();
+    int const l = _x + o.x, t = _y + o.y, r = l + _w, b = t + _h;
+    CMaterial const &m = *_p_material;
+    if (!m.get_bordered()) {
+        quad(p_render, l, t, r, b, m.get_tex_x(), m.get_tex_y(), m.get_tex_x() + m.get_tex_w(),
+             m.get_tex_y() + m.get_tex_h(), color);
+    } else if (m.get_tex_real_w() == -1 || m.get_tex_real_h() == -1) {
+        qordebug::warning("tex_size must be set for bordered material");
+    } else {
+        draw_nine_patch(p_render, l, t, r, b, _p_material, color);
+    }
+}
+
+// Corners at their natural size; edges and centre tiled so they repeat rather than stretch.
+void CCanvas::draw_nine_patch(IRender *_p_render, int _l, int _t, int _r, int _b, CMaterial *_p_material,
+                              rgba_t const &_color) {
+    CMaterial const &m = *_p_material;
+    float const rw = static_cast<float>(m.get_tex_real_w()), rh = static_cast<float>(m.get_tex_real_h());
+    float const u = m.get_tex_x(), v = m.get_tex_y(), tw = m.get_tex_w(), th = m.get_tex_h();
+    float const bl = m.get_border_left(), br = m.get_border_right(), bt = m.get_border_top(),
+                bb = m.get_border_bottom();
+    int const x1 = _l + static_cast<int>(bl * rw), x2 = _r - static_cast<int>(br * rw);
+    int const y1 = _t + static_cast<int>(bt * rh), y2 = _b - static_cast<int>(bb * rh);
+    float const u1 = u + bl, u2 = u + tw - br, u3 = u + tw;
+    float const v1 = v + bt, v2 = v + th - bb, v3 = v + th;
+
+    quad(_p_render, _l, _t, x1, y1, u, v, u1, v1, _color);
+    quad(_p_render, _l, y2, x1, _b, u, v2, u1, v3, _color);
+    quad(_p_render, x2, y2, _r, _b, u2, v2, u3, v3, _color);
+    quad(_p_render, x2, _t, _r, y1, u2, v, u3, v1, _color);
+
+    struct {
+        int l, t, r, b;
+        float u0, v0, u1, v1;
+    } const tiled[] = {
+        {_l, y1, x1, y2, u, v1, u1, v2},  // left edge
+        {x2, y1, _r, y2, u2, v1, u3, v2}, // right edge
+        {x1, _t, x2, y1, u1, v, u2, v1},  // top edge
+        {x1, y2, x2, _b, u1, v2, u2, v3}, // bottom edge
+        {x1, y1, x2, y2, u1, v1, u2, v2}, // centre
+    };
+    for (auto const &piece : tiled)
+        draw_tiled(piece.l, piece.t, piece.r - piece.l, piece.b - piece.t, piece.u0, piece.v0,
+                   piece.u1 - piece.u0, piece.v1 - piece.v0, rw, rh, _p_material);
+}
+
+void CCanvas::draw_tiled(int _x, int _y, int _w, int _h, float _tex_x, float _tex_y, float _tex_w,
+                         float _tex_h, float _tex_real_w, float _tex_real_h, CMaterial *_p_material) {
+    if (_w < 1 || _h < 1 || !_p_material) return;
+    IRender *p_render = get_render();
+    if (!p_render) return;
+    rgba_t color = _p_material->get_color();
+    fade_color(color);
+    int const tile_w = static_cast<int>(_tex_w * _tex_real_w);
+    int const tile_h = static_cast<int>(_tex_h * _tex_real_h);
+    // A tile size of 0 (or less) draws no tile.
+    int const columns = tile_w > 0 ? static_cast<int>(std::ceil(static_cast<double>(_w) / tile_w)) : 0;
+    int const rows = tile_h > 0 ? static_cast<int>(std::ceil(static_cast<double>(_h) / tile_h)) : 0;
+    p_render->set_clip_area(_x, _y, _w, _h);
+    p_render->push_clip_area();
+    p_render->set_material(_p_material->get_material_handle());
+    for (int row = 0; row < rows; ++row) {
+        int const t = _y + row * tile_h;
+        for (int column = 0; column < columns; ++column) {
+            int const l = _x + column * tile_w;
+            quad(p_render, l, t, l + tile_w, t + tile_h, _tex_x, _tex_y, _tex_x + _tex_w, _tex_y + _tex_h,
+                 color);
+        }
+    }
+    p_render->pop_clip_area();
+}
+
+// ---------------------------------------------------------------------------------------------
+// Text
+// ---------------------------------------------------------------------------------------------
+
+// A "<color r g b a>" sets the colour (the low eight bits of each number; a tag with fewer than
+// four numbers changes nothing), a "</color>" restores the base; a tag of another name is
+// swallowed.
+size_t CCanvas::read_tag(CString const &_string, size_t _i, rgba_t const &_base, rgba_t &_current) const {
+    size_t const length = _string.length();
+    size_t const close = _string.find('>', _i + 1);
+    size_t j = _i + 1;
+    bool const closing = _string[j] == '/';
+    if (closing) ++j;
+    static unsigned short const color[] = {'c', 'o', 'l', 'o', 'r'};
+    if (j + 5 <= length && std::equal(color, color + 5, _string.begin() + j)) {
+        if (closing) {
+            _current = _base;
+        } else {
+            char numbers[64];
+            size_t n = 0;
+            for (size_t k = j + 5; k < length && n + 1 < sizeof numbers; ++k)
+                numbers[n++] = _string[k] < 128 ? static_cast<char>(_string[k]) : '?';
+            numbers[n] = '\0';
+            unsigned r, g, b, a;
+            if (std::sscanf(numbers, "%u %u %u %u", &r, &g, &b, &a) == 4)
+                _current = rgba_t(static_cast<unsigned char>(r), static_cast<unsigned char>(g),
+                                  static_cast<unsigned char>(b), static_cast<unsigned char>(a));
+        }
+    }
+    return close + 1;
+}
+
+void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
+    if (!_p_font || _string.empty()) return;
+    float const size = _p_font->get_size();
+    int const line_h = static_cast<int>(size * _p_font->get_height());
+    CMaterial *p_material = nullptr;
+    rgba_t base, current;
+    int x_cur = _x;
+    size_t const length = _string.length();
+    for (size_t i = 0; i < length; ++i) {
+        CMaterial *p_char_material = _p_font->get_char_material(_string[i]);
+        if (!p_char_material) return; // the font has reported it
+        if (p_material != p_char_material) {
+            p_material = p_char_material;
+            if (IRender *p_render = get_render()) p_render->set_material(p_material->get_material_handle());
+            base = current = p_material->get_color();
+        }
+        if (m_tags_enable && _string[i] == '<' && i + 2 < length &&
+            _string.find('>', i + 1) != wstring::npos) {
+            i = read_tag(_string, i, base, current);
+            if (i >= length) break;
+        }
+        CCharset::SChar const *p_char = _p_font->get_char_description(_string[i]);
+        if (!p_char) continue;
+        p_material->set_color(current);
+        draw_rect(x_cur, _y, static_cast<int>(p_char->w * size), line_h, p_char->x, p_char->y, p_char->w,
+                  _p_font->get_height(), p_material);
+        x_cur = static_cast<int>(static_cast<float>(x_cur) + p_char->w * size);
+    }
+    if (p_material) p_material->set_color(base);
+}
+
+void CCanvas::text_out(int _x, int _y, int _spacing, CText const &_text, CFont *_p_font) {
+    int y_cur = _y;
+    int const owner_w = mp_owner ? mp_owner->get_canvas_w() : 0;
+    int const owner_h = mp_owner ? mp_owner->get_canvas_h() : 0;
+    for (unsigned line = 0; line < _text.get_num_strings() && y_cur <= owner_h; ++line) {
+        CFont *p_font = _text.get_string_font(line) ? _text.get_string_font(line) : _p_font;
+        int const string_h = get_text_height(p_font) + _spacing;
+        if (!QOR_CHECK(string_h > 0)) return;
+        if (y_cur >= 0 || y_cur + string_h >= 0) {
+            CString const &string = *_text.get_string(line);
+            int x_cur = _x;
+            if (_text.get_alignment() == ALIGNMENT_CENTER)
+                x_cur = _x + (owner_w - get_text_width(string, p_font, -1)) / 2;
+            text_out(x_cur, y_cur, string, p_font);
+        }
+        y_cur += string_h;
+    }
+}
+
+int CCanvas::get_text_height(CFont *_p_font) {
+    return _p_font ? static_cast<int>(_p_font->get_size() * _p_font->get_height()) : 0;
+}
+
+int CCanvas::get_text_height(CString const &, CFont *_p_font) {
+    return get_text_height(_p_font);
+}
+
+int CCanvas::get_char_width(unsigned short _ch, CFont *_p_font) {
+    if (!_p_font) return 0;
+    CCharset::SChar const *p_char = _p_font->get_char_description(_ch);
+    return p_char ? static_cast<int>(p_char->w * _p_font->get_size()) : 0;
+}
+
+int CCanvas::get_text_width(CString const &_string, CFont *_p_font, int _count) {
+    if (!_p_font) return 0;
+    size_t const count = _count >= 0 && _string.length() >= static_cast<size_t>(_count)
+                             ? static_cast<size_t>(_count)
+                             : _string.length();
+    int width = 0;
+    for (size_t i = 0; i < count; ++i)
+        width += get_char_width(_string[i], _p_font);
+    return width;
+}
+
+} // namespace qorui
