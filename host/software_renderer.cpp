@@ -3,6 +3,7 @@
 #include "qordebug.h"
 
 #include <algorithm>
+#include <limits>
 #include <cmath>
 
 namespace qorhost {
@@ -32,7 +33,9 @@ void CSoftwareRenderer::present() {
 }
 
 // There is no 3D scene in this host: a view only counts.
-void CSoftwareRenderer::render_view(IRenderCamera *) { ++m_views_rendered; }
+void CSoftwareRenderer::render_view(IRenderCamera *) {
+    ++m_views_rendered;
+}
 
 // ---------------------------------------------------------------------------------------------
 // Materials and textures
@@ -53,7 +56,9 @@ int CSoftwareRenderer::create_material(char const *_material_template, char cons
     return handle;
 }
 
-void CSoftwareRenderer::destroy_material(int _handle) { m_materials.erase(_handle); }
+void CSoftwareRenderer::destroy_material(int _handle) {
+    m_materials.erase(_handle);
+}
 
 CSoftwareRenderer::SMaterial const *CSoftwareRenderer::current_material() const {
     auto found = m_materials.find(m_material);
@@ -108,7 +113,9 @@ void CSoftwareRenderer::set_clip_rect(vec2_t const &_position, vec2_t const &_si
     m_clip = clip;
 }
 
-void CSoftwareRenderer::push_clip_rect() { m_clip_stack.push_back(m_clip); }
+void CSoftwareRenderer::push_clip_rect() {
+    m_clip_stack.push_back(m_clip);
+}
 
 void CSoftwareRenderer::pop_clip_rect() {
     if (m_clip_stack.empty()) {
@@ -124,9 +131,18 @@ void CSoftwareRenderer::pop_clip_rect() {
 // Drawing
 // ---------------------------------------------------------------------------------------------
 
-CSoftwareRenderer::SVertex CSoftwareRenderer::to_vertex(vec2_t const &_p, vec2_t const &_t, rgba_t const &_c) const {
-    return SVertex{(_p.x + 1.0f) * 0.5f * m_frame.m_w,
-                   (1.0f - _p.y) * 0.5f * m_frame.m_h,
+namespace {
+// Positions snap to 1/256 of a pixel, so that the float noise of the device conversion can't put
+// a pixel centre on a shared edge outside both triangles of a quad.
+float snap(float _pixels) {
+    return std::round(_pixels * 256.0f) / 256.0f;
+}
+} // namespace
+
+CSoftwareRenderer::SVertex CSoftwareRenderer::to_vertex(vec2_t const &_p, vec2_t const &_t,
+                                                        rgba_t const &_c) const {
+    return SVertex{snap((_p.x + 1.0f) * 0.5f * m_frame.m_w),
+                   snap((1.0f - _p.y) * 0.5f * m_frame.m_h),
                    _t.x,
                    _t.y,
                    {float(_c.r), float(_c.g), float(_c.b), float(_c.a)}};
@@ -134,7 +150,8 @@ CSoftwareRenderer::SVertex CSoftwareRenderer::to_vertex(vec2_t const &_p, vec2_t
 
 void CSoftwareRenderer::draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const &_c0, vec2_t const &_p1,
                                   vec2_t const &_t1, rgba_t const &_c1, vec2_t const &_p2, vec2_t const &_t2,
-                                  rgba_t const &_c2, vec2_t const &_p3, vec2_t const &_t3, rgba_t const &_c3) {
+                                  rgba_t const &_c2, vec2_t const &_p3, vec2_t const &_t3,
+                                  rgba_t const &_c3) {
     SVertex const v0 = to_vertex(_p0, _t0, _c0);
     SVertex const v1 = to_vertex(_p1, _t1, _c1);
     SVertex const v2 = to_vertex(_p2, _t2, _c2);
@@ -145,8 +162,12 @@ void CSoftwareRenderer::draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t c
 }
 
 namespace {
-float edge(float _ax, float _ay, float _bx, float _by, float _px, float _py) {
-    return (_bx - _ax) * (_py - _ay) - (_by - _ay) * (_px - _ax);
+// In double: with snapped positions the products are exact, so the fill rule decides every tie.
+float edge(double _ax, double _ay, double _bx, double _by, double _px, double _py) {
+    double const value = (_bx - _ax) * (_py - _ay) - (_by - _ay) * (_px - _ax);
+    return value > 0.0   ? std::max(static_cast<float>(value), std::numeric_limits<float>::min())
+           : value < 0.0 ? std::min(static_cast<float>(value), -std::numeric_limits<float>::min())
+                         : 0.0f;
 }
 // Top-left rule for a triangle wound so that its area is positive (clockwise on screen, y down):
 // a top edge is horizontal and runs right, a left edge runs up.
@@ -184,7 +205,8 @@ void CSoftwareRenderer::draw_triangle(SVertex const &_a, SVertex const &_b, SVer
             if (!inside) continue;
             float const b0 = w0 / area, b1 = w1 / area, b2 = w2 / area;
             float rgba[4];
-            for (int i = 0; i < 4; ++i) rgba[i] = b0 * p0->m_rgba[i] + b1 * p1->m_rgba[i] + b2 * p2->m_rgba[i];
+            for (int i = 0; i < 4; ++i)
+                rgba[i] = b0 * p0->m_rgba[i] + b1 * p1->m_rgba[i] + b2 * p2->m_rgba[i];
             float const u = b0 * p0->m_u + b1 * p1->m_u + b2 * p2->m_u;
             float const v = b0 * p0->m_v + b1 * p1->m_v + b2 * p2->m_v;
             blend(x, y, rgba, _p_material, u, v);
@@ -193,14 +215,16 @@ void CSoftwareRenderer::draw_triangle(SVertex const &_a, SVertex const &_b, SVer
 }
 
 // The colour is the texel times the vertex colour; it goes over the frame by its alpha.
-void CSoftwareRenderer::blend(int _x, int _y, float const *_rgba, SMaterial const *_p_material, float _u, float _v) {
+void CSoftwareRenderer::blend(int _x, int _y, float const *_rgba, SMaterial const *_p_material, float _u,
+                              float _v) {
     float source[4] = {_rgba[0], _rgba[1], _rgba[2], _rgba[3]};
     if (_p_material && _p_material->m_textured && _p_material->mp_texture) {
         SImage const &texture = *_p_material->mp_texture;
         int const tx = std::clamp(static_cast<int>(std::floor(_u * texture.m_w)), 0, texture.m_w - 1);
         int const ty = std::clamp(static_cast<int>(std::floor(_v * texture.m_h)), 0, texture.m_h - 1);
         uint8_t const *texel = texture.pixel(tx, ty);
-        for (int i = 0; i < 4; ++i) source[i] = source[i] * texel[i] / 255.0f;
+        for (int i = 0; i < 4; ++i)
+            source[i] = source[i] * texel[i] / 255.0f;
     }
     uint8_t *p = m_frame.pixel(_x, _y);
     float const alpha = std::clamp(source[3], 0.0f, 255.0f) / 255.0f;
@@ -212,8 +236,8 @@ void CSoftwareRenderer::blend(int _x, int _y, float const *_rgba, SMaterial cons
 }
 
 // A one-pixel line from centre to centre, its colour interpolated along it.
-void CSoftwareRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, vec2_t const &_to, rgba_t const &_c_to,
-                                  float) {
+void CSoftwareRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, vec2_t const &_to,
+                                  rgba_t const &_c_to, float) {
     SVertex const a = to_vertex(_from, vec2_t{0, 0}, _c_from);
     SVertex const b = to_vertex(_to, vec2_t{0, 0}, _c_to);
     float const ax = std::floor(a.m_x), ay = std::floor(a.m_y);
@@ -226,7 +250,8 @@ void CSoftwareRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, ve
         int const y = static_cast<int>(std::lround(ay + (by - ay) * t));
         if (x < m_clip.m_x0 || x >= m_clip.m_x1 || y < m_clip.m_y0 || y >= m_clip.m_y1) continue;
         float rgba[4];
-        for (int c = 0; c < 4; ++c) rgba[c] = a.m_rgba[c] + (b.m_rgba[c] - a.m_rgba[c]) * t;
+        for (int c = 0; c < 4; ++c)
+            rgba[c] = a.m_rgba[c] + (b.m_rgba[c] - a.m_rgba[c]) * t;
         blend(x, y, rgba, &ui_color, 0.0f, 0.0f);
     }
 }
