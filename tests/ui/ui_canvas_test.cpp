@@ -241,3 +241,17 @@ TEST(CanvasBridge, AnOwnerWithoutABridgeIsAContractFailure) {
     EXPECT_NE(std::string::npos, capture.texts(qordebug::REPORT_ASSERT)[0].find(
                                      "mp_owner && mp_owner->mp_desktop && mp_owner->mp_desktop->mp_render"));
 }
+
+TEST_F(CanvasTest, ALineWithAFontOfItsOwnUsesItsHeight) {
+    lua_machine().DoString("fonts.big = { charset_name = 'canvas_grid', size = 128, material = {} }");
+    std::unique_ptr<CFont> big(get_fonts_factory().create("big", &m_desktop));
+    CText text(CString("a\\nb\\na"));
+    text.set_string_font(1, big.get());
+    m_recorder.clear();
+    m_canvas.text_out(0, 0, 0, text, mp_font.get());
+    std::vector<qorhost::SRenderCall> const chars = quads();
+    ASSERT_EQ(3u, chars.size());
+    EXPECT_EQ("100,50 108,66", rect_of(chars[0]));
+    EXPECT_EQ("100,66 132,98", rect_of(chars[1])); // 'b' of the big font: 32 by 32
+    EXPECT_EQ("100,98 108,114", rect_of(chars[2]));
+}
