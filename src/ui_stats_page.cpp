@@ -6,6 +6,7 @@
 #include "ui_stats_page.h"
 
 #include "ui_debug.h"
+#include "ui_logger.h"
 
 #include <cstdarg>
 #include <cstdio>
@@ -21,62 +22,6 @@ size_t const k_buffer_size = 200; // a line's buffer: tag and text, terminated
 unsigned char colour_byte(int _value) {
     float const cut = _value < 0 ? 0.0f : (_value > 1 ? 1.0f : static_cast<float>(_value));
     return static_cast<unsigned char>(cut * 255.0f);
-}
-
-// The printf family for 16-bit text, as far as pages need it: "%s" takes 16-bit text, "%S"
-// narrow text (UTF-8), "%c" one unit; the numeric conversions are those of the C library. Writes
-// at most _size - 1 units and a terminator; result the count written.
-size_t format_units(unsigned short *_p_out, size_t _size, unsigned short const *_format, va_list _args) {
-    size_t length = 0;
-    auto put = [&](unsigned short _unit) {
-        if (length + 1 < _size) _p_out[length++] = _unit;
-    };
-    for (unsigned short const *p = _format; *p; ++p) {
-        if (*p != '%') {
-            put(*p);
-            continue;
-        }
-        // One conversion: copy its flags, width, precision and length to a narrow spec.
-        char spec[32] = "%";
-        size_t spec_length = 1;
-        ++p;
-        while (*p && spec_length + 2 < sizeof(spec) &&
-               strchr("-+ #0123456789.hlLjzt", static_cast<char>(*p)) && *p < 128)
-            spec[spec_length++] = static_cast<char>(*p++);
-        if (!*p) break;
-        unsigned short const conversion = *p;
-        if (conversion == '%') {
-            put('%');
-        } else if (conversion == 's') {
-            for (unsigned short const *s = va_arg(_args, unsigned short const *); s && *s; ++s)
-                put(*s);
-        } else if (conversion == 'S') {
-            char const *s = va_arg(_args, char const *);
-            for (unsigned short const *u = s ? CString::str2wcs(s, -1) : nullptr; u && *u; ++u)
-                put(*u);
-        } else if (conversion == 'c') {
-            put(static_cast<unsigned short>(va_arg(_args, int)));
-        } else if (conversion < 128) {
-            spec[spec_length++] = static_cast<char>(conversion);
-            spec[spec_length] = '\0';
-            char text[128];
-            bool const is_float = strchr("fFeEgGaA", static_cast<char>(conversion)) != nullptr;
-            bool const is_long =
-                strstr(spec, "l") || strstr(spec, "z") || strstr(spec, "j") || strstr(spec, "t");
-            if (is_float)
-                snprintf(text, sizeof(text), spec, va_arg(_args, double));
-            else if (conversion == 'p')
-                snprintf(text, sizeof(text), spec, va_arg(_args, void *));
-            else if (is_long)
-                snprintf(text, sizeof(text), spec, va_arg(_args, long));
-            else
-                snprintf(text, sizeof(text), spec, va_arg(_args, int));
-            for (char const *c = text; *c; ++c)
-                put(static_cast<unsigned char>(*c));
-        }
-    }
-    if (_size) _p_out[length] = 0;
-    return length;
 }
 
 } // namespace
