@@ -10,7 +10,9 @@ namespace qorhost {
 
 CInterfaceServer::CInterfaceServer() {}
 
-CInterfaceServer::~CInterfaceServer() { close_modules(); }
+CInterfaceServer::~CInterfaceServer() {
+    close_modules();
+}
 
 void CInterfaceServer::close_modules() {
     while (!m_modules.empty()) {
@@ -29,12 +31,13 @@ int CInterfaceServer::register_interface(IInterfaceBase *_p_interface) {
     if (!_p_interface) return -1;
     if (std::find(m_interfaces.begin(), m_interfaces.end(), _p_interface) != m_interfaces.end()) return 0;
     m_interfaces.push_back(_p_interface);
-    std::vector<IInterfaceServerListener *> const listeners = m_listeners;
-    for (IInterfaceServerListener *p_listener : listeners) p_listener->_isv_action(ISA_REGISTERED, _p_interface);
+    notify(ISA_REGISTERED, _p_interface);
     return 1;
 }
 
-void CInterfaceServer::load_module(int, char const *_library_name) { open_module(_library_name); }
+void CInterfaceServer::load_module(int, char const *_library_name) {
+    open_module(_library_name);
+}
 
 void *CInterfaceServer::open_module(char const *_library_name) {
     if (!_library_name || !*_library_name) return nullptr;
@@ -53,7 +56,15 @@ void *CInterfaceServer::open_module(char const *_library_name) {
     return module;
 }
 
-// A listener may remove itself while it is told.
+// Walks a copy: a listener may remove itself, or others, while it is told; one that left the
+// live list on the way hears nothing more.
+void CInterfaceServer::notify(EInterfaceServerAction _action, IInterfaceBase *_p_interface) {
+    std::vector<IInterfaceServerListener *> const listeners = m_listeners;
+    for (IInterfaceServerListener *p_listener : listeners)
+        if (std::find(m_listeners.begin(), m_listeners.end(), p_listener) != m_listeners.end())
+            p_listener->_isv_action(_action, _p_interface);
+}
+
 void CInterfaceServer::add_listener(IInterfaceServerListener *_p_listener) {
     if (_p_listener && std::find(m_listeners.begin(), m_listeners.end(), _p_listener) == m_listeners.end())
         m_listeners.push_back(_p_listener);
@@ -67,13 +78,13 @@ void CInterfaceServer::remove_listener(IInterfaceServerListener *_p_listener) {
 void CInterfaceServer::withdraw_interface(IInterfaceBase *_p_interface) {
     auto found = std::find(m_interfaces.begin(), m_interfaces.end(), _p_interface);
     if (found == m_interfaces.end()) return;
-    std::vector<IInterfaceServerListener *> const listeners = m_listeners;
-    for (IInterfaceServerListener *p_listener : listeners) p_listener->_isv_action(ISA_WITHDRAWN, _p_interface);
+    notify(ISA_WITHDRAWN, _p_interface);
     m_interfaces.erase(std::find(m_interfaces.begin(), m_interfaces.end(), _p_interface));
 }
 
 void CInterfaceServer::withdraw_all() {
-    while (!m_interfaces.empty()) withdraw_interface(m_interfaces.back());
+    while (!m_interfaces.empty())
+        withdraw_interface(m_interfaces.back());
 }
 
 std::string executable_folder() {

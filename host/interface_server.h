@@ -35,6 +35,8 @@ public:
     unsigned get_listeners_count() const { return static_cast<unsigned>(m_listeners.size()); }
 
 private:
+    void notify(EInterfaceServerAction _action, IInterfaceBase *_p_interface);
+
     std::vector<IInterfaceBase *> m_interfaces;
     std::vector<IInterfaceServerListener *> m_listeners;
     std::vector<void *> m_modules;

@@ -32,7 +32,8 @@ std::string utf16_to_utf8(std::u16string const &_text) {
     std::string out;
     for (size_t i = 0; i < _text.size(); ++i) {
         char32_t c = _text[i];
-        if (c >= 0xD800 && c < 0xDC00 && i + 1 < _text.size() && _text[i + 1] >= 0xDC00 && _text[i + 1] < 0xE000) {
+        if (c >= 0xD800 && c < 0xDC00 && i + 1 < _text.size() && _text[i + 1] >= 0xDC00 &&
+            _text[i + 1] < 0xE000) {
             c = 0x10000 + ((c - 0xD800) << 10) + (_text[i + 1] - 0xDC00);
             ++i;
         } else if (c >= 0xD800 && c < 0xE000) {
@@ -48,14 +49,23 @@ std::u16string utf8_to_utf16(char const *_text) {
     unsigned char const *p = reinterpret_cast<unsigned char const *>(_text ? _text : "");
     while (*p) {
         unsigned const lead = *p;
-        int const extra = lead < 0x80 ? 0 : (lead >> 5) == 6 ? 1 : (lead >> 4) == 14 ? 2 : (lead >> 3) == 30 ? 3 : -1;
-        char32_t c = extra == 0 ? lead : extra == 1 ? (lead & 0x1F) : extra == 2 ? (lead & 0x0F) : (lead & 0x07);
+        int const extra = lead < 0x80         ? 0
+                          : (lead >> 5) == 6  ? 1
+                          : (lead >> 4) == 14 ? 2
+                          : (lead >> 3) == 30 ? 3
+                                              : -1;
+        char32_t c = extra == 0   ? lead
+                     : extra == 1 ? (lead & 0x1F)
+                     : extra == 2 ? (lead & 0x0F)
+                                  : (lead & 0x07);
         bool valid = extra >= 0;
         for (int i = 1; valid && i <= extra; ++i) {
-            if ((p[i] & 0xC0) != 0x80) valid = false;
-            else c = (c << 6) | (p[i] & 0x3F);
+            if ((p[i] & 0xC0) != 0x80)
+                valid = false;
+            else
+                c = (c << 6) | (p[i] & 0x3F);
         }
-        if (!valid) {
+        if (!valid || c > 0x10FFFF) { // beyond the last plane nothing is a character
             out += u'\xFFFD';
             ++p;
             continue;
@@ -82,7 +92,8 @@ CHostLogger::CHostLogger(CLogManager *_p_manager, char const *_name, char const 
 void CHostLogger::write(unsigned short const *_text, int _level) {
     if (!m_active || !_text) return;
     std::u16string text;
-    for (unsigned short const *p = _text; *p; ++p) text += static_cast<char16_t>(*p);
+    for (unsigned short const *p = _text; *p; ++p)
+        text += static_cast<char16_t>(*p);
     mp_manager->add_message(*this, text, _level);
 }
 
@@ -129,7 +140,8 @@ void CLogManager::get_messages(ILogMessageVisitor &_visitor, unsigned _first, in
         if (_count >= 0 && visited >= _count) break;
         units.assign(message.m_text.begin(), message.m_text.end());
         units.push_back(0);
-        _visitor.on_message(SLogMessage{units.data(), static_cast<uint32_t>(message.m_level), message.m_index});
+        _visitor.on_message(
+            SLogMessage{units.data(), static_cast<uint32_t>(message.m_level), message.m_index});
         ++visited;
     }
 }

@@ -1,0 +1,161 @@
+// The host's log manager: loggers by name, running message indices, the ring of kept messages,
+// reading them with get_messages, the printed lines, and the 16-bit and UTF-8 text conversions.
+#include "log_manager.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+using namespace qorhost;
+
+namespace {
+
+struct SCopiedMessage {
+    std::u16string m_text;
+    uint32_t m_level;
+    uint32_t m_index;
+
+    bool operator==(SCopiedMessage const &_o) const {
+        return m_text == _o.m_text && m_level == _o.m_level && m_index == _o.m_index;
+    }
+};
+
+void PrintTo(SCopiedMessage const &_m, std::ostream *_p_out) {
+    *_p_out << "#" << _m.m_index << " level " << _m.m_level << " '" << utf16_to_utf8(_m.m_text) << "'";
+}
+
+// Copies what it is handed, as a reader of the log must.
+class CCopyingVisitor : public ILogMessageVisitor {
+public:
+    void on_message(SLogMessage const &_message) override {
+        std::u16string text;
+        for (unsigned short const *p = _message.mp_text; *p; ++p)
+            text += static_cast<char16_t>(*p);
+        m_messages.push_back(SCopiedMessage{text, _message.m_level, _message.m_index});
+    }
+
+    std::vector<SCopiedMessage> m_messages;
+};
+
+std::vector<SCopiedMessage> read(CLogManager &_log, unsigned _first, int _count) {
+    CCopyingVisitor visitor;
+    _log.get_messages(visitor, _first, _count);
+    return visitor.m_messages;
+}
+
+std::vector<uint32_t> indices(std::vector<SCopiedMessage> const &_messages) {
+    std::vector<uint32_t> result;
+    for (SCopiedMessage const &message : _messages)
+        result.push_back(message.m_index);
+    return result;
+}
+
+class LogManagerTest : public testing::Test {
+protected:
+    LogManagerTest() { m_log.set_quiet(true); }
+    CLogManager m_log;
+};
+
+} // namespace
+
+TEST_F(LogManagerTest, LoggersAreFoundByTheirName) {
+    ILogger *p_game = m_log.create_logger("Game", "Game: ");
+    ASSERT_NE(nullptr, p_game);
+    EXPECT_STREQ("Game", p_game->get_name());
+    EXPECT_EQ(p_game, m_log.create_logger("Game", "Other: ")); // the first one stays
+    EXPECT_EQ("Game: ", static_cast<CHostLogger *>(p_game)->get_prefix());
+    ILogger *p_ui = m_log.create_logger("UI", nullptr);
+    EXPECT_NE(p_game, p_ui);
+    EXPECT_EQ(p_ui, m_log.find_logger("UI"));
+    EXPECT_EQ(p_game, m_log.find_logger("Game"));
+    EXPECT_EQ(nullptr, m_log.find_logger("game")); // names are case-sensitive
+    EXPECT_EQ(nullptr, m_log.find_logger(nullptr));
+}
+
+TEST_F(LogManagerTest, MessagesOfAllLoggersGetRunningIndices) {
+    ILogger *p_a = m_log.create_logger("A", "");
+    ILogger *p_b = m_log.create_logger("B", "");
+    p_a->write("first", 0);
+    unsigned short const wide[] = {'s', 'e', 'c', 0x00E9, 0};
+    p_b->write(wide, 1);
+    p_a->write("", 2);
+    p_a->write(static_cast<char const *>(nullptr), 0); // nothing
+    p_b->write(static_cast<unsigned short const *>(nullptr), 0);
+
+    EXPECT_EQ(3u, m_log.get_next_index());
+    EXPECT_EQ((std::vector<SCopiedMessage>{{u"first", 0, 0}, {u"sec\u00E9", 1, 1}, {u"", 2, 2}}),
+              read(m_log, 0, -1));
+    EXPECT_EQ("sec\xC3\xA9", m_log.get_message_text(1));
+    EXPECT_EQ("", m_log.get_message_text(3));
+}
+
+TEST_F(LogManagerTest, InactiveLoggerKeepsNothing) {
+    ILogger *p_a = m_log.create_logger("A", "");
+    p_a->set_active(false);
+    p_a->write("lost", 0);
+    p_a->set_active(true);
+    p_a->write("kept", 0);
+    EXPECT_EQ((std::vector<SCopiedMessage>{{u"kept", 0, 0}}), read(m_log, 0, -1));
+}
+
+TEST_F(LogManagerTest, GetMessagesStartsAtAnIndexAndStopsAfterACount) {
+    ILogger *p_a = m_log.create_logger("A", "");
+    for (int i = 0; i < 6; ++i)
+        p_a->write(("m" + std::to_string(i)).c_str(), i % 3);
+
+    EXPECT_EQ((std::vector<uint32_t>{2, 3, 4, 5}), indices(read(m_log, 2, -1)));
+    EXPECT_EQ((std::vector<uint32_t>{2, 3}), indices(read(m_log, 2, 2)));
+    EXPECT_EQ((std::vector<SCopiedMessage>{{u"m5", 2, 5}}), read(m_log, 5, 10));
+    EXPECT_TRUE(read(m_log, 6, -1).empty());
+    EXPECT_TRUE(read(m_log, 0, 0).empty());
+}
+
+TEST_F(LogManagerTest, OnlyTheNewestMessagesAreKept) {
+    ILogger *p_a = m_log.create_logger("A", "");
+    unsigned const total = CLogManager::MAX_MESSAGES + 5;
+    for (unsigned i = 0; i < total; ++i)
+        p_a->write(std::to_string(i).c_str(), 0);
+
+    EXPECT_EQ(total, m_log.get_next_index());
+    std::vector<SCopiedMessage> const oldest = read(m_log, 0, 2);
+    EXPECT_EQ((std::vector<SCopiedMessage>{{u"5", 0, 5}, {u"6", 0, 6}}), oldest);
+    EXPECT_EQ(size_t(CLogManager::MAX_MESSAGES), read(m_log, 0, -1).size());
+    EXPECT_EQ("", m_log.get_message_text(4));
+    EXPECT_EQ(std::to_string(total - 1), m_log.get_message_text(total - 1));
+}
+
+TEST(LogManagerPrint, MessagesArePrintedWithTheLoggersPrefixUnlessQuiet) {
+    CLogManager log;
+    ILogger *p_game = log.create_logger("Game", "Game: ");
+    testing::internal::CaptureStdout();
+    p_game->write("one", 0);
+    p_game->write("two\n", 1);
+    log.set_quiet(true);
+    p_game->write("three", 0);
+    std::string const printed = testing::internal::GetCapturedStdout();
+    EXPECT_EQ("Game: one\nGame: two\n", printed);
+    EXPECT_EQ(3u, log.get_next_index());
+}
+
+// ---------------------------------------------------------------------------------------------
+// Text conversion
+// ---------------------------------------------------------------------------------------------
+
+TEST(LogText, Utf8AndUtf16RoundTripEveryPlane) {
+    char const *const text = "a\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80z"; // a, e acute, euro, a smiley, z
+    std::u16string const wide = utf8_to_utf16(text);
+    EXPECT_EQ((std::u16string{u'a', 0x00E9, 0x20AC, 0xD83D, 0xDE00, u'z'}), wide);
+    EXPECT_EQ(text, utf16_to_utf8(wide));
+    EXPECT_EQ(u"", utf8_to_utf16(nullptr));
+}
+
+TEST(LogText, InvalidBytesAndLoneSurrogatesBecomeReplacementCharacters) {
+    // A stray continuation byte, a lead byte cut short, a byte that never starts a character.
+    EXPECT_EQ((std::u16string{0xFFFD, u'x', 0xFFFD, u'y', 0xFFFD}), utf8_to_utf16("\x80x\xC3y\xFF"));
+    // A lead byte of a code above U+10FFFF, with its continuation bytes.
+    EXPECT_EQ((std::u16string{0xFFFD, 0xFFFD, 0xFFFD, 0xFFFD}), utf8_to_utf16("\xF7\xBF\xBF\xBF"));
+    EXPECT_EQ("\xEF\xBF\xBD"
+              "a\xEF\xBF\xBD",
+              utf16_to_utf8(std::u16string{0xDE00, u'a', 0xD83D}));
+}
