@@ -21,6 +21,7 @@ namespace qorui {
 
 class CWindow;
 class CMaterial;
+class IRender;
 
 // What a window asks of the desktop of its tree: the desktop implements these, and a window is
 // constructed with the desktop that it will hang from.
@@ -38,6 +39,8 @@ public:
     virtual void input_subscribe(CWindow *_p_wnd, bool _subscribe) = 0;
     // A new material over the desktop's render bridge, without a handle yet; the caller owns it.
     virtual CMaterial *create_material() = 0;
+    // The render bridge that the canvases of the tree draw through; null while there is none.
+    virtual IRender *get_render() = 0;
 
 protected:
     ~IWindowDesktop() {}

@@ -25,6 +25,7 @@ public:
     }
 
     qorui::CMaterial *create_material() override { return new CBridgeMaterial(mp_render); }
+    qorui::IRender *get_render() override { return mp_render; }
 
     qorui::IRender *mp_render = nullptr; // the bridge of create_material
     // "call window" in order.
