@@ -5,6 +5,8 @@
 #include "ui_interfaces.h"
 
 #include <cstdio>
+#include <memory>
+#include <vector>
 #include <sys/stat.h>
 
 namespace qorhost {
@@ -23,7 +25,8 @@ void copy_file(std::string const &_from, std::string const &_to) {
     if (!in) return;
     char buffer[8192];
     size_t count;
-    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0) text.append(buffer, count);
+    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0)
+        text.append(buffer, count);
     fclose(in);
     FILE *out = fopen(_to.c_str(), "wb");
     if (!out) return;
@@ -32,9 +35,22 @@ void copy_file(std::string const &_from, std::string const &_to) {
 }
 } // namespace
 
+namespace {
+
+// A module's statics may still talk to the server they were given when the process ends, after
+// the host that made it is gone (a module with unique symbols stays loaded to the end). So the
+// servers live to the end of the process; this list, made before any module, dies after them.
+CInterfaceServer &new_server() {
+    static std::vector<std::unique_ptr<CInterfaceServer>> s_servers;
+    s_servers.push_back(std::make_unique<CInterfaceServer>());
+    return *s_servers.back();
+}
+
+} // namespace
+
 CHost::CHost(SHostOptions const &_options)
-    : m_options(_options), m_commands(&m_vars), mp_engine_logger(nullptr), m_renderer(_options.m_w, _options.m_h),
-      m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0) {
+    : m_options(_options), m_server(new_server()), m_commands(&m_vars), mp_engine_logger(nullptr),
+      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0) {
     m_log.set_quiet(m_options.m_quiet);
     mp_engine_logger = m_log.create_logger("Engine", "");
     qorbase::set_log_sink(log_sink, this);
@@ -106,7 +122,8 @@ std::string CHost::frame_path(unsigned _index) const {
 
 void CHost::write_frame(SImage const &_frame, unsigned _index) {
     if (m_options.m_out.empty()) return;
-    if (!write_png(frame_path(_index), _frame)) qordebug::warning("Cannot write '%s'", frame_path(_index).c_str());
+    if (!write_png(frame_path(_index), _frame))
+        qordebug::warning("Cannot write '%s'", frame_path(_index).c_str());
 }
 
 void CHost::frame() {
@@ -122,8 +139,10 @@ void CHost::frame() {
 int CHost::run() {
     if (!mp_ui && !load_ui()) return 1;
     mp_ui->init(false);
-    for (std::string const &line : m_options.m_commands) m_commands.run_line(line.c_str());
-    for (unsigned i = 0; i < m_options.m_frames; ++i) frame();
+    for (std::string const &line : m_options.m_commands)
+        m_commands.run_line(line.c_str());
+    for (unsigned i = 0; i < m_options.m_frames; ++i)
+        frame();
     mp_ui->shutdown();
     qorbase::flush_gdf();
     return 0;

@@ -25,14 +25,14 @@ class IUserInterface;
 namespace qorhost {
 
 struct SHostOptions {
-    std::string m_data = "data";  // the data folder
-    int m_w = 1024;               // screen size in pixels
+    std::string m_data = "data"; // the data folder
+    int m_w = 1024;              // screen size in pixels
     int m_h = 768;
     unsigned m_frames = 3;
-    std::string m_out = "out";    // frames, stats and the working copy of the configuration; "" for none
-    bool m_quiet = false;         // the log isn't printed
-    bool m_record = false;        // a recorder stands in front of the renderer
-    bool m_manual_clock = true;   // time moves 16 ms a frame, so runs repeat exactly
+    std::string m_out = "out";  // frames, stats and the working copy of the configuration; "" for none
+    bool m_quiet = false;       // the log isn't printed
+    bool m_record = false;      // a recorder stands in front of the renderer
+    bool m_manual_clock = true; // time moves 16 ms a frame, so runs repeat exactly
     std::vector<std::string> m_commands; // run after init, "name arguments"
 };
 
@@ -73,7 +73,7 @@ private:
     static void log_sink(char const *_line, void *_user);
 
     SHostOptions m_options;
-    CInterfaceServer m_server;
+    CInterfaceServer &m_server; // lives to the end of the process
     CInputSystem m_input;
     CVarManager m_vars;
     CCmdManager m_commands;

@@ -67,16 +67,18 @@ private:
     void draw_plaque();
     void read_screen_size();
     void load_game_library();
+    void init_desktop();
     void register_commands();
+    void register_event_names();
     void unregister_commands();
 
-    CDesktop *mp_desktop;  // owned
-    CConsole *mp_console;  // a child of the desktop, owned by the window tree
-    void *mp_reserved;     // only the constructor writes it
+    CDesktop *mp_desktop;                   // owned
+    CConsole *mp_console;                   // a child of the desktop, owned by the window tree
+    void *mp_reserved;                      // only the constructor writes it
     qor_vector<CStatsPage *> m_stats_pages; // in order of creation; owned
-    int m_scr_w;           // "scr_resx" at init
-    int m_scr_h;           // "scr_resy" at init
-    bool m_hide_console;   // the argument of init
+    int m_scr_w;                            // "scr_resx" at init
+    int m_scr_h;                            // "scr_resy" at init
+    bool m_hide_console;                    // the argument of init
 };
 
 } // namespace qorui

@@ -14,6 +14,10 @@
 #include "qorbase.h"
 #include "qordebug.h"
 #include "ui_debug.h"
+#include "ui_desktop.h"
+#include "ui_font.h"
+#include "ui_material.h"
+#include "ui_render.h"
 #include "ui_stats_page.h"
 #include "ui_time_profiler.h"
 
@@ -29,6 +33,7 @@ unsigned const k_console_char_shifted = 0x7E;
 
 char const k_default_plaque[] = "ui_init_plaque.tga";
 char const k_no_library[] = "no_lib";
+char const k_default_cursor[] = "kursor.tga";
 
 CTimeProfiler *gp_time_profiler = nullptr;
 CUserInterface *gp_user_interface = nullptr;
@@ -112,6 +117,7 @@ CUserInterface::~CUserInterface() {
         delete m_stats_pages.back();
         m_stats_pages.pop_back();
     }
+    delete mp_desktop;
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -132,7 +138,52 @@ void CUserInterface::init(bool _hide_console) {
         p_input->add_pointer_listener(this);
         p_input->add_key_listener(this);
     }
+    init_desktop();
     register_commands();
+    register_event_names();
+}
+
+// The desktop of 1024 by 768 pixels, whatever the screen's size, with its default fonts and the
+// pointer with the cursor's picture.
+void CUserInterface::init_desktop() {
+    get_fonts_factory().init();
+    static CRender s_render;
+    s_render.init(engine_interfaces().get_render(true));
+    if (!QOR_CHECK(mp_desktop == NULL)) return;
+    mp_desktop = new CDesktop(&s_render, 1024, 768, "desktop");
+    mp_desktop->send_event(mp_desktop, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
+    mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
+    mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
+
+    char const *cursor = k_default_cursor;
+    if (IConfigSection *p_sect = config_section("ui")) {
+        IConfigValue *p_cursor = p_sect->get_value("cursor", true);
+        if (QOR_CHECK(p_cursor)) cursor = p_cursor->get_string(k_default_cursor);
+    }
+    CPointer &pointer = mp_desktop->get_pointer();
+    pointer.set_size(32, 32);
+    CMaterial *p_material = mp_desktop->create_material();
+    if (p_material) p_material->init("ui_image", cursor, nullptr, nullptr, nullptr, nullptr, true, false);
+    pointer.add_material(MAT_NAME_NORMAL, p_material);
+    pointer.set_hotspot(point_t{3, 3});
+}
+
+// The names that layouts may give events, for the sounds of windows.
+void CUserInterface::register_event_names() {
+    static struct {
+        char const *mp_name;
+        EEventType m_id;
+    } const names[] = {
+        {"EVENT_SHOW", EVENT_SHOW},
+        {"EVENT_CHANGED", EVENT_CHANGED},
+        {"EVENT_CLICK", EVENT_CLICK},
+        {"EVENT_POINTER_ENTER", EVENT_POINTER_ENTER},
+        {"EVENT_CHECKED", EVENT_CHECKED},
+        {"EVENT_UNCHECKED", EVENT_UNCHECKED},
+        {"EVENT_HIGHLIGHTED", EVENT_HIGHLIGHTED},
+    };
+    for (auto const &name : names)
+        CWndEvent::register_event_name(name.mp_name, name.m_id);
 }
 
 // The start-up plaque goes straight to the renderer, full screen, and is presented at once:
@@ -199,17 +250,22 @@ void CUserInterface::unregister_commands() {
 }
 
 // The first of the two calls of a frame. The "ui" page is made at the first update.
-void CUserInterface::update(int) {
+void CUserInterface::update(int _time) {
+    if (mp_desktop) mp_desktop->update(_time);
     static IStatsPage *sp_ui_page = create_stats_page("ui");
-    (void)sp_ui_page;
+    if (sp_ui_page && sp_ui_page->is_show() && mp_desktop) mp_desktop->show_stats(sp_ui_page, 0);
 }
 
 // The second call of a frame: the desktop draws the whole tree. Without a desktop, nothing.
 void CUserInterface::draw() {
     if (!mp_desktop) return;
+    mp_desktop->draw();
 }
 
+// The desktop goes, and every window with it; then the listeners and the commands.
 void CUserInterface::shutdown() {
+    delete mp_desktop;
+    mp_desktop = nullptr;
     IInputSystem *p_input = engine_interfaces().get_input_system(true);
     if (p_input) {
         p_input->remove_pointer_listener(this);
@@ -222,7 +278,10 @@ IConsole *CUserInterface::get_console() {
     return nullptr;
 }
 
-void CUserInterface::on_app_activate(bool) {}
+void CUserInterface::on_app_activate(bool _active) {
+    if (mp_desktop && !_active)
+        mp_desktop->send_event(mp_desktop, EVENT_LOST_FOCUS, CWndEvent::DISPATCH_NONE);
+}
 
 unsigned short const *CUserInterface::get_local_string(char const *) {
     return nullptr;
@@ -232,28 +291,50 @@ char const *CUserInterface::get_local_key(unsigned short const *) {
     return nullptr;
 }
 
+// One screen pixel in desktop pixels.
 float CUserInterface::get_scale_w() {
-    return 1.0f;
+    return mp_desktop && m_scr_w ? static_cast<float>(mp_desktop->get_w()) / static_cast<float>(m_scr_w)
+                                 : 1.0f;
 }
 
 float CUserInterface::get_scale_h() {
-    return 1.0f;
+    return mp_desktop && m_scr_h ? static_cast<float>(mp_desktop->get_h()) / static_cast<float>(m_scr_h)
+                                 : 1.0f;
 }
 
 // ---------------------------------------------------------------------------------------------
 // Input: everything goes to the desktop, once there is one.
 // ---------------------------------------------------------------------------------------------
 
-void CUserInterface::on_button_down(unsigned) {}
-void CUserInterface::on_button_up(unsigned) {}
-void CUserInterface::on_pointer_move(vec2_t const &) {}
-void CUserInterface::on_wheel(float) {}
-void CUserInterface::on_key_down(unsigned, unsigned) {}
-void CUserInterface::on_key_up(unsigned) {}
+void CUserInterface::on_button_down(unsigned _button) {
+    if (mp_desktop) mp_desktop->on_pointer_down(_button);
+}
+
+void CUserInterface::on_button_up(unsigned _button) {
+    if (mp_desktop) mp_desktop->on_pointer_up(_button);
+}
+
+void CUserInterface::on_pointer_move(vec2_t const &_movement) {
+    if (mp_desktop) mp_desktop->on_pointer_move(_movement);
+}
+
+void CUserInterface::on_wheel(float _rotation) {
+    if (mp_desktop) mp_desktop->on_wheel_rotated(_rotation);
+}
+
+// The console key toggles the console once there is one.
+void CUserInterface::on_key_down(unsigned _key, unsigned _extra) {
+    if (mp_desktop) mp_desktop->on_key_down(_key, _extra);
+}
+
+void CUserInterface::on_key_up(unsigned _key) {
+    if (mp_desktop) mp_desktop->on_key_up(_key);
+}
 
 // The console key's characters go no further.
 void CUserInterface::on_char(unsigned _code) {
     if (_code == k_console_char || _code == k_console_char_shifted) return;
+    if (mp_desktop) mp_desktop->on_char(_code);
 }
 
 // ---------------------------------------------------------------------------------------------

@@ -5,6 +5,15 @@ namespace qorui {
 
 qor_map<string, EEventType, std::less<string>> CWndEvent::m_events_names;
 
+namespace {
+// The callbacks' allocator is made at the library's load, before any static that owns windows, so
+// that it is destroyed after all of them.
+bool const s_allocator_ready = [] {
+    CEventCallback const first([](CWndEvent const *) {});
+    return true;
+}();
+} // namespace
+
 CWndEvent::CWndEvent(EEventType _id)
     : m_dispatch_type(DISPATCH_NONE), m_id(_id), mp_receiver(nullptr), mp_activator(nullptr) {}
 

@@ -2,6 +2,9 @@
 // takes back.
 #include "ui.h"
 
+#include "ui_desktop.h"
+#include "ui_font.h"
+
 #include "host.h"
 #include "qorbase.h"
 #include "test_support.h"
@@ -33,7 +36,8 @@ class ServiceTest : public ::testing::Test {
 protected:
     void SetUp() override {
         m_dir = qortest::make_temp_dir();
-        use_gdf("[ui]\ninit_plaque = ui_init_plaque.tga\n[ui_libraries]\ngameui_library = libgameui_demo.so\n");
+        use_gdf(
+            "[ui]\ninit_plaque = ui_init_plaque.tga\n[ui_libraries]\ngameui_library = libgameui_demo.so\n");
         host().recorder().clear();
     }
     void TearDown() override {
@@ -62,9 +66,13 @@ protected:
 TEST_F(ServiceTest, InitDrawsThePlaqueStraightThroughTheRenderer) {
     init();
     std::vector<qorhost::SRenderCall> const &calls = host().recorder().calls();
-    EXPECT_EQ("create_material begin_2d set_material draw_quad end_2d present destroy_material",
-              host().recorder().sequence());
-    ASSERT_EQ(7u, calls.size());
+    // The plaque first; then the desktop makes the materials of its two fonts and its pointer.
+    EXPECT_EQ(
+        "create_material begin_2d set_material draw_quad end_2d present destroy_material create_material "
+        "create_material create_material",
+        host().recorder().sequence());
+    ASSERT_EQ(10u, calls.size());
+    EXPECT_EQ("kursor.tga", calls[9].m_names[1]);
     EXPECT_EQ((std::vector<std::string>{"ui_image", "ui_init_plaque.tga", "", "", "", ""}), calls[0].m_names);
     int const material = calls[0].m_handle;
     EXPECT_EQ(material, calls[2].m_handle);
@@ -94,9 +102,11 @@ TEST_F(ServiceTest, PlaqueNameDefaultsWithoutItsKeyAndWithoutItsSection) {
     qortest::CReportCapture capture;
     init();
     EXPECT_EQ("ui_init_plaque.tga", host().recorder().calls()[0].m_names[1]);
+    // Without the section both readers of "ui" report it, the plaque's and the cursor's.
     std::vector<std::string> const contracts = capture.texts(qordebug::REPORT_ASSERT);
-    ASSERT_EQ(1u, contracts.size());
+    ASSERT_EQ(2u, contracts.size());
     EXPECT_EQ(0u, contracts[0].find("Expression:   p_sect, \nFile: ")) << contracts[0];
+    EXPECT_EQ(0u, contracts[1].find("Expression:   p_sect, \nFile: ")) << contracts[1];
 }
 
 TEST_F(ServiceTest, InitPutsListenersAndCommandsInPlaceAndShutdownTakesThemBack) {
@@ -158,14 +168,40 @@ TEST_F(ServiceTest, RegisterInterfaceTwiceKeepsOneService) {
     EXPECT_EQ(p_first, host().server().query_interface(qor_uid::USER_INTERFACE, 1));
 }
 
-TEST_F(ServiceTest, ServiceWithoutDesktopAnswersNeutrally) {
+TEST_F(ServiceTest, InitMakesTheDesktopAndFramesDrawIt) {
     init();
-    EXPECT_EQ(1.0f, service().get_scale_w());
-    EXPECT_EQ(1.0f, service().get_scale_h());
+    CDesktop *p_desktop = service().get_desktop();
+    ASSERT_NE(nullptr, p_desktop);
+    EXPECT_EQ(1024, p_desktop->get_w());
+    EXPECT_EQ(768, p_desktop->get_h());
+    EXPECT_FALSE(p_desktop->is_hidden());
+    ASSERT_NE(nullptr, p_desktop->get_font(FNT_NAME_DEFAULT));
+    EXPECT_STREQ("arial_white", p_desktop->get_font(FNT_NAME_DEFAULT)->get_name());
+    EXPECT_STREQ("courier", p_desktop->get_font(FNT_NAME_FIXED)->get_name());
+    EXPECT_EQ(32, p_desktop->get_pointer().get_w());
+    EXPECT_EQ(1024.0f / 1024, service().get_scale_w());
+    EEventType id = EVENT_DRAW;
+    EXPECT_TRUE(CWndEvent::get_id_by_name("EVENT_HIGHLIGHTED", id));
+    EXPECT_EQ(EVENT_HIGHLIGHTED, id);
+
+    // Input reaches the desktop: the pointer moves from the centre.
+    service().on_pointer_move(vec2_t{10, -20});
+    EXPECT_EQ(522, p_desktop->get_pointer_pos().x);
+    EXPECT_EQ(364, p_desktop->get_pointer_pos().y);
+
+    host().recorder().clear();
+    service().update(16);
+    service().draw();
+    std::string const sequence = host().recorder().sequence();
+    EXPECT_EQ(0u, sequence.find("begin_2d")) << sequence;
+    EXPECT_NE(std::string::npos, sequence.find("draw_quad")) << sequence; // the pointer at least
+
+    service().shutdown();
+    m_initialised = false;
     EXPECT_EQ(nullptr, service().get_desktop());
-    EXPECT_EQ(nullptr, service().get_reserved());
-    EXPECT_FALSE(service().get_hide_console());
     host().recorder().clear();
     service().draw(); // no desktop: nothing reaches the renderer
+    service().on_pointer_move(vec2_t{1, 1});
     EXPECT_TRUE(host().recorder().calls().empty());
+    EXPECT_EQ(1.0f, service().get_scale_w());
 }
