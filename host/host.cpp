@@ -4,6 +4,7 @@
 #include "qordebug.h"
 #include "ui_interfaces.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <memory>
 #include <vector>
@@ -136,9 +137,27 @@ void CHost::frame() {
     m_frame_time += k_frame_ms;
 }
 
+// The configuration's "[host] startup" line, as a game's autoexec: commands separated by ';'.
+void CHost::run_startup_commands() {
+    IGDFRegistry *p_gdf = GetGDFRegistry();
+    IConfigFile *p_config = p_gdf ? p_gdf->get_config() : nullptr;
+    IConfigSection *p_section = p_config ? p_config->get_section("host") : nullptr;
+    IConfigValue *p_value = p_section ? p_section->get_value("startup", false) : nullptr;
+    if (!p_value) return;
+    std::string const commands = p_value->get_string("");
+    size_t start = 0;
+    while (start < commands.size()) {
+        size_t const end = std::min(commands.find(';', start), commands.size());
+        std::string const line = commands.substr(start, end - start);
+        if (line.find_first_not_of(' ') != std::string::npos) m_commands.run_line(line.c_str());
+        start = end + 1;
+    }
+}
+
 int CHost::run() {
     if (!mp_ui && !load_ui()) return 1;
     mp_ui->init(false);
+    run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());
     for (unsigned i = 0; i < m_options.m_frames; ++i)

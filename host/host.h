@@ -28,7 +28,7 @@ struct SHostOptions {
     std::string m_data = "data"; // the data folder
     int m_w = 1024;              // screen size in pixels
     int m_h = 768;
-    unsigned m_frames = 3;
+    unsigned m_frames = 12;
     std::string m_out = "out";  // frames, stats and the working copy of the configuration; "" for none
     bool m_quiet = false;       // the log isn't printed
     bool m_record = false;      // a recorder stands in front of the renderer
@@ -68,6 +68,7 @@ public:
     std::string frame_path(unsigned _index) const;
 
 private:
+    void run_startup_commands();
     void configure_files();
     void write_frame(SImage const &_frame, unsigned _index);
     static void log_sink(char const *_line, void *_user);

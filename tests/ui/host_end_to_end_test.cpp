@@ -69,8 +69,9 @@ TEST(HostEndToEnd, MissingPlaqueShowsTheMissingTextureAndGoesOn) {
     EXPECT_EQ(0, run.m_result.m_exit_code);
     std::string const &output = run.m_result.m_output;
     EXPECT_NE(std::string::npos, output.find("Cannot load texture 'nowhere.tga'")) << output;
-    EXPECT_NE(std::string::npos, output.find("GameUI library name is not specified.\nPlease, specify parameter "
-                                             "'gameui_library' in '[ui_libraries]' section of GDF file"))
+    EXPECT_NE(std::string::npos,
+              output.find("GameUI library name is not specified.\nPlease, specify parameter "
+                          "'gameui_library' in '[ui_libraries]' section of GDF file"))
         << output;
     qorhost::SImage frame;
     ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
@@ -78,4 +79,17 @@ TEST(HostEndToEnd, MissingPlaqueShowsTheMissingTextureAndGoesOn) {
     EXPECT_EQ(255, corner[0]); // the missing texture's magenta
     EXPECT_EQ(0, corner[1]);
     EXPECT_EQ(255, corner[2]);
+}
+
+// With no arguments but the folders, the startup line of the configuration builds the demo scene:
+// after twelve frames the desktop has faded in, and the picture matches the checked-in one.
+TEST(HostEndToEnd, TheDemoSceneIsDrawnByTheDesktop) {
+    SRun const run = run_host({});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Demo scene built"));
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0012.png", frame));
+    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_scene_1024x768.png", golden));
+    std::string const diff = run.m_out + "/demo_scene_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
 }
