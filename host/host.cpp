@@ -1,4 +1,5 @@
 #include "host.h"
+#include "input_script.h"
 
 #include "qorbase.h"
 #include "qordebug.h"
@@ -156,12 +157,22 @@ void CHost::run_startup_commands() {
 
 int CHost::run() {
     if (!mp_ui && !load_ui()) return 1;
+    CInputScript script;
+    std::string error;
+    if (!m_options.m_script.empty() && !script.load(m_options.m_script, error)) {
+        fprintf(stderr, "qorhost: %s\n", error.c_str());
+        return 2;
+    }
     mp_ui->init(false);
     run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());
-    for (unsigned i = 0; i < m_options.m_frames; ++i)
-        frame();
+    if (m_options.m_script.empty()) {
+        for (unsigned i = 0; i < m_options.m_frames; ++i)
+            frame();
+    } else {
+        script.play(*this);
+    }
     mp_ui->shutdown();
     qorbase::flush_gdf();
     return 0;

@@ -34,6 +34,7 @@ struct SHostOptions {
     bool m_record = false;      // a recorder stands in front of the renderer
     bool m_manual_clock = true; // time moves 16 ms a frame, so runs repeat exactly
     std::vector<std::string> m_commands; // run after init, "name arguments"
+    std::string m_script;                // an input script played instead of the frames; "" for none
 };
 
 class CHost {
@@ -47,7 +48,8 @@ public:
     bool load_ui();
     qorui::IUserInterface *ui() const { return mp_ui; }
 
-    // init, the commands, the frames, shutdown. Result 0, or 1 without a service.
+    // init, the commands, the frames or the input script, shutdown. Result 0; 1 without a
+    // service, 2 for a script that doesn't load.
     int run();
     // One frame: clear, update, draw, present.
     void frame();

@@ -10,8 +10,8 @@
 namespace {
 
 void usage() {
-    fprintf(stderr, "usage: qorhost [--data DIR] [--size WxH] [--frames N] [--out DIR] [--quiet] "
-                    "[+command args ...]\n");
+    fprintf(stderr, "usage: qorhost [--data DIR] [--size WxH] [--frames N] [--out DIR] [--script FILE] "
+                    "[--quiet] [+command args ...]\n");
 }
 
 // Result false on a bad argument.
@@ -32,12 +32,15 @@ bool parse(int _argc, char **_argv, qorhost::SHostOptions &_options) {
             if (sscanf(_argv[++i], "%dx%d", &_options.m_w, &_options.m_h) != 2 || _options.m_w <= 0 ||
                 _options.m_h <= 0)
                 return false;
+        } else if (argument == "--script" && has_value) {
+            _options.m_script = _argv[++i];
         } else if (argument == "--quiet") {
             _options.m_quiet = true;
         } else if (argument.size() > 1 && argument[0] == '+') {
             // "+name" and the words up to the next "+..." make one command line.
             std::string line = argument.substr(1);
-            while (i + 1 < _argc && _argv[i + 1][0] != '+') line += std::string(" ") + _argv[++i];
+            while (i + 1 < _argc && _argv[i + 1][0] != '+')
+                line += std::string(" ") + _argv[++i];
             _options.m_commands.push_back(line);
         } else {
             return false;

@@ -84,10 +84,10 @@ void make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, in
     p_title->set_passive(true);
     p_title->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
     place(p_title, new CDemoText(_p_desktop, "title", _title), 10, 4, 340, 20);
-    place(
-        p_dialog,
-        new CDemoText(_p_desktop, "line 1", "<color 255 210 90 255>qorui</color> demo: drag me by any part."),
-        16, 44, 330, 20);
+    place(p_dialog,
+          new CDemoText(_p_desktop, "line 1",
+                        "<color 255 210 90 255>qorui</color> demo: drag me by my background."),
+          16, 44, 330, 20);
     place(p_dialog,
           new CDemoText(_p_desktop, "line 2",
                         "\xD0\x9F\xD1\x80\xD0\xB8\xD0\xB2\xD0\xB5\xD1\x82, \xD0\xBC\xD0\xB8\xD1\x80!"),

@@ -93,3 +93,27 @@ TEST(HostEndToEnd, TheDemoSceneIsDrawnByTheDesktop) {
     std::string const diff = run.m_out + "/demo_scene_diff.png";
     EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
 }
+
+// An input script drags the first dialog by its background: it moves by the second movement behind
+// the press and comes to the front; the screenshot matches the checked-in picture.
+TEST(HostEndToEnd, AnInputScriptDragsADialog) {
+    std::string const script = qortest::make_temp_dir() + "/drag.script";
+    qortest::write_file(script, "move -212 -144   # from the centre onto the dialog's background\n"
+                                "press\nmove 1 0\nmove 99 50\nrelease\nwait 12\nscreenshot dragged.png\n"
+                                "command gameui_demo scripted\n");
+    SRun const run = run_host({"--script", script});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("gameui_demo scripted"));
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/dragged.png", frame));
+    ASSERT_TRUE(
+        qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_scene_dragged_1024x768.png", golden));
+    std::string const diff = run.m_out + "/dragged_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+
+    // A bad script stops the host before anything starts, naming the line.
+    qortest::write_file(script, "move 1 1\njump 3\n");
+    SRun const bad = run_host({"--script", script});
+    EXPECT_EQ(2, bad.m_result.m_exit_code);
+    EXPECT_NE(std::string::npos, bad.m_result.m_output.find("drag.script:2: unknown step 'jump'"));
+}
