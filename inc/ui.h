@@ -60,6 +60,11 @@ public:
     void on_char(unsigned _code) override;
 
     // The screen size read at init, in real pixels.
+    // The work of the commands "ui_export", "ui_import" and "print_stats_page".
+    void export_layout(char const *_file);
+    void import_layout(char const *_file);
+    void print_stats_page();
+
     int get_screen_w() const { return m_scr_w; }
     int get_screen_h() const { return m_scr_h; }
 

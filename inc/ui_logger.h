@@ -7,6 +7,7 @@
 #include <cstdarg>
 
 class ILogger;
+class ILogManager;
 
 namespace qorui {
 
@@ -34,6 +35,7 @@ private:
     string m_prefix;
     bool m_silent;
     ILogger *mp_logger;
+    ILogManager *mp_manager; // the manager mp_logger came from
 };
 
 CLogger &ui_logger();

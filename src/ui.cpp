@@ -13,7 +13,11 @@
 #include "qor_render.h"
 #include "qorbase.h"
 #include "qordebug.h"
+#include "qor_level.h"
+#include "tokenizer.h"
 #include "ui_debug.h"
+#include "ui_logger.h"
+#include "ui_text.h"
 #include "ui_desktop.h"
 #include "ui_font.h"
 #include "ui_material.h"
@@ -21,6 +25,7 @@
 #include "ui_stats_page.h"
 #include "ui_time_profiler.h"
 
+#include <cstdio>
 #include <cstring>
 
 namespace qorui {
@@ -34,6 +39,7 @@ unsigned const k_console_char_shifted = 0x7E;
 char const k_default_plaque[] = "ui_init_plaque.tga";
 char const k_no_library[] = "no_lib";
 char const k_default_cursor[] = "kursor.tga";
+char const k_default_background[] = "_back.tga";
 
 CTimeProfiler *gp_time_profiler = nullptr;
 CUserInterface *gp_user_interface = nullptr;
@@ -48,24 +54,41 @@ IConfigSection *config_section(char const *_name) {
     return p_sect;
 }
 
-// The commands of the service; their work needs the desktop and its layouts.
+// The first token of a command's arguments, quotes allowing blanks; false when there is none.
+bool first_token(char const *_arguments, string &_token) {
+    CTokenizerRules rules(_arguments, static_cast<unsigned>(std::strlen(_arguments)), default_separators());
+    try {
+        CTokenizer tokenizer(rules, 7, 0);
+        _token = tokenizer.get_token();
+        return true;
+    } catch (char const *) {
+        return false;
+    }
+}
+
 void cmd_ui_export(char const *_arguments, void *_user) {
     if (!_user || !_arguments) return;
-    qordebug::warning("Command '%s' needs the desktop, which this build of the library does not make yet",
-                      "ui_export");
+    string file;
+    if (!first_token(_arguments, file)) {
+        qordebug::warning("Use of command 'ui_export':\nui_export [filename]");
+        return;
+    }
+    static_cast<CUserInterface *>(_user)->export_layout(file.c_str());
 }
 
 void cmd_ui_import(char const *_arguments, void *_user) {
     if (!_user || !_arguments) return;
-    qordebug::warning("Command '%s' needs the desktop, which this build of the library does not make yet",
-                      "ui_import");
+    string file;
+    if (!first_token(_arguments, file)) {
+        qordebug::warning("Use of command 'ui_import':\nui_import [filename]");
+        return;
+    }
+    static_cast<CUserInterface *>(_user)->import_layout(file.c_str());
 }
 
 void cmd_print_stats_page(char const *, void *_user) {
     if (!_user) return;
-    qordebug::warning("Command '%s' needs the stats pages' log output, which this build of the library "
-                      "does not have yet",
-                      "print_stats_page");
+    static_cast<CUserInterface *>(_user)->print_stats_page();
 }
 
 struct SCommand {
@@ -372,6 +395,97 @@ IStatsPage *CUserInterface::get_current_stats_page() {
     for (CStatsPage *p_page : m_stats_pages)
         if (p_page && p_page->is_show()) return p_page;
     return nullptr;
+}
+
+// ---------------------------------------------------------------------------------------------
+// The commands' work
+// ---------------------------------------------------------------------------------------------
+
+void CUserInterface::export_layout(char const *_file) {
+    if (mp_desktop) mp_desktop->export_layout(16, _file);
+}
+
+// The layout, then the desktop's picture and the console's geometry from the configuration.
+void CUserInterface::import_layout(char const *_file) {
+    if (!mp_desktop) return;
+    mp_desktop->import(16, _file);
+    IConfigSection *p_sect = config_section("ui");
+    char const *background = k_default_background;
+    IConfigValue *p_background = p_sect ? p_sect->get_value("background", true) : nullptr;
+    if (p_sect && QOR_CHECK(p_background)) background = p_background->get_string(k_default_background);
+    CMaterial *p_material = mp_desktop->create_material();
+    if (p_material) p_material->init("ui_image", background, nullptr, nullptr, nullptr, nullptr, true, false);
+    mp_desktop->add_material(MAT_NAME_NORMAL, p_material);
+    // The console takes its place and size here once it exists.
+}
+
+namespace {
+
+// Lines up to the last one with text once its tags are gone.
+unsigned page_length(CText const &_text) {
+    unsigned length = _text.get_num_strings();
+    for (; length > 0; --length) {
+        CString const *p_line = _text.get_string(length - 1);
+        if (!p_line) break;
+        CString bare(*p_line);
+        bare.remove_tags();
+        if (!bare.empty()) break;
+    }
+    return length;
+}
+
+// The lowest free "stats_<page>_<level>_%04u.txt" of the output category; "$$$" if none is.
+string dump_file_name(char const *_page) {
+    string name = "$$$";
+    IFileSystem *p_files = GetFileSystem();
+    ILevelDescription *p_level = engine_interfaces().get_level_description(false);
+    for (unsigned i = 0; p_files && i < 100000; ++i) {
+        SLevelDescription description = {nullptr, nullptr, nullptr, nullptr};
+        if (p_level) p_level->get_description(description);
+        char buffer[260];
+        std::snprintf(buffer, sizeof buffer, "stats_%s_%s_%04u.txt", _page,
+                      description.mp_name ? description.mp_name : "", i);
+        if (p_files->load_file(2, buffer, nullptr, true) == 0) {
+            name = buffer;
+            break;
+        }
+    }
+    return name;
+}
+
+} // namespace
+
+// The page in view, without its tags, to the log and to the lowest free numbered file.
+void CUserInterface::print_stats_page() {
+    IStatsPage *p_current = get_current_stats_page();
+    if (!p_current) {
+        ui_logger().log_message("No current stats page");
+        return;
+    }
+    CStatsPage *p_page = static_cast<CStatsPage *>(p_current);
+    CText const &text = p_page->get_text();
+    unsigned const length = page_length(text);
+    string const file = dump_file_name(p_page->get_name());
+    char const *const dashes = "---------------------------------------------------------------";
+    ui_logger().log_message("%s", dashes);
+    ui_logger().log_message("Stats page: '%s'", p_page->get_name());
+    ui_logger().log_message("Out file: '%s'", file.c_str());
+    ui_logger().log_message("%s", dashes);
+    string dump;
+    for (unsigned i = 0; i < length; ++i) {
+        CString const *p_line = text.get_string(i);
+        if (!QOR_CHECK_AS(p_line, "text.get_string(i)")) continue;
+        CString bare(*p_line);
+        bare.remove_tags();
+        string const narrow = bare.length() < 256 ? bare.get_str_c() : CString(bare, 255).get_str_c();
+        ui_logger().log_message("%s", narrow.c_str());
+        dump += narrow;
+        dump += '\n';
+    }
+    ui_logger().log_message("%s", dashes);
+    if (IFileSystem *p_files = GetFileSystem())
+        p_files->save_file(2, file.c_str(), dump.data(), static_cast<unsigned>(dump.size()), 0);
+    qor_check_memory_corrupt();
 }
 
 } // namespace qorui

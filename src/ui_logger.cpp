@@ -20,15 +20,20 @@ CLogger &console_logger() {
 }
 
 CLogger::CLogger(char const *_name, char const *_prefix, bool _silent)
-    : m_name(_name ? _name : ""), m_silent(_silent), mp_logger(nullptr) {
+    : m_name(_name ? _name : ""), m_silent(_silent), mp_logger(nullptr), mp_manager(nullptr) {
     m_prefix = string(_prefix ? _prefix : "").substr(0, 4) + ":";
     m_prefix.resize(6, ' ');
 }
 
+// The engine's logger is found (or made) at the first write, and again when the engine's log
+// manager has changed since, so a withdrawn manager's logger is never written to.
 ILogger *CLogger::attach() {
-    if (mp_logger) return mp_logger;
     ILogManager *p_manager = engine_interfaces().get_log_manager(false);
-    if (!p_manager) return nullptr;
+    if (p_manager != mp_manager) {
+        mp_manager = p_manager;
+        mp_logger = nullptr;
+    }
+    if (mp_logger || !p_manager) return mp_logger;
     mp_logger = p_manager->find_logger(m_name.c_str());
     if (!mp_logger) mp_logger = p_manager->create_logger(m_name.c_str(), m_prefix.c_str());
     if (mp_logger) mp_logger->set_active(!m_silent);

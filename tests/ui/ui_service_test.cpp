@@ -6,11 +6,18 @@
 #include "ui_font.h"
 
 #include "host.h"
+#include "qor_level.h"
 #include "qorbase.h"
+#include "qorscriptsystem.h"
+#include "engine_interfaces.h"
+#include "ui_material.h"
 #include "test_support.h"
 #include "ui_time_profiler.h"
 
 #include <gtest/gtest.h>
+
+#include <cstdio>
+#include <fstream>
 
 using namespace qorui;
 
@@ -204,4 +211,134 @@ TEST_F(ServiceTest, InitMakesTheDesktopAndFramesDrawIt) {
     service().on_pointer_move(vec2_t{1, 1});
     EXPECT_TRUE(host().recorder().calls().empty());
     EXPECT_EQ(1.0f, service().get_scale_w());
+}
+
+// ---------------------------------------------------------------------------------------------
+// The commands
+// ---------------------------------------------------------------------------------------------
+
+namespace {
+
+// Layouts and presets go to a folder of the test's own, not to the data folder.
+class ServiceCommandsTest : public ServiceTest {
+protected:
+    void SetUp() override {
+        ServiceTest::SetUp();
+        m_ui_root = qorbase::get_category_root(16);
+        init();
+        m_layouts = qortest::make_temp_dir();
+        qorbase::set_category_root(16, m_layouts.c_str());
+    }
+    void TearDown() override {
+        qorbase::set_category_root(16, m_ui_root.c_str());
+        ServiceTest::TearDown();
+    }
+    void run(char const *_p_line) { host().commands().run_line(_p_line); }
+    // A fresh desktop, made with the interface data of the data folder.
+    void reinit() {
+        service().shutdown();
+        qorbase::set_category_root(16, m_ui_root.c_str());
+        init();
+        qorbase::set_category_root(16, m_layouts.c_str());
+    }
+    std::string log_since(unsigned _first) {
+        std::string text;
+        for (unsigned i = _first; i < host().log().get_next_index(); ++i)
+            text += host().log().get_message_text(i) + "\n";
+        return text;
+    }
+
+    std::string m_ui_root;
+    std::string m_layouts;
+};
+
+} // namespace
+
+TEST_F(ServiceCommandsTest, ExportAndImportWithoutAFileNameExplainTheirUse) {
+    qortest::CReportCapture capture;
+    run("ui_export");
+    run("ui_import   ");
+    EXPECT_EQ((std::vector<std::string>{"Use of command 'ui_export':\nui_export [filename]",
+                                        "Use of command 'ui_import':\nui_import [filename]"}),
+              capture.texts(qordebug::REPORT_WARNING));
+    EXPECT_FALSE(std::ifstream(m_layouts + "/ui_material_presets.lua").good()); // nothing written
+}
+
+TEST_F(ServiceCommandsTest, AnExportedLayoutImportsBackToTheSameTree) {
+    CDesktop *p_desktop = service().get_desktop();
+    CWindowVisual *p_panel = new CWindowVisual(p_desktop, "panel");
+    p_desktop->attach_child(p_panel);
+    p_panel->set_pos(30, 40);
+    p_panel->set_size(200, 100);
+    p_panel->set_can_drag(true);
+    CMaterial *p_material = p_desktop->create_material();
+    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
+    p_material->set_color(rgba_t(10, 20, 30, 40));
+    p_panel->add_material(MAT_NAME_NORMAL, p_material);
+    run("ui_export \"my layout.lua\" ignored");
+    std::string const first = qortest::read_file(m_layouts + "/my layout.lua");
+    EXPECT_NE(std::string::npos, first.find("ui_windows_ini = {")) << first;
+    EXPECT_NE(std::string::npos,
+              qortest::read_file(m_layouts + "/ui_material_presets.lua").find("ui_material_presets"));
+    EXPECT_TRUE(lua_machine().GetGlobals().GetByName("ui_windows_ini").IsNil());
+    EXPECT_TRUE(lua_machine().GetGlobals().GetByName("ui_material_presets").IsNil());
+
+    // A fresh desktop takes the layout back: the panel is made again with its keys.
+    reinit();
+    qortest::CReportCapture capture; // the default background's texture isn't in the test's folders
+    run("ui_import \"my layout.lua\"");
+    CWindow *p_loaded = service().get_desktop()->get_child("panel", "WindowVisual", true);
+    ASSERT_NE(nullptr, p_loaded);
+    EXPECT_EQ(30, p_loaded->get_pos().x);
+    EXPECT_TRUE(p_loaded->is_can_drag());
+    CMaterial *p_loaded_material = static_cast<CWindowVisual *>(p_loaded)->get_material(MAT_NAME_NORMAL);
+    ASSERT_NE(nullptr, p_loaded_material);
+    EXPECT_EQ(rgba_t(10, 20, 30, 40), p_loaded_material->get_color());
+    EXPECT_FALSE(lua_machine().GetGlobals().GetByName("ui_windows_ini").IsNil());
+    EXPECT_NE(nullptr, service().get_desktop()->get_material(MAT_NAME_NORMAL)); // the background
+
+    // Export, import into a fresh desktop, export again: the two files are the same, byte for byte.
+    run("ui_export second.lua");
+    reinit();
+    run("ui_import second.lua");
+    run("ui_export third.lua");
+    EXPECT_EQ(qortest::read_file(m_layouts + "/second.lua"), qortest::read_file(m_layouts + "/third.lua"));
+}
+
+TEST_F(ServiceCommandsTest, TheStatsPageInViewIsDumpedToTheLowestFreeFile) {
+    unsigned const first = host().log().get_next_index();
+    run("print_stats_page");
+    EXPECT_NE(std::string::npos, log_since(first).find("No current stats page"));
+
+    IStatsPage *p_page = service().create_stats_page("dump");
+    p_page->clear();
+    p_page->print(0, "first");
+    p_page->set_color(0, 1, 0, 1);
+    p_page->print(3, "x");
+    p_page->show(true);
+    unsigned const second = host().log().get_next_index();
+    run("print_stats_page");
+    run("print_stats_page");
+    p_page->show(false);
+    std::string const out = host().options().m_out;
+    std::string level_name;
+    {
+        SLevelDescription description = {nullptr, nullptr, nullptr, nullptr};
+        host().level().get_description(description);
+        level_name = description.mp_name ? description.mp_name : "";
+    }
+    std::string const file0 = out + "/stats_dump_" + level_name + "_0000.txt";
+    EXPECT_EQ("first\n\n\nx\n", qortest::read_file(file0));
+    EXPECT_EQ("first\n\n\nx\n", qortest::read_file(out + "/stats_dump_" + level_name + "_0001.txt"));
+    std::string const log = log_since(second);
+    EXPECT_NE(std::string::npos, log.find("Stats page: 'dump'"));
+    EXPECT_NE(std::string::npos, log.find("Out file: 'stats_dump_" + level_name + "_0000.txt'"));
+    EXPECT_EQ(std::string::npos, log.find("<color"));
+
+    // A deleted 0000 is used again.
+    std::remove(file0.c_str());
+    p_page->show(true);
+    run("print_stats_page");
+    p_page->show(false);
+    EXPECT_EQ("first\n\n\nx\n", qortest::read_file(file0));
 }
