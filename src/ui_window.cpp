@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <vector>
 
 namespace qorui {
 
@@ -471,12 +472,18 @@ void CWindow::load_state(LuaPlus::LuaObject &_lo_table) {
     load_children(_lo_table);
 }
 
-// Every entry without a string key is a child's table, in the table's own order.
+// Every entry without a string key is a child's table. They are taken in the order of their
+// numbers, the order in which save_state wrote them (a Lua table walks its hash part in no
+// particular order), so that a layout loaded and saved again keeps its children's order.
 void CWindow::load_children(LuaPlus::LuaObject &_lo_table) {
+    std::vector<std::pair<double, LuaPlus::LuaObject>> entries;
     LuaPlus::LuaObject key(_lo_table.GetState()), value(_lo_table.GetState());
-    while (LuaPlus::LuaPlusH_next(_lo_table.GetState(), _lo_table, key, value)) {
-        if (key.IsString()) continue;
-        if (value.IsTable()) load_child(value);
+    while (LuaPlus::LuaPlusH_next(_lo_table.GetState(), _lo_table, key, value))
+        if (!key.IsString()) entries.emplace_back(key.IsNumber() ? key.GetNumber() : 0.0, value);
+    std::stable_sort(entries.begin(), entries.end(),
+                     [](auto const &_a, auto const &_b) { return _a.first < _b.first; });
+    for (auto &entry : entries) {
+        if (entry.second.IsTable()) load_child(entry.second);
         on_child_attached();
     }
 }

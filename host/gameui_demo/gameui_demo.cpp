@@ -10,6 +10,7 @@
 #include "ui_interfaces.h"
 #include "ui_material.h"
 #include "ui_string.h"
+#include "qorscriptsystem.h"
 
 #include <string>
 
@@ -30,12 +31,27 @@ void cmd_gameui_demo(char const *_arguments, void *) {
 }
 
 // A line of text in the window's default font (inherited from the desktop), in a colour of its
-// own; the window is passive, so a press on it activates its dialog.
+// own; the window is passive, so a press on it activates its dialog. The class registers itself in
+// the windows factory as "DemoText", so layouts can make it and keep its "text".
 class CDemoText : public CWindowVisual {
 public:
-    CDemoText(IWindowDesktop *_p_desktop, char const *_name, char const *_text)
-        : CWindowVisual(_p_desktop, _name), m_text(_text) {
+    CDemoText(IWindowDesktop *_p_desktop, char const *_name) : CWindowVisual(_p_desktop, _name) {
         set_passive(true);
+    }
+    CDemoText(IWindowDesktop *_p_desktop, char const *_name, char const *_text)
+        : CDemoText(_p_desktop, _name) {
+        m_text = CString(_text);
+    }
+
+    QOR_CLASS_ID(CDemoText, CWindowVisual, "DemoText")
+
+    void save_state(LuaPlus::LuaObject &_lo_table) override {
+        CWindowVisual::save_state(_lo_table);
+        save_string(_lo_table, "text", m_text);
+    }
+    void load_state(LuaPlus::LuaObject &_lo_table) override {
+        CWindowVisual::load_state(_lo_table);
+        load_string(_lo_table, "text", m_text);
     }
 
 protected:
@@ -47,6 +63,8 @@ protected:
 private:
     CString m_text;
 };
+
+CWindowRegistrar<CDemoText> const s_demo_text_registrar("DemoText");
 
 CMaterial *colour(CDesktop *_p_desktop, unsigned char _r, unsigned char _g, unsigned char _b,
                   unsigned char _a = 255) {

@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <string>
 
 namespace {
@@ -116,4 +117,54 @@ TEST(HostEndToEnd, AnInputScriptDragsADialog) {
     SRun const bad = run_host({"--script", script});
     EXPECT_EQ(2, bad.m_result.m_exit_code);
     EXPECT_NE(std::string::npos, bad.m_result.m_output.find("drag.script:2: unknown step 'jump'"));
+}
+
+namespace {
+
+// A copy of the data folder, for runs that write layouts into it; without the startup line when
+// _startup is false, so the desktop starts empty.
+std::string data_copy(bool _startup) {
+    std::string const dir = qortest::make_temp_dir();
+    std::string const command = "cp -r '" + qortest::source_dir() + "/data' '" + dir + "/data'";
+    EXPECT_EQ(0, std::system(command.c_str()));
+    if (!_startup) {
+        std::string gdf = qortest::read_file(dir + "/data/qor.gdf");
+        gdf = gdf.substr(0, gdf.find("[host]"));
+        qortest::write_file(dir + "/data/qor.gdf", gdf);
+    }
+    return dir + "/data";
+}
+
+SRun run_on(std::string const &_data, std::vector<std::string> _arguments) {
+    SRun run;
+    run.m_out = qortest::make_temp_dir();
+    std::vector<std::string> arguments = {"--data", _data, "--out", run.m_out};
+    arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
+    run.m_result = qortest::run_child("qorhost", {}, arguments);
+    return run;
+}
+
+} // namespace
+
+// The demo's layout imported into an empty desktop makes the scene of the demo library, with the
+// configured background; exported, imported and exported again, the two files are the same.
+TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
+    std::string const data = data_copy(false);
+    SRun const imported = run_on(data, {"+ui_import", "demo_layout.lua", "+ui_export", "second.lua"});
+    ASSERT_EQ(0, imported.m_result.m_exit_code) << imported.m_result.m_output;
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(imported.m_out + "/frame_0012.png", frame));
+    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_layout_imported_1024x768.png",
+                                    golden));
+    std::string const diff = imported.m_out + "/imported_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+
+    // Over the scene that the code builds, the same layout changes no window's place: same picture.
+    SRun const over = run_on(data_copy(true), {"+ui_import", "demo_layout.lua"});
+    ASSERT_TRUE(qorhost::load_image(over.m_out + "/frame_0012.png", frame));
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2));
+
+    SRun const again = run_on(data, {"+ui_import", "second.lua", "+ui_export", "third.lua"});
+    ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
+    EXPECT_EQ(qortest::read_file(data + "/ui/second.lua"), qortest::read_file(data + "/ui/third.lua"));
 }
