@@ -342,3 +342,19 @@ TEST_F(ServiceCommandsTest, TheStatsPageInViewIsDumpedToTheLowestFreeFile) {
     p_page->show(false);
     EXPECT_EQ("first\n\n\nx\n", qortest::read_file(file0));
 }
+
+TEST_F(ServiceCommandsTest, ADumpTakesTheNumberBehindTheTakenOnes) {
+    SLevelDescription description = {nullptr, nullptr, nullptr, nullptr};
+    host().level().get_description(description);
+    std::string const stem =
+        host().options().m_out + "/stats_full_" + (description.mp_name ? description.mp_name : "");
+    for (int i = 0; i <= 5; ++i)
+        qortest::write_file(stem + "_000" + std::to_string(i) + ".txt", "kept\n");
+    IStatsPage *p_page = service().create_stats_page("full");
+    p_page->print(1, "line");
+    p_page->show(true);
+    run("print_stats_page");
+    p_page->show(false);
+    EXPECT_EQ("\nline\n", qortest::read_file(stem + "_0006.txt"));
+    EXPECT_EQ("kept\n", qortest::read_file(stem + "_0005.txt"));
+}
