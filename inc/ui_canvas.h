@@ -68,6 +68,7 @@ public:
 private:
     IRender *get_render() const;
     void fade_color(rgba_t &_color) const;
+    bool prepare(CMaterial const *_p_material, IRender *&_p_render, rgba_t &_color) const;
     point_t origin() const;
     // One quad, corners upper left, lower left, lower right, upper right, in desktop pixels.
     void quad(IRender *_p_render, int _l, int _t, int _r, int _b, float _u0, float _v0, float _u1, float _v1,

@@ -57,12 +57,21 @@ void CCanvas::render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_came
 // Lines and rectangles
 // ---------------------------------------------------------------------------------------------
 
+// What every drawing starts with: a material (none draws nothing), the bridge, the faded copy of
+// the material's colour.
+bool CCanvas::prepare(CMaterial const *_p_material, IRender *&_p_render, rgba_t &_color) const {
+    if (!_p_material) return false;
+    _p_render = get_render();
+    if (!_p_render) return false;
+    _color = _p_material->get_color();
+    fade_color(_color);
+    return true;
+}
+
 void CCanvas::draw_line(int _x0, int _y0, int _x1, int _y1, CMaterial *_p_material) {
-    if (!_p_material) return;
-    IRender *p_render = get_render();
-    if (!p_render) return;
-    rgba_t color = _p_material->get_color();
-    fade_color(color);
+    IRender *p_render;
+    rgba_t color;
+    if (!prepare(_p_material, p_render, color)) return;
     point_t const o = origin();
     p_render->set_material(_p_material->get_material_handle());
     p_render->draw_line(point_t{_x0 + o.x, _y0 + o.y}, point_t{_x1 + o.x, _y1 + o.y}, color, color);
@@ -77,11 +86,9 @@ void CCanvas::quad(IRender *_p_render, int _l, int _t, int _r, int _b, float _u0
 
 void CCanvas::draw_rect(int _x, int _y, int _w, int _h, float _tex_x, float _tex_y, float _tex_w,
                         float _tex_h, CMaterial *_p_material) {
-    if (!_p_material) return;
-    IRender *p_render = get_render();
-    if (!p_render) return;
-    rgba_t color = _p_material->get_color();
-    fade_color(color);
+    IRender *p_render;
+    rgba_t color;
+    if (!prepare(_p_material, p_render, color)) return;
     point_t const o = origin();
     int const l = _x + o.x, t = _y + o.y;
     p_render->set_material(_p_material->get_material_handle());
@@ -89,11 +96,9 @@ void CCanvas::draw_rect(int _x, int _y, int _w, int _h, float _tex_x, float _tex
 }
 
 void CCanvas::draw_rect(int _x, int _y, int _w, int _h, CMaterial *_p_material) {
-    if (!_p_material) return;
-    IRender *p_render = get_render();
-    if (!p_render) return;
-    rgba_t color = _p_material->get_color();
-    fade_color(color);
+    IRender *p_render;
+    rgba_t color;
+    if (!prepare(_p_material, p_render, color)) return;
     p_render->set_material(_p_material->get_material_handle());
     point_t const o = origin();
     int const l = _x + o.x, t = _y + o.y, r = l + _w, b = t + _h;
@@ -143,11 +148,9 @@ void CCanvas::draw_nine_patch(IRender *_p_render, int _l, int _t, int _r, int _b
 
 void CCanvas::draw_tiled(int _x, int _y, int _w, int _h, float _tex_x, float _tex_y, float _tex_w,
                          float _tex_h, float _tex_real_w, float _tex_real_h, CMaterial *_p_material) {
-    if (_w < 1 || _h < 1 || !_p_material) return;
-    IRender *p_render = get_render();
-    if (!p_render) return;
-    rgba_t color = _p_material->get_color();
-    fade_color(color);
+    IRender *p_render;
+    rgba_t color;
+    if (_w < 1 || _h < 1 || !prepare(_p_material, p_render, color)) return;
     int const tile_w = static_cast<int>(_tex_w * _tex_real_w);
     int const tile_h = static_cast<int>(_tex_h * _tex_real_h);
     // A tile size of 0 (or less) draws no tile.
