@@ -52,7 +52,8 @@ CInterfaceServer &new_server() {
 
 CHost::CHost(SHostOptions const &_options)
     : m_options(_options), m_server(new_server()), m_commands(&m_vars), mp_engine_logger(nullptr),
-      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0) {
+      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0),
+      m_start_tick(qorplatform::get_tick_count()) {
     m_log.set_quiet(m_options.m_quiet);
     mp_engine_logger = m_log.create_logger("Engine", "");
     qorbase::set_log_sink(log_sink, this);
@@ -123,7 +124,7 @@ std::string CHost::frame_path(unsigned _index) const {
 }
 
 void CHost::write_frame(SImage const &_frame, unsigned _index) {
-    if (m_options.m_out.empty()) return;
+    if (m_options.m_out.empty() || m_options.m_window) return;
     if (!write_png(frame_path(_index), _frame))
         qordebug::warning("Cannot write '%s'", frame_path(_index).c_str());
 }
@@ -134,8 +135,12 @@ void CHost::frame() {
     mp_ui->update(static_cast<int>(m_frame_time));
     mp_ui->draw();
     m_renderer.present();
-    if (m_options.m_manual_clock) m_clock.advance_ms(k_frame_ms);
-    m_frame_time += k_frame_ms;
+    if (m_options.m_manual_clock) {
+        m_clock.advance_ms(k_frame_ms);
+        m_frame_time += k_frame_ms;
+    } else {
+        m_frame_time = qorplatform::get_tick_count() - m_start_tick;
+    }
 }
 
 // The configuration's "[host] startup" line, as a game's autoexec: commands separated by ';'.
@@ -163,19 +168,30 @@ int CHost::run() {
         fprintf(stderr, "qorhost: %s\n", error.c_str());
         return 2;
     }
-    mp_ui->init(false);
-    run_startup_commands();
-    for (std::string const &line : m_options.m_commands)
-        m_commands.run_line(line.c_str());
+    start();
     if (m_options.m_script.empty()) {
         for (unsigned i = 0; i < m_options.m_frames; ++i)
             frame();
     } else {
         script.play(*this);
     }
+    finish();
+    return 0;
+}
+
+bool CHost::start() {
+    if (!mp_ui && !load_ui()) return false;
+    mp_ui->init(false);
+    run_startup_commands();
+    for (std::string const &line : m_options.m_commands)
+        m_commands.run_line(line.c_str());
+    return true;
+}
+
+void CHost::finish() {
+    if (!mp_ui) return;
     mp_ui->shutdown();
     qorbase::flush_gdf();
-    return 0;
 }
 
 } // namespace qorhost

@@ -28,13 +28,14 @@ struct SHostOptions {
     std::string m_data = "data"; // the data folder
     int m_w = 1024;              // screen size in pixels
     int m_h = 768;
-    unsigned m_frames = 12;
+    unsigned m_frames = 12;     // in a window, 0 runs until the window is closed
     std::string m_out = "out";  // frames, stats and the working copy of the configuration; "" for none
     bool m_quiet = false;       // the log isn't printed
     bool m_record = false;      // a recorder stands in front of the renderer
     bool m_manual_clock = true; // time moves 16 ms a frame, so runs repeat exactly
     std::vector<std::string> m_commands; // run after init, "name arguments"
     std::string m_script;                // an input script played instead of the frames; "" for none
+    bool m_window = false; // frames are shown in a window that gives the input; none are written
 };
 
 class CHost {
@@ -51,6 +52,10 @@ public:
     // init, the commands, the frames or the input script, shutdown. Result 0; 1 without a
     // service, 2 for a script that doesn't load.
     int run();
+    // The two ends of a run, for a host that runs the frames itself: init and the commands
+    // (false without a service), and shutdown.
+    bool start();
+    void finish();
     // One frame: clear, update, draw, present.
     void frame();
 
@@ -88,7 +93,8 @@ private:
     CRecordingRenderer m_recorder;
     qorplatform::CManualClock m_clock;
     qorui::IUserInterface *mp_ui;
-    unsigned m_frame_time;
+    unsigned m_frame_time; // handed to update, ms: 16 a frame on the manual clock, else since m_start_tick
+    uint32_t m_start_tick; // the system clock's when the host was made
 };
 
 } // namespace qorhost

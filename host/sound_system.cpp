@@ -9,8 +9,12 @@
 namespace qorhost {
 
 namespace {
-uint32_t read_u32(unsigned char const *_p) { return _p[0] | (_p[1] << 8) | (_p[2] << 16) | (uint32_t(_p[3]) << 24); }
-uint16_t read_u16(unsigned char const *_p) { return static_cast<uint16_t>(_p[0] | (_p[1] << 8)); }
+uint32_t read_u32(unsigned char const *_p) {
+    return _p[0] | (_p[1] << 8) | (_p[2] << 16) | (uint32_t(_p[3]) << 24);
+}
+uint16_t read_u16(unsigned char const *_p) {
+    return static_cast<uint16_t>(_p[0] | (_p[1] << 8));
+}
 } // namespace
 
 bool is_pcm_wave(unsigned char const *_p_data, unsigned _size) {
@@ -35,30 +39,55 @@ bool is_pcm_wave(unsigned char const *_p_data, unsigned _size) {
     return has_format && has_data;
 }
 
-CSoundSource::CSoundSource(CSoundSystem *_p_system, std::string const &_file, int _group)
+CSoundSource::CSoundSource(CSoundSystem *_p_system, std::string const &_file, int _group,
+                           std::shared_ptr<ISoundOutput> const &_p_output, unsigned _voice)
     : mp_system(_p_system), m_file(_file), m_group(_group), m_state(0), m_state_time(0.0f), m_option(0),
-      m_volume(1.0f), m_looping(false) {
+      m_volume(1.0f), m_looping(false), mp_output(_voice ? _p_output : nullptr), m_voice(_voice) {
     ++mp_system->m_live_sources;
 }
 
-CSoundSource::~CSoundSource() { --mp_system->m_live_sources; }
+CSoundSource::~CSoundSource() {
+    if (m_voice) mp_output->remove_voice(m_voice);
+    --mp_system->m_live_sources;
+}
 
 void CSoundSource::set_state(int _state, float _time) {
     m_state = _state;
     m_state_time = _time;
     if (_state == 1) ++mp_system->m_started;
+    if (!m_voice) return;
+    if (_state == 1)
+        mp_output->start(m_voice, _time);
+    else if (_state == 3)
+        mp_output->stop(m_voice, _time);
+    else if (_state == 0)
+        mp_output->reset(m_voice);
+}
+
+void CSoundSource::set_volume(float _volume) {
+    m_volume = _volume;
+    if (m_voice) mp_output->set_volume(m_voice, _volume);
+}
+
+void CSoundSource::set_looping(bool _looping) {
+    m_looping = _looping;
+    if (m_voice) mp_output->set_looping(m_voice, _looping);
 }
 
 ISoundSource *CSoundSystem::create_sound(char const *_file, int _group, int) {
     void *p_content = nullptr;
     unsigned const size = GetFileSystem()->load_file(qorbase::FILE_CATEGORY_UI, _file, &p_content, true);
-    bool const valid = p_content && is_pcm_wave(static_cast<unsigned char const *>(p_content), size);
+    unsigned char const *p_wave = static_cast<unsigned char const *>(p_content);
+    bool const valid = p_content && is_pcm_wave(p_wave, size);
+    unsigned const voice = valid && mp_output ? mp_output->add_voice(p_wave, size) : 0;
     MMDeallocate(p_content);
     if (!valid) {
         qordebug::warning("Cannot create sound from '%s'", _file ? _file : "");
         return nullptr;
     }
-    return new CSoundSource(this, _file, _group);
+    // A sound the output can't take is still a source; it is only silent.
+    if (mp_output && !voice) qordebug::warning("Cannot play sound '%s'", _file);
+    return new CSoundSource(this, _file, _group, mp_output, voice);
 }
 
 } // namespace qorhost

@@ -1,5 +1,5 @@
 // What the host's tests share: captured reports, a temporary folder for the files a test makes,
-// little-endian byte writers for those files, and a readable print of colours.
+// little-endian byte writers for those files, WAV files, and a readable print of colours.
 #pragma once
 #include "qor_math.h"
 #include "qordebug.h"
@@ -112,6 +112,49 @@ inline void put_u32(bytes_t &_out, uint32_t _value) {
 inline void put_text(bytes_t &_out, char const *_text) {
     for (char const *p = _text; *p; ++p)
         _out.push_back(static_cast<uint8_t>(*p));
+}
+
+// A RIFF chunk, padded to an even size.
+inline bytes_t chunk(char const *_id, bytes_t const &_payload) {
+    bytes_t out;
+    put_text(out, _id);
+    put_u32(out, static_cast<uint32_t>(_payload.size()));
+    out.insert(out.end(), _payload.begin(), _payload.end());
+    if (_payload.size() & 1) out.push_back(0);
+    return out;
+}
+
+// A WAV "fmt " chunk; format 1 is PCM.
+inline bytes_t format_chunk(unsigned _format, unsigned _bits, unsigned _channels = 1,
+                            unsigned _rate = 22050) {
+    bytes_t payload;
+    put_u16(payload, _format);
+    put_u16(payload, _channels);
+    put_u32(payload, _rate);
+    put_u32(payload, _rate * _channels * _bits / 8);
+    put_u16(payload, _channels * _bits / 8);
+    put_u16(payload, _bits);
+    return chunk("fmt ", payload);
+}
+
+inline bytes_t wave(std::vector<bytes_t> const &_chunks) {
+    bytes_t body;
+    put_text(body, "WAVE");
+    for (bytes_t const &c : _chunks)
+        body.insert(body.end(), c.begin(), c.end());
+    bytes_t out;
+    put_text(out, "RIFF");
+    put_u32(out, static_cast<uint32_t>(body.size()));
+    out.insert(out.end(), body.begin(), body.end());
+    return out;
+}
+
+// A PCM WAV of 16-bit samples, interleaved when there are more channels.
+inline bytes_t wave16(std::vector<int> const &_samples, unsigned _channels = 1, unsigned _rate = 22050) {
+    bytes_t data;
+    for (int sample : _samples)
+        put_u16(data, static_cast<uint16_t>(static_cast<int16_t>(sample)));
+    return wave({format_chunk(1, 16, _channels, _rate), chunk("data", data)});
 }
 
 } // namespace hosttest

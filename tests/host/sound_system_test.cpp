@@ -12,45 +12,13 @@
 
 using namespace qorhost;
 using hosttest::bytes_t;
+using hosttest::chunk;
 using hosttest::CReportCapture;
 using hosttest::CTempDir;
-using hosttest::put_text;
-using hosttest::put_u16;
-using hosttest::put_u32;
+using hosttest::format_chunk;
+using hosttest::wave;
 
 namespace {
-
-bytes_t chunk(char const *_id, bytes_t const &_payload) {
-    bytes_t out;
-    put_text(out, _id);
-    put_u32(out, static_cast<uint32_t>(_payload.size()));
-    out.insert(out.end(), _payload.begin(), _payload.end());
-    if (_payload.size() & 1) out.push_back(0);
-    return out;
-}
-
-bytes_t format_chunk(unsigned _format, unsigned _bits) {
-    bytes_t payload;
-    put_u16(payload, _format);
-    put_u16(payload, 1);     // channels
-    put_u32(payload, 22050); // samples per second
-    put_u32(payload, 22050 * _bits / 8);
-    put_u16(payload, _bits / 8);
-    put_u16(payload, _bits);
-    return chunk("fmt ", payload);
-}
-
-bytes_t wave(std::vector<bytes_t> const &_chunks) {
-    bytes_t body;
-    put_text(body, "WAVE");
-    for (bytes_t const &c : _chunks)
-        body.insert(body.end(), c.begin(), c.end());
-    bytes_t out;
-    put_text(out, "RIFF");
-    put_u32(out, static_cast<uint32_t>(body.size()));
-    out.insert(out.end(), body.begin(), body.end());
-    return out;
-}
 
 bytes_t const k_samples = {0, 1, 2, 3, 4, 5, 6, 7};
 

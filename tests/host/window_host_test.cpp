@@ -1,0 +1,522 @@
+// The host in a window, on SDL's dummy video and audio drivers: keys as Windows virtual-key codes,
+// SDL's events as the library's input, frames shown in the window, and the mixer that plays the
+// sound system's sources.
+#ifdef QORHOST_WITH_SDL2
+#include "host.h"
+#include "host_test_support.h"
+#include "qorbase.h"
+#include "sdl_audio.h"
+#include "window_host.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <string>
+#include <vector>
+
+using namespace qorhost;
+using hosttest::bytes_t;
+using hosttest::chunk;
+using hosttest::CReportCapture;
+using hosttest::CTempDir;
+using hosttest::format_chunk;
+using hosttest::wave;
+using hosttest::wave16;
+
+namespace {
+
+// Every input a listener hears, as text.
+class CInputRecord : public IPointerListener, public IKeyListener {
+public:
+    void on_button_down(unsigned _button) override { add("down %u", _button); }
+    void on_button_up(unsigned _button) override { add("up %u", _button); }
+    void on_pointer_move(vec2_t const &_movement) override { add("move %g %g", _movement.x, _movement.y); }
+    void on_wheel(float _rotation) override { add("wheel %g", _rotation); }
+    void on_key_down(unsigned _key, unsigned _extra) override { add("key_down 0x%X %u", _key, _extra); }
+    void on_key_up(unsigned _key) override { add("key_up 0x%X", _key); }
+    void on_char(unsigned _code) override { add("char 0x%X", _code); }
+
+    std::vector<std::string> m_lines;
+
+private:
+    template <class... Args>
+    void add(char const *_format, Args... _args) {
+        char line[64];
+        snprintf(line, sizeof(line), _format, _args...);
+        m_lines.push_back(line);
+    }
+};
+
+SDL_Event key_event(Uint32 _type, SDL_Keycode _key, SDL_Scancode _place, Uint8 _repeat = 0) {
+    SDL_Event event;
+    SDL_zero(event);
+    event.type = _type;
+    event.key.state = _type == SDL_KEYDOWN ? SDL_PRESSED : SDL_RELEASED;
+    event.key.repeat = _repeat;
+    event.key.keysym.sym = _key;
+    event.key.keysym.scancode = _place;
+    return event;
+}
+
+SDL_Event motion_event(int _dx, int _dy) {
+    SDL_Event event;
+    SDL_zero(event);
+    event.type = SDL_MOUSEMOTION;
+    event.motion.xrel = _dx;
+    event.motion.yrel = _dy;
+    return event;
+}
+
+SDL_Event button_event(Uint32 _type, Uint8 _button) {
+    SDL_Event event;
+    SDL_zero(event);
+    event.type = _type;
+    event.button.button = _button;
+    event.button.state = _type == SDL_MOUSEBUTTONDOWN ? SDL_PRESSED : SDL_RELEASED;
+    return event;
+}
+
+SDL_Event wheel_event(float _y, Uint32 _direction) {
+    SDL_Event event;
+    SDL_zero(event);
+    event.type = SDL_MOUSEWHEEL;
+    event.wheel.y = static_cast<Sint32>(_y);
+    event.wheel.preciseY = _y;
+    event.wheel.direction = _direction;
+    return event;
+}
+
+SDL_Event text_event(char const *_utf8) {
+    SDL_Event event;
+    SDL_zero(event);
+    event.type = SDL_TEXTINPUT;
+    snprintf(event.text.text, sizeof(event.text.text), "%s", _utf8);
+    return event;
+}
+
+// A host of 512 by 384 pixels, half the desktop's size, without the UI library, in a window of
+// SDL's dummy driver.
+class WindowHostTest : public testing::Test {
+protected:
+    WindowHostTest() {
+        setenv("SDL_VIDEODRIVER", "dummy", 1);
+        setenv("SDL_AUDIODRIVER", "dummy", 1);
+        SHostOptions options;
+        options.m_data = m_dir.path();
+        options.m_out = "";
+        options.m_quiet = true;
+        options.m_w = 512;
+        options.m_h = 384;
+        options.m_window = true;
+        options.m_manual_clock = false;
+        mp_host = std::make_unique<CHost>(options);
+        mp_window = std::make_unique<CWindowHost>(*mp_host);
+        mp_host->input().add_pointer_listener(&m_record);
+        mp_host->input().add_key_listener(&m_record);
+    }
+    ~WindowHostTest() override {
+        mp_window.reset();
+        mp_host.reset();
+        for (int category : {qorbase::FILE_CATEGORY_STATS, qorbase::FILE_CATEGORY_CONFIG,
+                             qorbase::FILE_CATEGORY_FONTS, qorbase::FILE_CATEGORY_UI})
+            qorbase::set_category_root(category, "");
+    }
+
+    void open() {
+        std::string error;
+        ASSERT_TRUE(mp_window->open(error)) << error;
+    }
+    static void push(SDL_Event _event) { ASSERT_EQ(1, SDL_PushEvent(&_event)); }
+    rgba_t shown_pixel(int _x, int _y) const {
+        SDL_Rect const rect = {_x, _y, 1, 1};
+        uint8_t rgba[4] = {0, 0, 0, 0};
+        EXPECT_EQ(0, SDL_RenderReadPixels(mp_window->renderer(), &rect, SDL_PIXELFORMAT_RGBA32, rgba, 4))
+            << SDL_GetError();
+        return rgba_t(rgba[0], rgba[1], rgba[2], rgba[3]);
+    }
+
+    CTempDir m_dir;
+    CReportCapture m_reports;
+    CInputRecord m_record;
+    std::unique_ptr<CHost> mp_host;
+    std::unique_ptr<CWindowHost> mp_window;
+};
+
+// A mixer of one channel at 1000 Hz: a millisecond is a frame, and WAVs of that rate play as
+// they are.
+class SoundMixerTest : public testing::Test {
+protected:
+    unsigned add(std::vector<int> const &_samples, float _volume = 1.0f) {
+        bytes_t const file = wave16(_samples, 1, 1000);
+        unsigned const voice = m_mixer.add_voice(file.data(), static_cast<unsigned>(file.size()));
+        m_mixer.set_volume(voice, _volume);
+        return voice;
+    }
+    std::vector<int> mix(unsigned _frames) {
+        std::vector<int16_t> out(_frames * static_cast<unsigned>(m_mixer.get_channels()), 12345);
+        m_mixer.mix(out.data(), _frames);
+        return std::vector<int>(out.begin(), out.end());
+    }
+
+    CSoundMixer m_mixer{1000, 1};
+};
+
+} // namespace
+
+TEST(WindowKeys, KeysAreWindowsVirtualKeyCodes) {
+    struct SCase {
+        SDL_Keycode m_key;
+        SDL_Scancode m_place;
+        unsigned m_vk;
+    };
+    SCase const cases[] = {
+        {SDLK_BACKQUOTE, SDL_SCANCODE_GRAVE, 0xC0},
+        {SDLK_a, SDL_SCANCODE_A, 0x41},
+        {SDLK_q, SDL_SCANCODE_Q, 0x51},
+        {SDLK_z, SDL_SCANCODE_Z, 0x5A},
+        {SDLK_0, SDL_SCANCODE_0, 0x30},
+        {SDLK_9, SDL_SCANCODE_9, 0x39},
+        {SDLK_F1, SDL_SCANCODE_F1, 0x70},
+        {SDLK_F5, SDL_SCANCODE_F5, 0x74},
+        {SDLK_F12, SDL_SCANCODE_F12, 0x7B},
+        {SDLK_F13, SDL_SCANCODE_F13, 0x7C},
+        {SDLK_LEFT, SDL_SCANCODE_LEFT, 0x25},
+        {SDLK_UP, SDL_SCANCODE_UP, 0x26},
+        {SDLK_RIGHT, SDL_SCANCODE_RIGHT, 0x27},
+        {SDLK_DOWN, SDL_SCANCODE_DOWN, 0x28},
+        {SDLK_BACKSPACE, SDL_SCANCODE_BACKSPACE, 0x08},
+        {SDLK_TAB, SDL_SCANCODE_TAB, 0x09},
+        {SDLK_RETURN, SDL_SCANCODE_RETURN, 0x0D},
+        {SDLK_KP_ENTER, SDL_SCANCODE_KP_ENTER, 0x0D},
+        {SDLK_LSHIFT, SDL_SCANCODE_LSHIFT, 0x10},
+        {SDLK_RSHIFT, SDL_SCANCODE_RSHIFT, 0x10},
+        {SDLK_LCTRL, SDL_SCANCODE_LCTRL, 0x11},
+        {SDLK_RCTRL, SDL_SCANCODE_RCTRL, 0x11},
+        {SDLK_LALT, SDL_SCANCODE_LALT, 0x12},
+        {SDLK_ESCAPE, SDL_SCANCODE_ESCAPE, 0x1B},
+        {SDLK_SPACE, SDL_SCANCODE_SPACE, 0x20},
+        {SDLK_PAGEUP, SDL_SCANCODE_PAGEUP, 0x21},
+        {SDLK_PAGEDOWN, SDL_SCANCODE_PAGEDOWN, 0x22},
+        {SDLK_END, SDL_SCANCODE_END, 0x23},
+        {SDLK_HOME, SDL_SCANCODE_HOME, 0x24},
+        {SDLK_INSERT, SDL_SCANCODE_INSERT, 0x2D},
+        {SDLK_DELETE, SDL_SCANCODE_DELETE, 0x2E},
+        {SDLK_KP_7, SDL_SCANCODE_KP_7, 0x67},
+        {SDLK_MINUS, SDL_SCANCODE_MINUS, 0xBD},
+        {SDLK_LEFTBRACKET, SDL_SCANCODE_LEFTBRACKET, 0xDB},
+    };
+    for (SCase const &c : cases)
+        EXPECT_EQ(c.m_vk, virtual_key(c.m_key, c.m_place)) << SDL_GetKeyName(c.m_key);
+}
+
+TEST(WindowKeys, PunctuationWithoutACodeIsTakenByItsPlace) {
+    // A layout with '^' left of 1 still has the console key there.
+    EXPECT_EQ(0xC0u, virtual_key(SDLK_CARET, SDL_SCANCODE_GRAVE));
+    EXPECT_EQ(0xBDu, virtual_key(0xDF, SDL_SCANCODE_MINUS)); // 'ß' right of 0
+    // A symbol with a code is taken by its meaning wherever it lies.
+    EXPECT_EQ(0xBDu, virtual_key(SDLK_MINUS, SDL_SCANCODE_SLASH));
+    EXPECT_EQ(0x41u, virtual_key(SDLK_a, SDL_SCANCODE_Q));
+    // Keys without a code.
+    EXPECT_EQ(0u, virtual_key(SDLK_AUDIOPLAY, SDL_SCANCODE_AUDIOPLAY));
+    EXPECT_EQ(0u, virtual_key(SDLK_UNKNOWN, SDL_SCANCODE_UNKNOWN));
+}
+
+TEST(WindowText, Utf8TextBecomesCharacterCodesOfTheSixteenBitRange) {
+    EXPECT_EQ((std::vector<unsigned>{0x61, 0xE9, 0x20AC, 0x44F}),
+              utf8_characters("a\xC3\xA9\xE2\x82\xAC\xD1\x8F"));
+    EXPECT_EQ((std::vector<unsigned>{0x78, 0x79}), utf8_characters("x\xF0\x9F\x98\x80y")); // beyond 0xFFFF
+    // Broken sequences: a stray continuation byte, a cut sequence, a byte no sequence starts with.
+    EXPECT_EQ((std::vector<unsigned>{0x78, 0x79}), utf8_characters("\x80x\xE2\x82y"));
+    EXPECT_EQ((std::vector<unsigned>{0x7A}), utf8_characters("\xFFz\xC3"));
+    EXPECT_TRUE(utf8_characters("").empty());
+    EXPECT_TRUE(utf8_characters(nullptr).empty());
+}
+
+TEST_F(WindowHostTest, EventsReachTheListenersAsTheLibrarysInput) {
+    open();
+    push(motion_event(3, -2)); // window pixels, twice as many on the desktop
+    push(button_event(SDL_MOUSEBUTTONDOWN, SDL_BUTTON_LEFT));
+    push(button_event(SDL_MOUSEBUTTONUP, SDL_BUTTON_LEFT));
+    push(button_event(SDL_MOUSEBUTTONDOWN, SDL_BUTTON_RIGHT));
+    push(button_event(SDL_MOUSEBUTTONDOWN, SDL_BUTTON_MIDDLE));
+    push(wheel_event(1.0f, SDL_MOUSEWHEEL_NORMAL));
+    push(wheel_event(2.0f, SDL_MOUSEWHEEL_FLIPPED));
+    push(key_event(SDL_KEYDOWN, SDLK_BACKQUOTE, SDL_SCANCODE_GRAVE));
+    push(key_event(SDL_KEYUP, SDLK_BACKQUOTE, SDL_SCANCODE_GRAVE));
+    push(key_event(SDL_KEYDOWN, SDLK_BACKSPACE, SDL_SCANCODE_BACKSPACE));
+    push(key_event(SDL_KEYDOWN, SDLK_BACKSPACE, SDL_SCANCODE_BACKSPACE, 1));
+    push(key_event(SDL_KEYDOWN, SDLK_AUDIOPLAY, SDL_SCANCODE_AUDIOPLAY)); // no code: not delivered
+    push(text_event("h\xC3\xA9"));
+    push(motion_event(0, 0));
+    EXPECT_TRUE(m_record.m_lines.empty()); // nothing before the frame's events are polled
+
+    EXPECT_TRUE(mp_window->step());
+    EXPECT_EQ((std::vector<std::string>{"move 6 -4", "down 0", "up 0", "down 1", "down 2", "wheel 1",
+                                        "wheel -2", "key_down 0xC0 0", "key_up 0xC0", "key_down 0x8 0",
+                                        "key_down 0x8 1", "char 0x68", "char 0xE9"}),
+              m_record.m_lines);
+}
+
+TEST_F(WindowHostTest, DeliveringTellsWhatWasInput) {
+    CInputSystem &input = mp_host->input();
+    vec2_t const scale = {2.0f, 0.5f};
+    EXPECT_TRUE(deliver_input(motion_event(-4, 8), input, scale));
+    EXPECT_TRUE(deliver_input(button_event(SDL_MOUSEBUTTONDOWN, SDL_BUTTON_X1), input, scale));
+    EXPECT_FALSE(deliver_input(motion_event(0, 0), input, scale));
+    EXPECT_FALSE(deliver_input(wheel_event(0.0f, SDL_MOUSEWHEEL_NORMAL), input, scale));
+    EXPECT_FALSE(deliver_input(key_event(SDL_KEYDOWN, SDLK_UNKNOWN, SDL_SCANCODE_UNKNOWN), input, scale));
+    EXPECT_FALSE(deliver_input(text_event("\xF0\x9F\x98\x80"), input, scale));
+    SDL_Event other;
+    SDL_zero(other);
+    other.type = SDL_WINDOWEVENT;
+    EXPECT_FALSE(deliver_input(other, input, scale));
+    EXPECT_EQ((std::vector<std::string>{"move -8 4", "down 3"}), m_record.m_lines);
+}
+
+TEST_F(WindowHostTest, RunOfSomeFramesShowsThemAndTheRenderersPicture) {
+    open();
+    // Without the UI library a frame draws nothing, so the picture drawn here is the one shown.
+    CSoftwareRenderer &renderer = mp_host->renderer();
+    renderer.begin_frame(rgba_t(10, 20, 30, 255));
+    rgba_t const red(200, 0, 0, 255);
+    renderer.draw_quad(vec2_t{-1, 1}, vec2_t{0, 0}, red, vec2_t{0, 1}, vec2_t{1, 0}, red, vec2_t{0, -1},
+                       vec2_t{1, 1}, red, vec2_t{-1, -1}, vec2_t{0, 1}, red);
+
+    EXPECT_EQ(3u, mp_window->run(3));
+    EXPECT_EQ(3u, mp_window->get_presented());
+    EXPECT_EQ(red, shown_pixel(10, 10));
+    EXPECT_EQ(red, shown_pixel(255, 383));
+    EXPECT_EQ(rgba_t(10, 20, 30, 255), shown_pixel(256, 0));
+    EXPECT_EQ(rgba_t(10, 20, 30, 255), shown_pixel(511, 383));
+    int w = 0, h = 0;
+    SDL_GetWindowSize(mp_window->window(), &w, &h);
+    EXPECT_EQ(512, w);
+    EXPECT_EQ(384, h);
+
+    EXPECT_EQ(2u, mp_window->run(2));
+    EXPECT_EQ(5u, mp_window->get_presented());
+}
+
+TEST_F(WindowHostTest, ClosedWindowEndsTheRunWithoutAFrame) {
+    open();
+    EXPECT_EQ(1u, mp_window->run(1));
+    SDL_Event quit;
+    SDL_zero(quit);
+    quit.type = SDL_QUIT;
+    push(quit);
+    EXPECT_EQ(0u, mp_window->run(0)); // 0: until the window is closed
+    EXPECT_TRUE(mp_window->is_closed());
+    EXPECT_FALSE(mp_window->step());
+    EXPECT_EQ(1u, mp_window->get_presented());
+}
+
+TEST_F(WindowHostTest, WindowThatIsNotOpenShowsNothing) {
+    EXPECT_FALSE(mp_window->step());
+    EXPECT_EQ(0u, mp_window->run(3));
+    EXPECT_EQ(nullptr, mp_host->sound().get_output());
+}
+
+TEST_F(WindowHostTest, SoundGoesToTheAudioDeviceWhileTheWindowIsOpen) {
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.path().c_str());
+    m_dir.write("click.wav", wave16({1000, 2000}));
+    open();
+    ASSERT_TRUE(mp_window->has_audio());
+    std::shared_ptr<CSoundMixer> const p_mixer =
+        std::static_pointer_cast<CSoundMixer>(mp_host->sound().get_output());
+    ASSERT_NE(nullptr, p_mixer);
+    CSoundMixer &mixer = *p_mixer;
+    EXPECT_EQ(2, mixer.get_channels());
+
+    std::unique_ptr<ISoundSource> p_source(mp_host->sound().create_sound("click.wav", 2, 0));
+    ASSERT_NE(nullptr, p_source);
+    EXPECT_EQ(1u, mixer.get_voices_count());
+    EXPECT_TRUE(m_reports.reports().empty());
+
+    // The source outlives the device and keeps its voice on the mixer.
+    mp_window.reset();
+    EXPECT_EQ(nullptr, mp_host->sound().get_output());
+    EXPECT_EQ(1u, mixer.get_voices_count());
+    p_source->set_state(1, 0.0f);
+    EXPECT_EQ(1u, mixer.get_playing_count());
+    p_source.reset();
+    EXPECT_EQ(0u, mixer.get_voices_count());
+}
+
+TEST_F(SoundMixerTest, OverlappingVoicesAddUpAtTheirVolumes) {
+    unsigned const half = add({1000, -2000, 3001, 4000, -5000, 6000}, 0.5f);
+    unsigned const full = add({100, 200, 300});
+    m_mixer.start(half, 0.0f);
+    EXPECT_EQ((std::vector<int>{500, -1000}), mix(2));
+    m_mixer.start(full, 0.0f);
+    // 1600.5 rounds away from zero; the shorter voice ends first, the other after it.
+    EXPECT_EQ((std::vector<int>{1601, 2200, -2200, 3000, 0}), mix(5));
+    EXPECT_EQ(0u, m_mixer.get_playing_count());
+    EXPECT_EQ((std::vector<int>{0, 0}), mix(2));
+}
+
+TEST_F(SoundMixerTest, SumsBeyondSixteenBitsAreClipped) {
+    unsigned const a = add({30000, -30000, 20000});
+    unsigned const b = add({30000, -30000, -20000});
+    m_mixer.start(a, 0.0f);
+    m_mixer.start(b, 0.0f);
+    EXPECT_EQ((std::vector<int>{32767, -32768, 0}), mix(3));
+}
+
+TEST_F(SoundMixerTest, LoopingVoiceStartsOverUntilItNoLongerLoops) {
+    unsigned const voice = add({1, 2, 3});
+    m_mixer.set_looping(voice, true);
+    m_mixer.start(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{1, 2, 3, 1, 2, 3, 1}), mix(7));
+    m_mixer.set_looping(voice, false);
+    EXPECT_EQ((std::vector<int>{2, 3, 0, 0}), mix(4));
+    EXPECT_EQ(0u, m_mixer.get_playing_count());
+}
+
+TEST_F(SoundMixerTest, FadesAreLinearOverTheirTime) {
+    unsigned const voice = add(std::vector<int>(16, 1000));
+    m_mixer.start(voice, 4.0f); // 4 ms: four frames
+    EXPECT_EQ((std::vector<int>{0, 250, 500, 750, 1000, 1000}), mix(6));
+    m_mixer.stop(voice, 4.0f);
+    EXPECT_EQ(1u, m_mixer.get_playing_count());
+    EXPECT_EQ((std::vector<int>{1000, 750, 500, 250, 0, 0}), mix(6));
+    EXPECT_EQ(0u, m_mixer.get_playing_count());
+
+    // Started again while fading out, it rises from where it is and plays on from there.
+    m_mixer.start(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{1000, 1000}), mix(2));
+    m_mixer.stop(voice, 4.0f);
+    EXPECT_EQ((std::vector<int>{1000, 750}), mix(2));
+    m_mixer.start(voice, 2.0f);
+    EXPECT_EQ((std::vector<int>{500, 1000, 1000}), mix(3));
+}
+
+TEST_F(SoundMixerTest, StopSilencesAtOnceAndResetGoesBackToTheStart) {
+    unsigned const voice = add({1, 2, 3, 4, 5});
+    m_mixer.start(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{1, 2}), mix(2));
+    m_mixer.start(voice, 0.0f); // still playing: on from where it is
+    EXPECT_EQ((std::vector<int>{3}), mix(1));
+    m_mixer.stop(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{0, 0}), mix(2));
+    m_mixer.start(voice, 0.0f); // stopped: from the start
+    EXPECT_EQ((std::vector<int>{1, 2}), mix(2));
+    m_mixer.reset(voice);
+    EXPECT_EQ((std::vector<int>{0}), mix(1));
+    m_mixer.start(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{1}), mix(1));
+}
+
+TEST_F(SoundMixerTest, BadWavesAndUnknownVoicesChangeNothing) {
+    bytes_t const text = {'n', 'o', 't', ' ', 'a', ' ', 'w', 'a', 'v', 'e'};
+    EXPECT_EQ(0u, m_mixer.add_voice(text.data(), static_cast<unsigned>(text.size())));
+    EXPECT_EQ(0u, m_mixer.add_voice(nullptr, 100));
+    bytes_t const no_channels = wave({format_chunk(1, 16, 0, 1000), chunk("data", {1, 2, 3, 4})});
+    EXPECT_EQ(0u, m_mixer.add_voice(no_channels.data(), static_cast<unsigned>(no_channels.size())));
+    EXPECT_EQ(0u, m_mixer.get_voices_count());
+
+    unsigned const voice = add({7});
+    for (unsigned unknown : {0u, voice + 1}) {
+        m_mixer.start(unknown, 0.0f);
+        m_mixer.set_volume(unknown, 2.0f);
+        m_mixer.set_looping(unknown, true);
+        m_mixer.stop(unknown, 0.0f);
+        m_mixer.reset(unknown);
+        m_mixer.remove_voice(unknown);
+    }
+    EXPECT_EQ(1u, m_mixer.get_voices_count());
+    EXPECT_EQ(0u, m_mixer.get_playing_count());
+    m_mixer.set_volume(voice, -1.0f); // no negative volume: silent
+    m_mixer.start(voice, 0.0f);
+    EXPECT_EQ((std::vector<int>{0}), mix(1));
+}
+
+TEST(SoundMixerFormat, WavesAreConvertedToTheMixersChannelsRateAndBits) {
+    CSoundMixer mixer(1000, 2);
+    // 8-bit samples are unsigned around 128; one channel goes to both.
+    bytes_t const eight = wave({format_chunk(1, 8, 1, 1000), chunk("data", {128, 255, 0, 128})});
+    unsigned const voice = mixer.add_voice(eight.data(), static_cast<unsigned>(eight.size()));
+    ASSERT_NE(0u, voice);
+    std::vector<int16_t> const samples = mixer.get_samples(voice);
+    ASSERT_EQ(8u, samples.size());
+    EXPECT_EQ(0, samples[0]);
+    EXPECT_EQ(0, samples[1]);
+    EXPECT_GT(samples[2], 32000);
+    EXPECT_EQ(samples[2], samples[3]);
+    EXPECT_LT(samples[4], -32000);
+    EXPECT_EQ(samples[4], samples[5]);
+    EXPECT_EQ(0, samples[6]);
+
+    // 16-bit stereo at the mixer's rate stays as it is; at half the rate it lasts as long.
+    bytes_t const same = wave16({1, -1, 2, -2}, 2, 1000);
+    unsigned const kept = mixer.add_voice(same.data(), static_cast<unsigned>(same.size()));
+    EXPECT_EQ((std::vector<int16_t>{1, -1, 2, -2}), mixer.get_samples(kept));
+    bytes_t const slow = wave16(std::vector<int>(200, 0), 2, 500);
+    unsigned const doubled = mixer.add_voice(slow.data(), static_cast<unsigned>(slow.size()));
+    EXPECT_NEAR(400.0, static_cast<double>(mixer.get_samples(doubled).size()), 8.0);
+}
+
+// A fixture of its own: the interface data in a folder of the test.
+class SoundOutputTest : public testing::Test {
+protected:
+    SoundOutputTest() { qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.path().c_str()); }
+    ~SoundOutputTest() override { qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, ""); }
+
+    CTempDir m_dir;
+    CReportCapture m_reports;
+    std::shared_ptr<CSoundMixer> mp_mixer = std::make_shared<CSoundMixer>(22050, 1);
+    CSoundSystem m_sound;
+};
+
+TEST_F(SoundOutputTest, SourcesPlayThroughTheOutputWithTheirStateVolumeAndLooping) {
+    m_dir.write("loop.wav", wave16({400, -800, 1200}));
+    m_sound.set_output(mp_mixer);
+    std::unique_ptr<ISoundSource> p_source(m_sound.create_sound("loop.wav", 3, 0));
+    ASSERT_NE(nullptr, p_source);
+    EXPECT_TRUE(m_reports.reports().empty());
+    EXPECT_EQ(1u, mp_mixer->get_voices_count());
+
+    std::vector<int16_t> out(4);
+    mp_mixer->mix(out.data(), 4);
+    EXPECT_EQ((std::vector<int16_t>{0, 0, 0, 0}), out); // not started
+    p_source->set_volume(0.5f);
+    p_source->set_looping(true);
+    p_source->set_state(1, 0.0f);
+    mp_mixer->mix(out.data(), 4);
+    EXPECT_EQ((std::vector<int16_t>{200, -400, 600, 200}), out);
+    p_source->set_state(3, 0.0f);
+    mp_mixer->mix(out.data(), 2);
+    EXPECT_EQ(0, out[0]);
+    EXPECT_EQ(0u, mp_mixer->get_playing_count());
+    EXPECT_EQ(1u, m_sound.get_started());
+
+    // The source keeps its output; sources made without one are silent.
+    m_sound.set_output(nullptr);
+    p_source->set_state(1, 0.0f);
+    EXPECT_EQ(1u, mp_mixer->get_playing_count());
+    std::unique_ptr<ISoundSource> p_silent(m_sound.create_sound("loop.wav", 3, 0));
+    ASSERT_NE(nullptr, p_silent);
+    EXPECT_EQ(0u, static_cast<CSoundSource &>(*p_silent).get_voice());
+    EXPECT_EQ(1u, mp_mixer->get_voices_count());
+    p_source.reset();
+    EXPECT_EQ(0u, mp_mixer->get_voices_count());
+}
+
+TEST_F(SoundOutputTest, WaveTheOutputCannotPlayMakesASilentSource) {
+    m_dir.write("none.wav", wave({format_chunk(1, 16, 0, 22050), chunk("data", {1, 2, 3, 4})}));
+    m_sound.set_output(mp_mixer);
+    std::unique_ptr<ISoundSource> p_source(m_sound.create_sound("none.wav", 2, 0));
+    ASSERT_NE(nullptr, p_source);
+    EXPECT_EQ(0u, static_cast<CSoundSource &>(*p_source).get_voice());
+    EXPECT_EQ((std::vector<std::string>{"Cannot play sound 'none.wav'"}), m_reports.warnings());
+    p_source->set_state(1, 0.0f);
+    p_source->set_volume(0.5f);
+    EXPECT_EQ(0u, mp_mixer->get_voices_count());
+    // A file that isn't a sound makes no source, with or without an output.
+    m_dir.write("text.wav", {'t', 'e', 'x', 't'});
+    EXPECT_EQ(nullptr, m_sound.create_sound("text.wav", 2, 0));
+    EXPECT_EQ(1u, m_sound.get_live_sources());
+}
+
+#endif // QORHOST_WITH_SDL2
