@@ -9,6 +9,7 @@
 #pragma once
 #include "qor_memory.h"
 #include "ui_interfaces.h"
+#include "ui_string.h"
 
 #include "qor_input.h"
 
@@ -72,18 +73,21 @@ private:
     void draw_plaque();
     void read_screen_size();
     void load_game_library();
+    void load_local_strings();
     void init_desktop();
     void register_commands();
     void register_event_names();
     void unregister_commands();
+    void draw_build_version();
 
-    CDesktop *mp_desktop;                   // owned
-    CConsole *mp_console;                   // a child of the desktop, owned by the window tree
-    void *mp_reserved;                      // only the constructor writes it
-    qor_vector<CStatsPage *> m_stats_pages; // in order of creation; owned
-    int m_scr_w;                            // "scr_resx" at init
-    int m_scr_h;                            // "scr_resy" at init
-    bool m_hide_console;                    // the argument of init
+    CDesktop *mp_desktop;                     // owned
+    CConsole *mp_console;                     // a child of the desktop, owned by the window tree
+    void *mp_reserved;                        // only the constructor writes it
+    qor_vector<CStatsPage *> m_stats_pages;   // in order of creation; owned
+    qor_map<string, CString> m_local_strings; // local strings by key
+    int m_scr_w;                              // "scr_resx" at init
+    int m_scr_h;                              // "scr_resy" at init
+    bool m_hide_console;                      // the argument of init
 };
 
 } // namespace qorui

@@ -8,6 +8,8 @@
 
 namespace qorui {
 
+class CCanvas;
+class CFont;
 class CUserInterface;
 
 class CStatsPage : public IStatsPage {
@@ -36,6 +38,8 @@ private:
     // Puts the caret at the line's start and hands out the line; null (and a contract report) if
     // the line is missing.
     CString *line_for_print(unsigned int _line);
+    // The sheet at (20, 20) of the canvas, no extra space between lines.
+    void draw(CCanvas *_p_canvas, CFont *_p_font);
 
     string m_name;
     CText m_text;                      // the sheet; not editable, no owner

@@ -161,6 +161,7 @@ void CUserInterface::init(bool _hide_console) {
         p_input->add_pointer_listener(this);
         p_input->add_key_listener(this);
     }
+    load_local_strings();
     init_desktop();
     register_commands();
     register_event_names();
@@ -283,6 +284,7 @@ void CUserInterface::update(int _time) {
 void CUserInterface::draw() {
     if (!mp_desktop) return;
     mp_desktop->draw();
+    draw_build_version();
 }
 
 // The desktop goes, and every window with it; then the listeners and the commands.
@@ -304,14 +306,6 @@ IConsole *CUserInterface::get_console() {
 void CUserInterface::on_app_activate(bool _active) {
     if (mp_desktop && !_active)
         mp_desktop->send_event(mp_desktop, EVENT_LOST_FOCUS, CWndEvent::DISPATCH_NONE);
-}
-
-unsigned short const *CUserInterface::get_local_string(char const *) {
-    return nullptr;
-}
-
-char const *CUserInterface::get_local_key(unsigned short const *) {
-    return nullptr;
 }
 
 // One screen pixel in desktop pixels.

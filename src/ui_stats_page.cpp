@@ -3,8 +3,10 @@
 //   construction     75 empty lines, not editable
 //   printing         the colour tag, then the text, into one line
 //   wide formatting  the printf subset of 16-bit formats
+//   drawing          the sheet on a canvas, for the service
 #include "ui_stats_page.h"
 
+#include "ui_canvas.h"
 #include "ui_debug.h"
 #include "ui_logger.h"
 
@@ -83,6 +85,11 @@ void CStatsPage::print(unsigned int _string_num, unsigned short const *_format, 
     va_end(args);
 
     if (CString *p_str = line_for_print(_string_num)) *p_str = CString(buffer, -1);
+}
+
+void CStatsPage::draw(CCanvas *_p_canvas, CFont *_p_font) {
+    if (!QOR_CHECK(_p_canvas)) return;
+    _p_canvas->text_out(20, 20, 0, m_text, _p_font);
 }
 
 void CStatsPage::clear() {

@@ -11,19 +11,20 @@
 using namespace qorui;
 
 TEST(EventNames, AreRegisteredOnceAndFoundBothWays) {
-    EXPECT_TRUE(CWndEvent::register_event_name("TEST_EVENT_B", EVENT_CHECKED));
+    // EVENT_RESIZED has no name of the service's, whichever tests ran before.
+    EXPECT_TRUE(CWndEvent::register_event_name("TEST_EVENT_B", EVENT_RESIZED));
     EXPECT_FALSE(CWndEvent::register_event_name("TEST_EVENT_B", EVENT_CLICK)); // the old value stays
-    EXPECT_TRUE(CWndEvent::register_event_name("TEST_EVENT_A", EVENT_CHECKED));
+    EXPECT_TRUE(CWndEvent::register_event_name("TEST_EVENT_A", EVENT_RESIZED));
 
     EEventType id = EVENT_DRAW;
     EXPECT_TRUE(CWndEvent::get_id_by_name("TEST_EVENT_B", id));
-    EXPECT_EQ(EVENT_CHECKED, id);
+    EXPECT_EQ(EVENT_RESIZED, id);
     id = EVENT_DRAW;
     EXPECT_FALSE(CWndEvent::get_id_by_name("test_event_b", id)); // case counts
     EXPECT_EQ(EVENT_DRAW, id);
 
     string name = "untouched";
-    EXPECT_TRUE(CWndEvent::get_name_by_id(EVENT_CHECKED, name));
+    EXPECT_TRUE(CWndEvent::get_name_by_id(EVENT_RESIZED, name));
     EXPECT_EQ("TEST_EVENT_A", name); // the first in sort order
     EXPECT_FALSE(CWndEvent::get_name_by_id(EVENT_PAGE_DOWN, name));
     EXPECT_EQ("TEST_EVENT_A", name);

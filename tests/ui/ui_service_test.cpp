@@ -12,6 +12,7 @@
 #include "engine_interfaces.h"
 #include "ui_material.h"
 #include "test_support.h"
+#include "test_host.h"
 #include "ui_time_profiler.h"
 
 #include <gtest/gtest.h>
@@ -23,25 +24,13 @@ using namespace qorui;
 
 namespace {
 
-// One host for the whole test program: the library's statics hold on to its server until the
-// process ends, so the host must outlive them.
-qorhost::CHost &shared_host() {
-    static qorhost::CHost *sp_host = [] {
-        qorhost::SHostOptions options;
-        options.m_data = qortest::source_dir() + "/data";
-        options.m_out = qortest::make_temp_dir();
-        options.m_quiet = true;
-        options.m_record = true;
-        qorhost::CHost *p_host = new qorhost::CHost(options);
-        if (!p_host->load_ui()) ADD_FAILURE() << "libqorui.so did not load";
-        return p_host;
-    }();
-    return *sp_host;
-}
+// One host for the whole test program, shared with the other suites that drive the service.
+using qortest::shared_host;
 
 class ServiceTest : public ::testing::Test {
 protected:
     void SetUp() override {
+        qortest::use_host_data_folders();
         m_dir = qortest::make_temp_dir();
         use_gdf(
             "[ui]\ninit_plaque = ui_init_plaque.tga\n[ui_libraries]\ngameui_library = libgameui_demo.so\n");
