@@ -206,6 +206,8 @@ void CUserInterface::draw_build_version() {
     p_render->begin_draw();
     float const size = p_font->get_size();
     p_font->set_size(k_build_font_size);
+    // The last window drawn left its own clip behind (the pointer's); the page spans the desktop.
+    mp_desktop->get_canvas().set_clip_area_all();
     sp_page->draw(&mp_desktop->get_canvas(), p_font);
     p_font->set_size(size);
     p_render->end_draw();

@@ -1,7 +1,8 @@
 // The demo game's interface library: the engine loads it beside the UI library, named by
 // "gameui_library" in the configuration. It announces itself in the log and adds two commands:
 // "gameui_demo" echoes its arguments to the log, "gameui_demo_scene" builds the demo's windows on
-// the desktop (the host runs it at start from its configuration).
+// the desktop (the host runs it at start from its configuration), "gameui_show_stats NAME" shows
+// one stats page.
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
@@ -114,6 +115,23 @@ void make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, in
     make_button(_p_desktop, p_dialog, "cancel", "Cancel", 234, 150);
 }
 
+IUserInterface *user_interface() {
+    return static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
+}
+
+// "gameui_show_stats NAME": shows the stats page of that name, hiding the others.
+void cmd_gameui_show_stats(char const *_arguments, void *) {
+    IUserInterface *p_ui = user_interface();
+    if (!p_ui || !_arguments) return;
+    std::string name(_arguments);
+    name.erase(0, name.find_first_not_of(' '));
+    name.erase(name.find_last_not_of(' ') + 1);
+    for (unsigned i = 0; i < p_ui->get_stats_pages_count(); ++i) {
+        IStatsPage *p_page = p_ui->get_stats_page(i);
+        p_page->show(name == p_page->get_name());
+    }
+}
+
 void cmd_gameui_demo_scene(char const *, void *) {
     IUserInterface *p_ui =
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
@@ -141,6 +159,7 @@ extern "C" __attribute__((visibility("default"))) int RegisterInterface(IInterfa
             static_cast<ICmdManagerBase *>(_p_server->query_interface(qor_uid::CMD_MANAGER, 1))) {
         p_commands->register_command("gameui_demo", cmd_gameui_demo, nullptr);
         p_commands->register_command("gameui_demo_scene", cmd_gameui_demo_scene, nullptr);
+        p_commands->register_command("gameui_show_stats", cmd_gameui_show_stats, nullptr);
     }
     return 1;
 }

@@ -168,3 +168,22 @@ TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
     EXPECT_EQ(qortest::read_file(data + "/ui/second.lua"), qortest::read_file(data + "/ui/third.lua"));
 }
+
+// The build-version page, shown, is drawn over the scene and dumped by "print_stats_page" to the
+// first numbered file of the output folder.
+TEST(HostEndToEnd, TheBuildVersionPageIsShownAndDumped) {
+    std::string const script = qortest::make_temp_dir() + "/stats.script";
+    qortest::write_file(script, "wait 1\ncommand gameui_show_stats build_version\ncommand print_stats_page\n"
+                                "wait 12\nscreenshot version.png\n");
+    SRun const run = run_host({"--script", script});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    std::string const dump = qortest::read_file(run.m_out + "/stats_build_version_demo_0000.txt");
+    EXPECT_NE(std::string::npos, dump.find("qorui 1.0 (demo build)\n203\n")) << dump;
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Out file: 'stats_build_version_demo_0000.txt'"));
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/version.png", frame));
+    ASSERT_TRUE(
+        qorhost::load_image(qortest::source_dir() + "/tests/golden/build_version_page_1024x768.png", golden));
+    std::string const diff = run.m_out + "/version_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+}
