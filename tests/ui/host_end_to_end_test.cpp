@@ -14,13 +14,29 @@ struct SRun {
     std::string m_out;
 };
 
-SRun run_host(std::vector<std::string> _arguments) {
+// qorhost on a data folder, its output to a new folder.
+SRun run_on(std::string const &_data, std::vector<std::string> _arguments) {
     SRun run;
     run.m_out = qortest::make_temp_dir();
-    std::vector<std::string> arguments = {"--data", qortest::source_dir() + "/data", "--out", run.m_out};
+    std::vector<std::string> arguments = {"--data", _data, "--out", run.m_out};
     arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
     run.m_result = qortest::run_child("qorhost", {}, arguments);
     return run;
+}
+
+SRun run_host(std::vector<std::string> _arguments) {
+    return run_on(qortest::source_dir() + "/data", _arguments);
+}
+
+// A picture that the run wrote, against tests/golden/<golden>.png; a difference image lies beside
+// it when they differ.
+void expect_golden(std::string const &_dir, std::string const &_picture, std::string const &_golden) {
+    qorhost::SImage frame, golden;
+    ASSERT_TRUE(qorhost::load_image(_dir + "/" + _picture, frame)) << _picture;
+    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/" + _golden + ".png", golden))
+        << _golden;
+    std::string const diff = _dir + "/" + _golden + "_diff.png";
+    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
 }
 
 } // namespace
@@ -29,14 +45,11 @@ TEST(HostEndToEnd, FirstFrameIsThePlaque) {
     SRun const run = run_host({"--frames", "2"});
     ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
 
-    qorhost::SImage frame, golden;
-    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
-    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/plaque_1024x768.png", golden));
-    std::string const diff = run.m_out + "/plaque_diff.png";
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+    expect_golden(run.m_out, "frame_0000.png", "plaque_1024x768");
 
     // The plaque is the picture itself, texel for texel.
-    qorhost::SImage picture;
+    qorhost::SImage frame, picture;
+    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
     ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/data/textures/ui_init_plaque.tga", picture));
     EXPECT_EQ(0, qorhost::compare_images(frame, picture, 0));
 
@@ -88,11 +101,7 @@ TEST(HostEndToEnd, TheDemoSceneIsDrawnByTheDesktop) {
     SRun const run = run_host({});
     ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
     EXPECT_NE(std::string::npos, run.m_result.m_output.find("Demo scene built"));
-    qorhost::SImage frame, golden;
-    ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0012.png", frame));
-    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_scene_1024x768.png", golden));
-    std::string const diff = run.m_out + "/demo_scene_diff.png";
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+    expect_golden(run.m_out, "frame_0012.png", "demo_scene_1024x768");
 }
 
 // An input script drags the first dialog by its background: it moves by the second movement behind
@@ -105,12 +114,7 @@ TEST(HostEndToEnd, AnInputScriptDragsADialog) {
     SRun const run = run_host({"--script", script});
     ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
     EXPECT_NE(std::string::npos, run.m_result.m_output.find("gameui_demo scripted"));
-    qorhost::SImage frame, golden;
-    ASSERT_TRUE(qorhost::load_image(run.m_out + "/dragged.png", frame));
-    ASSERT_TRUE(
-        qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_scene_dragged_1024x768.png", golden));
-    std::string const diff = run.m_out + "/dragged_diff.png";
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+    expect_golden(run.m_out, "dragged.png", "demo_scene_dragged_1024x768");
 
     // A bad script stops the host before anything starts, naming the line.
     qortest::write_file(script, "move 1 1\njump 3\n");
@@ -135,15 +139,6 @@ std::string data_copy(bool _startup) {
     return dir + "/data";
 }
 
-SRun run_on(std::string const &_data, std::vector<std::string> _arguments) {
-    SRun run;
-    run.m_out = qortest::make_temp_dir();
-    std::vector<std::string> arguments = {"--data", _data, "--out", run.m_out};
-    arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
-    run.m_result = qortest::run_child("qorhost", {}, arguments);
-    return run;
-}
-
 } // namespace
 
 // The demo's layout imported into an empty desktop makes the scene of the demo library, with the
@@ -152,17 +147,11 @@ TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     std::string const data = data_copy(false);
     SRun const imported = run_on(data, {"+ui_import", "demo_layout.lua", "+ui_export", "second.lua"});
     ASSERT_EQ(0, imported.m_result.m_exit_code) << imported.m_result.m_output;
-    qorhost::SImage frame, golden;
-    ASSERT_TRUE(qorhost::load_image(imported.m_out + "/frame_0012.png", frame));
-    ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/tests/golden/demo_layout_imported_1024x768.png",
-                                    golden));
-    std::string const diff = imported.m_out + "/imported_diff.png";
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+    expect_golden(imported.m_out, "frame_0012.png", "demo_layout_imported_1024x768");
 
     // Over the scene that the code builds, the same layout changes no window's place: same picture.
     SRun const over = run_on(data_copy(true), {"+ui_import", "demo_layout.lua"});
-    ASSERT_TRUE(qorhost::load_image(over.m_out + "/frame_0012.png", frame));
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2));
+    expect_golden(over.m_out, "frame_0012.png", "demo_layout_imported_1024x768");
 
     SRun const again = run_on(data, {"+ui_import", "second.lua", "+ui_export", "third.lua"});
     ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
@@ -180,10 +169,5 @@ TEST(HostEndToEnd, TheBuildVersionPageIsShownAndDumped) {
     std::string const dump = qortest::read_file(run.m_out + "/stats_build_version_demo_0000.txt");
     EXPECT_NE(std::string::npos, dump.find("qorui 1.0 (demo build)\n203\n")) << dump;
     EXPECT_NE(std::string::npos, run.m_result.m_output.find("Out file: 'stats_build_version_demo_0000.txt'"));
-    qorhost::SImage frame, golden;
-    ASSERT_TRUE(qorhost::load_image(run.m_out + "/version.png", frame));
-    ASSERT_TRUE(
-        qorhost::load_image(qortest::source_dir() + "/tests/golden/build_version_page_1024x768.png", golden));
-    std::string const diff = run.m_out + "/version_diff.png";
-    EXPECT_EQ(0, qorhost::compare_images(frame, golden, 2, diff)) << "see " << diff;
+    expect_golden(run.m_out, "version.png", "build_version_page_1024x768");
 }
