@@ -1,4 +1,5 @@
 #include "ui_material.h"
+#include "LuaTableIterator.h"
 #include "engine_interfaces.h"
 #include "qordebug.h"
 #include "qorscriptsystem.h"
@@ -11,21 +12,6 @@ namespace {
 
 char const *const k_presets = "ui_material_presets";
 
-void read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsString()) _value = value.GetString();
-}
-
-void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsBoolean()) _value = value.GetBoolean();
-}
-
-void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsNumber()) _value = value.GetFloat();
-}
-
 // Numbers 1 and 2 of a table under _key.
 template <class T>
 void read_pair(LuaPlus::LuaObject const &_lo_table, char const *_key, T &_first, T &_second) {
@@ -33,14 +19,6 @@ void read_pair(LuaPlus::LuaObject const &_lo_table, char const *_key, T &_first,
     if (!pair.IsTable()) return;
     _first = static_cast<T>(pair.GetByIndex(1).GetNumber());
     _second = static_cast<T>(pair.GetByIndex(2).GetNumber());
-}
-
-void write_pair(LuaPlus::LuaObject &_lo_table, char const *_key, double _first, double _second) {
-    LuaPlus::LuaObject pair;
-    pair.AssignNewTable(_lo_table.GetState());
-    pair.SetNumber(1, _first);
-    pair.SetNumber(2, _second);
-    _lo_table.SetObject(_key, pair);
 }
 
 void write_name(LuaPlus::LuaObject &_lo_table, char const *_key, string const &_name) {

@@ -1,4 +1,5 @@
 #include "ui_window.h"
+#include "LuaTableIterator.h"
 #include "engine_interfaces.h"
 #include "qorbase.h"
 #include "qordebug.h"
@@ -400,14 +401,6 @@ bool CWindow::is_point_inside(point_t const &_global) const {
 
 namespace {
 
-LuaPlus::LuaObject pair_table(LuaPlus::LuaState *_p_state, int _first, int _second) {
-    LuaPlus::LuaObject pair;
-    pair.AssignNewTable(_p_state);
-    pair.SetNumber(1, _first);
-    pair.SetNumber(2, _second);
-    return pair;
-}
-
 // Numbers 1 and 2 of a table, truncated toward zero; false if the value isn't a table.
 bool read_pair(LuaPlus::LuaObject const &_lo_value, int &_first, int &_second) {
     if (!_lo_value.IsTable()) return false;
@@ -416,11 +409,6 @@ bool read_pair(LuaPlus::LuaObject const &_lo_value, int &_first, int &_second) {
     if (first.IsNumber()) _first = static_cast<int>(first.GetNumber());
     if (second.IsNumber()) _second = static_cast<int>(second.GetNumber());
     return true;
-}
-
-void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsBoolean()) _value = value.GetBoolean();
 }
 
 char const *string_or_empty(LuaPlus::LuaObject const &_lo_value) {
@@ -434,8 +422,8 @@ void CWindow::save_state(LuaPlus::LuaObject &_lo_table) {
     _lo_table.SetString("name", get_name());
     _lo_table.SetString("class_name", get_class_id().GetName());
     point_t const pos = get_pos();
-    _lo_table.SetObject("pos", pair_table(p_state, pos.x, pos.y));
-    _lo_table.SetObject("size", pair_table(p_state, m_region.get_w(), m_region.get_h()));
+    write_pair(_lo_table, "pos", pos.x, pos.y);
+    write_pair(_lo_table, "size", m_region.get_w(), m_region.get_h());
     _lo_table.SetBoolean("can_resize", m_can_resize);
     _lo_table.SetBoolean("can_drag", m_can_drag);
     _lo_table.SetString("alignment", g_alignment_names[m_alignment]);
@@ -477,9 +465,9 @@ void CWindow::load_state(LuaPlus::LuaObject &_lo_table) {
 // particular order), so that a layout loaded and saved again keeps its children's order.
 void CWindow::load_children(LuaPlus::LuaObject &_lo_table) {
     std::vector<std::pair<double, LuaPlus::LuaObject>> entries;
-    LuaPlus::LuaObject key(_lo_table.GetState()), value(_lo_table.GetState());
-    while (LuaPlus::LuaPlusH_next(_lo_table.GetState(), _lo_table, key, value))
+    for_each_entry(_lo_table, [&entries](LuaPlus::LuaObject const &key, LuaPlus::LuaObject const &value) {
         if (!key.IsString()) entries.emplace_back(key.IsNumber() ? key.GetNumber() : 0.0, value);
+    });
     std::stable_sort(entries.begin(), entries.end(),
                      [](auto const &_a, auto const &_b) { return _a.first < _b.first; });
     for (auto &entry : entries) {

@@ -1,4 +1,5 @@
 #include "ui_window_visual.h"
+#include "LuaTableIterator.h"
 #include "engine_interfaces.h"
 #include "qor_platform.h"
 #include "qor_sound.h"
@@ -32,11 +33,6 @@ CWindowVisual *as_visual(CWindow *_p_wnd) {
     return class_cast<CWindowVisual>(_p_wnd);
 }
 
-void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsNumber()) _value = static_cast<int>(value.GetNumber());
-}
-
 template <class TResource>
 void release_resource(CWindowVisual::SResource<TResource> &_entry) {
     if (_entry.m_owned) delete _entry.mp_resource;
@@ -46,9 +42,9 @@ void release_resource(CWindowVisual::SResource<TResource> &_entry) {
 // Every entry of a table whose key is a string, in the table's order.
 template <class TVisit>
 void for_each_named(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
-    LuaPlus::LuaObject key(_lo_table.GetState()), value(_lo_table.GetState());
-    while (LuaPlus::LuaPlusH_next(_lo_table.GetState(), _lo_table, key, value))
+    for_each_entry(_lo_table, [&_visit](LuaPlus::LuaObject const &key, LuaPlus::LuaObject const &value) {
         if (key.IsString()) _visit(key.GetString(), value);
+    });
 }
 
 } // namespace
@@ -365,9 +361,9 @@ void CWindowVisual::remove_sound_file(string const &_file) {
 void CWindowVisual::load_sounds(LuaPlus::LuaObject &_lo_table) {
     LuaPlus::LuaObject const sounds = _lo_table.GetByName("events_sounds");
     if (!sounds.IsTable()) return;
-    LuaPlus::LuaObject key(sounds.GetState()), value(sounds.GetState());
-    while (LuaPlus::LuaPlusH_next(sounds.GetState(), sounds, key, value))
+    for_each_entry(sounds, [this](LuaPlus::LuaObject const &key, LuaPlus::LuaObject const &value) {
         if (value.IsTable()) load_sound(key, value);
+    });
 }
 
 void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaObject const &_lo_entry) {
@@ -395,9 +391,8 @@ void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaOb
         return;
     }
     ISoundSystem *p_sound_system = engine_interfaces().get_sound_system(false);
-    LuaPlus::LuaObject key(files.GetState()), file(files.GetState());
-    while (LuaPlus::LuaPlusH_next(files.GetState(), files, key, file)) {
-        if (!file.IsString()) continue;
+    for_each_entry(files, [&](LuaPlus::LuaObject const &, LuaPlus::LuaObject const &file) {
+        if (!file.IsString()) return;
         remove_sound_file(file.GetString());
         ISoundSource *p_source =
             p_sound_system ? p_sound_system->create_sound(file.GetString(),
@@ -405,13 +400,13 @@ void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaOb
                            : nullptr;
         if (!p_source) {
             ui_logger().log_message("Cannot create sound source from file '%s'", file.GetString());
-            continue;
+            return;
         }
         p_source->set_volume(volume.GetFloat() + 1.0f);
         p_source->set_option(1);
         p_source->set_looping(looping);
         sound.m_sources.emplace_back(file.GetString(), p_source);
-    }
+    });
     if (sound.m_sources.empty()) return;
     auto const old = m_sounds.find(id);
     if (old != m_sounds.end())
@@ -595,24 +590,23 @@ void CWindowVisual::save_string(LuaPlus::LuaObject &_lo_table, char const *_key,
 void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, CText &_text) {
     LuaPlus::LuaObject const lines = _lo_table.GetByName(_key);
     if (!lines.IsTable()) return;
-    LuaPlus::LuaObject key(lines.GetState()), entry(lines.GetState());
-    while (LuaPlus::LuaPlusH_next(lines.GetState(), lines, key, entry)) {
-        if (!entry.IsTable() || !entry.GetByName("string").IsString()) continue;
+    for_each_entry(lines, [&](LuaPlus::LuaObject const &, LuaPlus::LuaObject const &entry) {
+        if (!entry.IsTable() || !entry.GetByName("string").IsString()) return;
         int const before = static_cast<int>(_text.get_num_strings());
         _text.insert_str(local_or_own(entry.GetByName("string").GetString()).c_str(), false);
         LuaPlus::LuaObject const font = entry.GetByName("font");
-        if (!font.IsString()) continue;
+        if (!font.IsString()) return;
         static HUID const string_font("STRING_FONT");
         CFont *p_font = get_font(string_font);
         if (!p_font) {
             p_font = get_fonts_factory().create(font.GetString(), mp_desktop);
             add_font(string_font, p_font);
         }
-        if (!p_font) continue;
+        if (!p_font) return;
         int const after = static_cast<int>(_text.get_num_strings());
         for (int line = std::max(before - 1, 0); line <= after - 2; ++line)
             _text.set_string_font(static_cast<unsigned>(line), p_font);
-    }
+    });
 }
 
 } // namespace qorui
