@@ -54,6 +54,17 @@ IConfigSection *config_section(char const *_name) {
     return p_sect;
 }
 
+// A string of a section, or _default without the section or the key. _value_check names the
+// value in the contract report.
+char const *config_string(char const *_section, char const *_key, char const *_default,
+                          char const *_value_check) {
+    IConfigSection *p_sect = config_section(_section);
+    if (!p_sect) return _default;
+    IConfigValue *p_value = p_sect->get_value(_key, true);
+    if (!QOR_CHECK_AS(p_value, _value_check)) return _default;
+    return p_value->get_string(_default);
+}
+
 // The first token of a command's arguments, quotes allowing blanks; false when there is none.
 bool first_token(char const *_arguments, string &_token) {
     CTokenizerRules rules(_arguments, static_cast<unsigned>(std::strlen(_arguments)), default_separators());
@@ -179,11 +190,7 @@ void CUserInterface::init_desktop() {
     mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
     mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
 
-    char const *cursor = k_default_cursor;
-    if (IConfigSection *p_sect = config_section("ui")) {
-        IConfigValue *p_cursor = p_sect->get_value("cursor", true);
-        if (QOR_CHECK(p_cursor)) cursor = p_cursor->get_string(k_default_cursor);
-    }
+    char const *cursor = config_string("ui", "cursor", k_default_cursor, "p_cursor");
     CPointer &pointer = mp_desktop->get_pointer();
     pointer.set_size(32, 32);
     CMaterial *p_material = mp_desktop->create_material();
@@ -213,11 +220,7 @@ void CUserInterface::register_event_names() {
 // The start-up plaque goes straight to the renderer, full screen, and is presented at once:
 // nothing else of the library is there to draw yet.
 void CUserInterface::draw_plaque() {
-    char const *name = k_default_plaque;
-    if (IConfigSection *p_sect = config_section("ui")) {
-        IConfigValue *p_background = p_sect->get_value("init_plaque", true);
-        if (QOR_CHECK(p_background)) name = p_background->get_string(k_default_plaque);
-    }
+    char const *name = config_string("ui", "init_plaque", k_default_plaque, "p_background");
 
     IRenderQOR *p_render = engine_interfaces().get_render(true);
     if (!p_render) return;
@@ -244,11 +247,7 @@ void CUserInterface::read_screen_size() {
 }
 
 void CUserInterface::load_game_library() {
-    char const *name = k_no_library;
-    if (IConfigSection *p_sect = config_section("ui_libraries")) {
-        IConfigValue *p_library = p_sect->get_value("gameui_library", true);
-        if (QOR_CHECK(p_library)) name = p_library->get_string(k_no_library);
-    }
+    char const *name = config_string("ui_libraries", "gameui_library", k_no_library, "p_library");
     if (strcmp(name, k_no_library) == 0) {
         qordebug::error(
             "GameUI library name is not specified.\nPlease, specify parameter '%s' in '[%s]' section "
@@ -403,10 +402,7 @@ void CUserInterface::export_layout(char const *_file) {
 void CUserInterface::import_layout(char const *_file) {
     if (!mp_desktop) return;
     mp_desktop->import(16, _file);
-    IConfigSection *p_sect = config_section("ui");
-    char const *background = k_default_background;
-    IConfigValue *p_background = p_sect ? p_sect->get_value("background", true) : nullptr;
-    if (p_sect && QOR_CHECK(p_background)) background = p_background->get_string(k_default_background);
+    char const *background = config_string("ui", "background", k_default_background, "p_background");
     CMaterial *p_material = mp_desktop->create_material();
     if (p_material) p_material->init("ui_image", background, nullptr, nullptr, nullptr, nullptr, true, false);
     mp_desktop->add_material(MAT_NAME_NORMAL, p_material);
