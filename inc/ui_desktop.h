@@ -65,6 +65,7 @@ protected:
 
 private:
     CWindow *get_pointed_window(point_t const &_pos);
+    point_t pointer_pixel() const;
     bool is_window_pointed(CWindow *_p_root, CWindow *_p_wnd);
     void drop_active_window();
     bool is_kept_out(CWindow *_p_pointed);

@@ -97,12 +97,17 @@ void CDesktop::report_pointer_inside(CWindow *_p_wnd) {
     m_pointed_windows.push_back(_p_wnd);
 }
 
+// The true pointer position cut to whole pixels.
+point_t CDesktop::pointer_pixel() const {
+    return point_t{static_cast<int>(m_pointer_pos.x), static_cast<int>(m_pointer_pos.y)};
+}
+
 void CDesktop::on_pointer_move(vec2_t const &_delta) {
     float const max_x = static_cast<float>(get_w() - 1), max_y = static_cast<float>(get_h() - 1);
     m_pointer_pos.x = std::min(std::max(m_pointer_pos.x + _delta.x, 0.0f), max_x);
     m_pointer_pos.y = std::min(std::max(m_pointer_pos.y + _delta.y, 0.0f), max_y);
     point_t const old = m_pointer.get_pos();
-    point_t const pos{static_cast<int>(m_pointer_pos.x), static_cast<int>(m_pointer_pos.y)};
+    point_t const pos = pointer_pixel();
     point_t const movement{pos.x - old.x, pos.y - old.y};
     if (!m_pointer.is_disabled()) m_pointer.set_pos(pos.x, pos.y);
     if (mp_dragged_window) {
@@ -134,7 +139,7 @@ void CDesktop::on_pointer_move(vec2_t const &_delta) {
 }
 
 void CDesktop::on_pointer_down(unsigned int _button) {
-    point_t const pos{static_cast<int>(m_pointer_pos.x), static_cast<int>(m_pointer_pos.y)};
+    point_t const pos = pointer_pixel();
     CWindow *p_pointed = get_pointed_window(pos);
     mp_pointed_window = p_pointed;
     if (!p_pointed) return;
@@ -153,7 +158,7 @@ void CDesktop::on_pointer_down(unsigned int _button) {
 }
 
 void CDesktop::on_pointer_up(unsigned int _button) {
-    point_t const pos{static_cast<int>(m_pointer_pos.x), static_cast<int>(m_pointer_pos.y)};
+    point_t const pos = pointer_pixel();
     CWindow *p_pointed = get_pointed_window(pos);
     mp_pointed_window = p_pointed;
     if (!p_pointed || !m_pointer_pressed) return;
