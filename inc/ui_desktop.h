@@ -45,7 +45,7 @@ public:
     void on_delete(CWindow *_p_wnd) override;
     // Deleted by a later update, once hidden and faded out; never twice.
     void delete_window(CWindow *_p_wnd) override;
-    point_t get_pointer_pos();
+    point_t get_pointer_pos() override;
     void hide_pointer();
     void show_pointer();
     CPointer &get_pointer() { return m_pointer; }

@@ -41,6 +41,8 @@ public:
     virtual CMaterial *create_material() = 0;
     // The render bridge that the canvases of the tree draw through; null while there is none.
     virtual IRender *get_render() = 0;
+    // The pointer's hot spot in desktop pixels.
+    virtual point_t get_pointer_pos() = 0;
 
 protected:
     ~IWindowDesktop() {}

@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <sys/wait.h>
@@ -15,7 +16,9 @@ CReportCapture::CReportCapture() : mp_previous(nullptr), mp_previous_user(nullpt
     qordebug::set_report_handler(on_report, this, false, &mp_previous, &mp_previous_user);
 }
 
-CReportCapture::~CReportCapture() { qordebug::set_report_handler(mp_previous, mp_previous_user); }
+CReportCapture::~CReportCapture() {
+    qordebug::set_report_handler(mp_previous, mp_previous_user);
+}
 
 void CReportCapture::on_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
     static_cast<CReportCapture *>(_user)->m_reports.push_back({_kind, _text ? _text : ""});
@@ -52,11 +55,13 @@ SChildResult run_child(std::string const &_program, std::vector<std::string> con
         FILE *out = freopen(output_path.c_str(), "w", stdout);
         if (!out) _exit(127);
         dup2(fileno(stdout), fileno(stderr));
-        for (std::string const &entry : _environment) putenv(const_cast<char *>(entry.c_str()));
+        for (std::string const &entry : _environment)
+            putenv(const_cast<char *>(entry.c_str()));
         std::string const path = bin_dir() + "/" + _program;
         std::vector<char *> argv;
         argv.push_back(const_cast<char *>(path.c_str()));
-        for (std::string const &argument : _arguments) argv.push_back(const_cast<char *>(argument.c_str()));
+        for (std::string const &argument : _arguments)
+            argv.push_back(const_cast<char *>(argument.c_str()));
         argv.push_back(nullptr);
         execv(path.c_str(), argv.data());
         _exit(127);
@@ -69,11 +74,32 @@ SChildResult run_child(std::string const &_program, std::vector<std::string> con
     return result;
 }
 
+namespace {
+
+// The folders of make_temp_dir, removed when the test process ends (a forked child leaves by
+// _exit and removes nothing).
+std::vector<std::string> &temp_dirs() {
+    static std::vector<std::string> *sp_dirs = [] {
+        std::atexit([] {
+            for (std::string const &dir : *sp_dirs)
+                std::filesystem::remove_all(dir);
+        });
+        return new std::vector<std::string>;
+    }();
+    return *sp_dirs;
+}
+
+} // namespace
+
 std::string make_temp_dir() {
     char pattern[] = "/tmp/qorui_test_XXXXXX";
     char *dir = mkdtemp(pattern);
-    if (!dir) ADD_FAILURE() << "mkdtemp failed";
-    return dir ? dir : "/tmp";
+    if (!dir) {
+        ADD_FAILURE() << "mkdtemp failed";
+        return "/tmp";
+    }
+    temp_dirs().push_back(dir);
+    return dir;
 }
 
 void write_file(std::string const &_path, std::string const &_content) {

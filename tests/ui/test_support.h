@@ -46,7 +46,8 @@ SChildResult run_child(std::string const &_program, std::vector<std::string> con
 std::string bin_dir();
 // The source tree (data/, tests/golden/).
 std::string source_dir();
-// A new empty folder under the system's temporary folder.
+// A new empty folder under the system's temporary folder, removed with all it holds when the
+// test process ends.
 std::string make_temp_dir();
 void write_file(std::string const &_path, std::string const &_content);
 std::string read_file(std::string const &_path);

@@ -1,0 +1,103 @@
+#include "test_world.h"
+
+#include "image_io.h"
+#include "qorbase.h"
+#include "test_support.h"
+#include "ui_font.h"
+#include "ui_material.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+
+using namespace qorui;
+
+namespace qortest {
+
+CWorld::CWorld(int _w, int _h) : m_renderer(_w, _h), m_x(_w / 2.0f), m_y(_h / 2.0f) {
+    qorplatform::set_clock(&m_clock);
+    std::string const data = source_dir() + "/data";
+    m_renderer.set_texture_folders({data + "/textures", data});
+    {
+        CReportCapture quiet; // no engine screen size in the test process
+        m_render.init(&m_renderer);
+    }
+    m_render.set_resolution(_w, _h);
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
+    get_fonts_factory().init();
+    mp_desktop = new CDesktop(&m_render, _w, _h, "desktop");
+    mp_desktop->send_event(mp_desktop, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
+    mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
+    mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
+}
+
+CWorld::~CWorld() {
+    delete mp_desktop;
+    qorplatform::set_clock(nullptr);
+}
+
+CMaterial *CWorld::colour(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a) {
+    CMaterial *p_material = mp_desktop->create_material();
+    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
+    p_material->set_color(rgba_t(_r, _g, _b, _a));
+    return p_material;
+}
+
+void CWorld::move_to(int _x, int _y) {
+    float const x = static_cast<float>(_x), y = static_cast<float>(_y);
+    mp_desktop->on_pointer_move(vec2_t{x - m_x, y - m_y});
+    m_x = x, m_y = y;
+}
+
+void CWorld::press(unsigned _button) {
+    mp_desktop->on_pointer_down(_button);
+}
+
+void CWorld::release(unsigned _button) {
+    mp_desktop->on_pointer_up(_button);
+}
+
+void CWorld::click_at(int _x, int _y) {
+    move_to(_x, _y);
+    press();
+    release();
+}
+
+void CWorld::key(unsigned _vk) {
+    mp_desktop->on_key_down(_vk, 0);
+    mp_desktop->on_key_up(_vk);
+}
+
+void CWorld::type(char const *_ascii) {
+    for (char const *p = _ascii; *p; ++p)
+        mp_desktop->on_char(static_cast<unsigned char>(*p));
+}
+
+void CWorld::frame() {
+    mp_desktop->update(0);
+    m_renderer.begin_frame(rgba_t(24, 28, 36, 255));
+    mp_desktop->draw();
+}
+
+void CWorld::expect_golden(char const *_name) {
+    qortest::expect_golden(m_renderer.get_frame(), _name);
+}
+
+void expect_golden(qorhost::SImage const &_actual, std::string const &_name) {
+    std::string const golden_path = source_dir() + "/tests/golden/" + _name + ".png";
+    if (std::getenv("QOR_UPDATE_GOLDEN")) {
+        ASSERT_TRUE(qorhost::write_png(golden_path, _actual)) << golden_path;
+    }
+    qorhost::SImage golden;
+    ASSERT_TRUE(qorhost::load_image(golden_path, golden)) << golden_path;
+    if (qorhost::compare_images(_actual, golden, 2) == 0) return;
+    std::string const dir =
+        std::string("/tmp/qorui_golden_") + ::testing::UnitTest::GetInstance()->current_test_info()->name();
+    std::string const actual_path = dir + "_" + _name + ".png", diff_path = dir + "_" + _name + "_diff.png";
+    qorhost::write_png(actual_path, _actual);
+    EXPECT_EQ(0, qorhost::compare_images(_actual, golden, 2, diff_path))
+        << _name << ": actual " << actual_path << ", difference " << diff_path;
+}
+
+} // namespace qortest
