@@ -1,0 +1,117 @@
+// Controls that show a float value inside a range.
+//
+//   CValueBar      the range, the position kept inside it, the orientation and the bar's thickness
+//   CProgressBar   a value bar that fills a rectangle from the left as the position grows
+//   CScrollBar     a value bar with a step button at each end and a scroller dragged between them
+//
+// An owner learns of every change of the position through EVENT_CHANGED on the bar, and may send
+// the bar EVENT_SCROLL_SMALL_STEP or EVENT_SCROLL_LARGE_STEP (an int, -1 or +1) to move it.
+#pragma once
+#include "ui_window_visual.h"
+
+namespace qorui {
+
+class CButton;
+
+class CValueBar : public CWindowVisual {
+public:
+    CValueBar(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CValueBar() {}
+
+    QOR_CLASS_ID(CValueBar, CWindowVisual, "ValueBar")
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    // Range and position: m_min <= m_position <= m_max after every setter. Only set_position sends
+    // EVENT_CHANGED, and only for a value that differs from the stored one before clamping.
+    virtual void set_min(float _min);
+    virtual void set_max(float _max);
+    virtual void set_position(float _position);
+    float get_min() const { return m_min; }
+    float get_max() const { return m_max; }
+    float get_position() const { return m_position; }
+    // The position over the width of the range, not shifted by m_min, cut to 0..1.
+    float get_position_normalized() const;
+
+    // Orientation and thickness: the bar size is the height of a horizontal bar and the width of a
+    // vertical one, taken anew at every resize.
+    void set_horizontal(bool _horizontal);
+    bool get_horizontal() const { return m_horizontal; }
+    int get_bar_size() const { return m_bar_size; }
+    void set_bar_size(int _size) { m_bar_size = _size; }
+
+protected:
+    virtual void on_event_resized(CWndEvent const *_p_event) override;
+    virtual void on_event_changed(CWndEvent const *_p_event) override;
+
+    // Clamps the position to m_min, then to m_max.
+    void clamp_position();
+
+    float m_min;
+    float m_max;
+    float m_position;
+    int m_bar_size;
+    bool m_horizontal;
+};
+
+class CProgressBar : public CValueBar {
+public:
+    CProgressBar(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CProgressBar() {}
+
+    QOR_CLASS_ID(CProgressBar, CValueBar, "ProgressBar")
+
+protected:
+    virtual void on_event_draw(CWndEvent const *_p_event) override;
+};
+
+class CScrollBar : public CValueBar {
+public:
+    CScrollBar(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CScrollBar() {}
+
+    QOR_CLASS_ID(CScrollBar, CValueBar, "ScrollBar")
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+    // The steps become 1% and 10% of the new range.
+    virtual void set_min(float _min) override;
+    virtual void set_max(float _max) override;
+
+    // Steps: not negative, and cut to the range.
+    void set_small_step(float _val);
+    void set_large_step(float _val);
+    float get_small_step() const { return m_small_step; }
+    float get_large_step() const { return m_large_step; }
+
+    CButton *get_button_min() { return mp_button_min; }
+    CButton *get_button_max() { return mp_button_max; }
+    CButton *get_button_scroller() { return mp_button_scroller; }
+    // The end buttons at the ends, the scroller where the position puts it on the track.
+    void set_scroller_for_position();
+
+protected:
+    virtual void on_event_enable(CWndEvent const *_p_event) override;
+    virtual void on_event_disable(CWndEvent const *_p_event) override;
+    virtual void on_event_resized(CWndEvent const *_p_event) override;
+    virtual void on_event_changed(CWndEvent const *_p_event) override;
+    virtual void on_event_pointer_up(CWndEvent const *_p_event) override;
+    virtual void on_event_pointer_down(CWndEvent const *_p_event) override;
+
+    virtual void on_event_button_min_click(CWndEvent const *_p_event);
+    virtual void on_event_button_max_click(CWndEvent const *_p_event);
+    virtual void on_event_button_scroller_drag_begin(CWndEvent const *_p_event);
+    virtual void on_event_button_scroller_drag(CWndEvent const *_p_event);
+    virtual void on_event_scroll_small_step(CWndEvent const *_p_event);
+    virtual void on_event_scroll_large_step(CWndEvent const *_p_event);
+
+    float m_small_step;
+    float m_large_step;
+    CButton *mp_button_min;      // child "button min", towards m_min
+    CButton *mp_button_max;      // child "button max", towards m_max
+    CButton *mp_button_scroller; // child "button scroller", the thumb
+    point_t m_drag_offset;       // where the pointer took hold of the scroller, in its coordinates
+};
+
+} // namespace qorui
