@@ -1,7 +1,10 @@
+// The test world, its golden pictures, the names of events and tables from text.
 #include "test_world.h"
 
+#include "engine_interfaces.h"
 #include "image_io.h"
 #include "qorbase.h"
+#include "test_host.h"
 #include "test_support.h"
 #include "ui_font.h"
 #include "ui_material.h"
@@ -15,12 +18,15 @@ using namespace qorui;
 namespace qortest {
 
 CWorld::CWorld(int _w, int _h) : m_renderer(_w, _h), m_x(_w / 2.0f), m_y(_h / 2.0f) {
+    // The host first: its servers, made before the library's cache of interfaces, outlive it.
+    IInterfaceServer &server = host().server();
+    engine_interfaces().set_server(&server);
     qorplatform::set_clock(&m_clock);
     std::string const data = source_dir() + "/data";
     m_renderer.set_texture_folders({data + "/textures", data});
     {
         CReportCapture quiet; // no engine screen size in the test process
-        m_render.init(&m_renderer);
+        m_render.init(&m_recorder);
     }
     m_render.set_resolution(_w, _h);
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
@@ -32,9 +38,14 @@ CWorld::CWorld(int _w, int _h) : m_renderer(_w, _h), m_x(_w / 2.0f), m_y(_h / 2.
     mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
 }
 
+// The clock goes back to the host's, which holds it between tests.
 CWorld::~CWorld() {
     delete mp_desktop;
-    qorplatform::set_clock(nullptr);
+    qorplatform::set_clock(&host().clock());
+}
+
+qorhost::CHost &CWorld::host() {
+    return shared_host();
 }
 
 CMaterial *CWorld::colour(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a) {
@@ -98,6 +109,80 @@ void expect_golden(qorhost::SImage const &_actual, std::string const &_name) {
     qorhost::write_png(actual_path, _actual);
     EXPECT_EQ(0, qorhost::compare_images(_actual, golden, 2, diff_path))
         << _name << ": actual " << actual_path << ", difference " << diff_path;
+}
+
+std::string event_name(EEventType _id) {
+    static char const *const names[] = {"EVENT_UPDATE",
+                                        "EVENT_DRAW",
+                                        "EVENT_HIDE",
+                                        "EVENT_SHOW",
+                                        "EVENT_SHOW_MAXIMIZED",
+                                        "EVENT_SHOW_NORMAL",
+                                        "EVENT_ACTIVATE",
+                                        "EVENT_DEACTIVATE",
+                                        "EVENT_LOST_FOCUS",
+                                        "EVENT_ENABLE",
+                                        "EVENT_DISABLE",
+                                        "EVENT_RESIZE",
+                                        "EVENT_RESIZED",
+                                        "EVENT_DRAG_BEGIN",
+                                        "EVENT_DRAG",
+                                        "EVENT_DRAG_END",
+                                        "EVENT_REPORT_POINT_INSIDE",
+                                        "EVENT_POINTER_ENTER",
+                                        "EVENT_POINTER_EXIT",
+                                        "EVENT_POINTER_MOVE",
+                                        "EVENT_POINTER_POS",
+                                        "EVENT_POINTER_DOWN",
+                                        "EVENT_POINTER_UP",
+                                        "EVENT_WHEEL_ROTATED",
+                                        "EVENT_CLICK",
+                                        "EVENT_DOUBLE_CLICK",
+                                        "EVENT_CHANGED",
+                                        "EVENT_SET_TEXT",
+                                        "EVENT_SET_STR",
+                                        "29",
+                                        "30",
+                                        "EVENT_KEY_DOWN",
+                                        "EVENT_KEY_UP",
+                                        "EVENT_CHAR",
+                                        "EVENT_LINE_UP",
+                                        "EVENT_LINE_DOWN",
+                                        "EVENT_PAGE_UP",
+                                        "EVENT_PAGE_DOWN",
+                                        "EVENT_SCROLL_SMALL_STEP",
+                                        "EVENT_SCROLL_LARGE_STEP",
+                                        "EVENT_CHECKED",
+                                        "EVENT_UNCHECKED",
+                                        "EVENT_HIGHLIGHTED",
+                                        "EVENT_RESOURCE_INVALIDATE"};
+    bool const known = _id >= 0 && static_cast<size_t>(_id) < sizeof(names) / sizeof(names[0]);
+    return known ? names[_id] : std::to_string(_id);
+}
+
+void CEventLog::watch(CWindow *_p_wnd, std::vector<EEventType> const &_ids) {
+    std::string const name = _p_wnd->get_name();
+    for (EEventType id : _ids)
+        _p_wnd->register_callback(id, CEventCallback([this, name](CWndEvent const *p_event) {
+                                      m_lines.push_back(name + ":" + event_name(p_event->get_id()));
+                                  }));
+}
+
+std::vector<std::string> CEventLog::take() {
+    std::vector<std::string> lines;
+    lines.swap(m_lines);
+    return lines;
+}
+
+LuaPlus::LuaObject lua_table(std::string const &_chunk) {
+    lua_machine().DoString(("qortest_table = " + _chunk).c_str());
+    return lua_machine().GetGlobals().GetByName("qortest_table");
+}
+
+LuaPlus::LuaObject new_table() {
+    LuaPlus::LuaObject table;
+    table.AssignNewTable(&lua_machine());
+    return table;
 }
 
 } // namespace qortest
