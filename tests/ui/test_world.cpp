@@ -185,4 +185,15 @@ LuaPlus::LuaObject new_table() {
     return table;
 }
 
+void load_state(CWindow *_p_wnd, std::string const &_chunk) {
+    LuaPlus::LuaObject table = lua_table(_chunk);
+    _p_wnd->load_state(table);
+}
+
+LuaPlus::LuaObject saved_state(CWindow *_p_wnd) {
+    LuaPlus::LuaObject table = new_table();
+    _p_wnd->save_state(table);
+    return table;
+}
+
 } // namespace qortest

@@ -93,5 +93,8 @@ private:
 LuaPlus::LuaObject lua_table(std::string const &_chunk);
 // A new empty table of the library's Lua state.
 LuaPlus::LuaObject new_table();
+// A window's layout: loaded from a table written in Lua, and saved to a new table.
+void load_state(qorui::CWindow *_p_wnd, std::string const &_chunk);
+LuaPlus::LuaObject saved_state(qorui::CWindow *_p_wnd);
 
 } // namespace qortest

@@ -342,11 +342,6 @@ protected:
         p_ok->set_is_modal(true);
         p_ok->set_auto_delete(true);
     }
-    static LuaPlus::LuaObject save(CWindow *_p_wnd) {
-        LuaPlus::LuaObject table = qortest::new_table();
-        _p_wnd->save_state(table);
-        return table;
-    }
     static std::string dumped(LuaPlus::LuaObject const &_table) {
         std::ostringstream out;
         _table.dump("ui_windows_ini", out);
@@ -357,7 +352,7 @@ protected:
 } // namespace
 
 TEST_F(LayoutTest, ATreeSavedAndLoadedIntoAFreshRootComesBackTheSame) {
-    LuaPlus::LuaObject table = save(mp_root);
+    LuaPlus::LuaObject table = qortest::saved_state(mp_root);
     // A child goes behind the ten keys of a window, at 11.
     EXPECT_EQ(11, table.GetTableCount());
     LuaPlus::LuaObject const panel = table.GetByIndex(11);
@@ -373,7 +368,7 @@ TEST_F(LayoutTest, ATreeSavedAndLoadedIntoAFreshRootComesBackTheSame) {
     ASSERT_NE(nullptr, p_ok);
     EXPECT_EQ(1u, p_fresh->get_child(0u)->get_children_count());
     EXPECT_TRUE(p_ok->is_always_on_top());
-    EXPECT_EQ(dumped(table), dumped(save(p_fresh)));
+    EXPECT_EQ(dumped(table), dumped(qortest::saved_state(p_fresh)));
 }
 
 TEST_F(LayoutTest, AbsentAndWronglyTypedKeysLeaveValuesAlone) {
