@@ -193,8 +193,9 @@ protected:
         if (_name) gdf += std::string("strings_filename = ") + _name + "\n";
         qortest::write_file(m_dir + "/qor.gdf", gdf + "[ui_libraries]\ngameui_library = libgameui_demo.so\n");
         qorbase::set_gdf_path((m_dir + "/qor.gdf").c_str());
-        service().shutdown();
+        if (m_started) service().shutdown();
         service().init(true);
+        m_started = true;
     }
     std::u16string text(char const *_key) { return units(service().get_local_string(_key)); }
     std::string key(std::u16string const &_text) {
@@ -203,6 +204,8 @@ protected:
         return p_key ? p_key : "(null)";
     }
     CUserInterface &service() { return *static_cast<CUserInterface *>(qortest::shared_host().ui()); }
+
+    bool m_started = false;
 };
 
 } // namespace

@@ -33,17 +33,22 @@ protected:
         host().recorder().clear();
     }
     void TearDown() override {
-        service().shutdown();
+        shutdown();
         qorbase::set_gdf_path(nullptr);
+    }
+    void shutdown() {
+        if (m_started) service().shutdown();
+        m_started = false;
     }
     void use_gdf(std::string const &_text) {
         qorbase::set_gdf_path(qortest::write_file(m_dir + "/qor.gdf", _text).c_str());
     }
     // A fresh start; the recorder holds init's calls alone.
     void init() {
-        service().shutdown();
+        shutdown();
         host().recorder().clear();
         service().init(false);
+        m_started = true;
     }
     bool has_commands() {
         bool all = true, none = true;
@@ -59,6 +64,7 @@ protected:
     CUserInterface &service() { return *static_cast<CUserInterface *>(host().ui()); }
 
     std::string m_dir = qortest::make_temp_dir();
+    bool m_started = false;
 };
 
 } // namespace
@@ -136,7 +142,7 @@ TEST_F(ServiceTest, InitPutsEverythingInPlaceAndShutdownTakesItBack) {
     EXPECT_EQ(0u, sequence.find("begin_2d"));
     EXPECT_NE(std::string::npos, sequence.find("draw_quad")); // the pointer at least
 
-    service().shutdown();
+    shutdown();
     EXPECT_EQ(0u, host().input().get_pointer_listeners_count());
     EXPECT_EQ(0u, host().input().get_key_listeners_count());
     EXPECT_FALSE(has_commands());
