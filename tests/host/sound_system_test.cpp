@@ -55,16 +55,16 @@ TEST(SoundSystem, SourcesComeFromWaveFilesOfTheInterfaceData) {
     hosttest::CReportCapture reports;
     CSoundSystem sound;
     dir.write("sounds/click.wav", wave({format_chunk(1, 16), chunk("data", k_samples)}));
-    std::unique_ptr<ISoundSource> p_source(sound.create_sound("sounds/click.wav", 2, 0));
+    std::unique_ptr<ISoundSource> p_source(sound.create_sound("sounds/click.wav", SOUND_GROUP_UI, 0));
     ASSERT_NE(nullptr, p_source);
     CSoundSource &source = static_cast<CSoundSource &>(*p_source);
-    EXPECT_EQ(2, source.get_group());
-    EXPECT_EQ(0, source.get_state());
-    source.set_state(1, 250.0f);
+    EXPECT_EQ(SOUND_GROUP_UI, source.get_group());
+    EXPECT_EQ(SOUND_STATE_RESET, source.get_state());
+    source.set_state(SOUND_STATE_START, 250.0f);
     EXPECT_FLOAT_EQ(250.0f, source.get_state_time());
-    source.set_state(3, 100.0f);
-    EXPECT_EQ(3, source.get_state());
-    source.set_state(1, 0.0f);
+    source.set_state(SOUND_STATE_STOP, 100.0f);
+    EXPECT_EQ(SOUND_STATE_STOP, source.get_state());
+    source.set_state(SOUND_STATE_START, 0.0f);
     EXPECT_EQ(2u, sound.get_started());
     source.set_volume(0.25f);
     source.set_looping(true);
@@ -78,8 +78,8 @@ TEST(SoundSystem, SourcesComeFromWaveFilesOfTheInterfaceData) {
     dir.write("text.wav", {'n', 'o', 't', ' ', 'a', ' ', 'w', 'a', 'v', 'e'});
     dir.write("float.wav", wave({format_chunk(3, 32), chunk("data", k_samples)}));
     for (char const *name : {"missing.wav", "text.wav", "float.wav"})
-        EXPECT_EQ(nullptr, sound.create_sound(name, 2, 0)) << name;
-    EXPECT_EQ(nullptr, sound.create_sound(nullptr, 2, 0));
+        EXPECT_EQ(nullptr, sound.create_sound(name, SOUND_GROUP_UI, 0)) << name;
+    EXPECT_EQ(nullptr, sound.create_sound(nullptr, SOUND_GROUP_UI, 0));
     EXPECT_EQ((std::vector<std::string>{
                   "Cannot create sound from 'missing.wav'", "Cannot create sound from 'text.wav'",
                   "Cannot create sound from 'float.wav'", "Cannot create sound from ''"}),

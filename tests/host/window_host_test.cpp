@@ -278,13 +278,13 @@ TEST_F(WindowHostTest, SoundGoesToTheAudioDeviceWhileTheWindowIsOpen) {
         std::static_pointer_cast<CSoundMixer>(mp_host->sound().get_output());
     ASSERT_NE(nullptr, p_mixer);
     EXPECT_EQ(2, p_mixer->get_channels());
-    std::unique_ptr<ISoundSource> p_source(mp_host->sound().create_sound("click.wav", 2, 0));
+    std::unique_ptr<ISoundSource> p_source(mp_host->sound().create_sound("click.wav", SOUND_GROUP_UI, 0));
     ASSERT_NE(nullptr, p_source);
     EXPECT_TRUE(m_reports.reports().empty());
     // The source outlives the device and keeps its voice on the mixer.
     mp_window.reset();
     EXPECT_EQ(nullptr, mp_host->sound().get_output());
-    p_source->set_state(1, 0.0f);
+    p_source->set_state(SOUND_STATE_START, 0.0f);
     EXPECT_EQ(1u, p_mixer->get_playing_count());
     p_source.reset();
     EXPECT_EQ(0u, p_mixer->get_voices_count());
@@ -388,25 +388,25 @@ TEST(SoundOutput, SourcesPlayThroughTheOutputWithTheirStateVolumeAndLooping) {
     dir.write("loop.wav", wave16({400, -800, 1200}));
     dir.write("none.wav", wave({format_chunk(1, 16, 0, 22050), chunk("data", {1, 2, 3, 4})}));
     sound.set_output(p_mixer);
-    std::unique_ptr<ISoundSource> p_source(sound.create_sound("loop.wav", 3, 0));
+    std::unique_ptr<ISoundSource> p_source(sound.create_sound("loop.wav", SOUND_GROUP_UI_MUSIC, 0));
     std::vector<int16_t> out(4);
     p_mixer->mix(out.data(), 4);
     EXPECT_EQ((std::vector<int16_t>{0, 0, 0, 0}), out); // not started
     p_source->set_volume(0.5f);
     p_source->set_looping(true);
-    p_source->set_state(1, 0.0f);
+    p_source->set_state(SOUND_STATE_START, 0.0f);
     p_mixer->mix(out.data(), 4);
     EXPECT_EQ((std::vector<int16_t>{200, -400, 600, 200}), out);
-    p_source->set_state(3, 0.0f);
+    p_source->set_state(SOUND_STATE_STOP, 0.0f);
     EXPECT_EQ(0u, p_mixer->get_playing_count());
     EXPECT_TRUE(reports.reports().empty());
 
-    std::unique_ptr<ISoundSource> p_none(sound.create_sound("none.wav", 2, 0));
+    std::unique_ptr<ISoundSource> p_none(sound.create_sound("none.wav", SOUND_GROUP_UI, 0));
     ASSERT_NE(nullptr, p_none);
     EXPECT_EQ(0u, static_cast<CSoundSource &>(*p_none).get_voice());
     EXPECT_EQ((std::vector<std::string>{"Cannot play sound 'none.wav'"}), reports.warnings());
     sound.set_output(nullptr); // made without an output: silent; the first keeps its output
-    std::unique_ptr<ISoundSource> p_silent(sound.create_sound("loop.wav", 3, 0));
+    std::unique_ptr<ISoundSource> p_silent(sound.create_sound("loop.wav", SOUND_GROUP_UI_MUSIC, 0));
     EXPECT_EQ(0u, static_cast<CSoundSource &>(*p_silent).get_voice());
     EXPECT_EQ(1u, p_mixer->get_voices_count());
     p_source.reset();
