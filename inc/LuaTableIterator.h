@@ -19,6 +19,17 @@ void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_val
 void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
 void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value);
 void read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value);
+// Numbers 1 and 2 of the table under _key, each only when it is a number (to an integer by
+// truncation toward zero); false when there is no table under the key.
+template <class T>
+bool read_pair(LuaPlus::LuaObject const &_lo_table, char const *_key, T &_first, T &_second) {
+    LuaPlus::LuaObject const pair = _lo_table.GetByName(_key);
+    if (!pair.IsTable()) return false;
+    LuaPlus::LuaObject const first = pair.GetByIndex(1), second = pair.GetByIndex(2);
+    if (first.IsNumber()) _first = static_cast<T>(first.GetNumber());
+    if (second.IsNumber()) _second = static_cast<T>(second.GetNumber());
+    return true;
+}
 
 // A new table under _key with the two numbers at 1 and 2.
 void write_pair(LuaPlus::LuaObject &_lo_table, char const *_key, double _first, double _second);

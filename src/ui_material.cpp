@@ -12,15 +12,6 @@ namespace {
 
 char const *const k_presets = "ui_material_presets";
 
-// Numbers 1 and 2 of a table under _key.
-template <class T>
-void read_pair(LuaPlus::LuaObject const &_lo_table, char const *_key, T &_first, T &_second) {
-    LuaPlus::LuaObject const pair = _lo_table.GetByName(_key);
-    if (!pair.IsTable()) return;
-    _first = static_cast<T>(pair.GetByIndex(1).GetNumber());
-    _second = static_cast<T>(pair.GetByIndex(2).GetNumber());
-}
-
 void write_name(LuaPlus::LuaObject &_lo_table, char const *_key, string const &_name) {
     if (!_name.empty()) _lo_table.SetString(_key, _name.c_str());
 }

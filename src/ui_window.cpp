@@ -401,16 +401,6 @@ bool CWindow::is_point_inside(point_t const &_global) const {
 
 namespace {
 
-// Numbers 1 and 2 of a table, truncated toward zero; false if the value isn't a table.
-bool read_pair(LuaPlus::LuaObject const &_lo_value, int &_first, int &_second) {
-    if (!_lo_value.IsTable()) return false;
-    LuaPlus::LuaObject const first = _lo_value.GetByIndex(1);
-    LuaPlus::LuaObject const second = _lo_value.GetByIndex(2);
-    if (first.IsNumber()) _first = static_cast<int>(first.GetNumber());
-    if (second.IsNumber()) _second = static_cast<int>(second.GetNumber());
-    return true;
-}
-
 char const *string_or_empty(LuaPlus::LuaObject const &_lo_value) {
     return _lo_value.IsString() ? _lo_value.GetString() : "";
 }
@@ -444,9 +434,9 @@ void CWindow::load_state(LuaPlus::LuaObject &_lo_table) {
     QOR_CHECK_AS(strcmp(string_or_empty(_lo_table.GetByName("class_name")), get_class_id().GetName()) == 0,
                  "strcmp(_lo_table.GetByName(\"class_name\").GetString(), get_class_id().GetName()) == 0");
     point_t pos = get_pos();
-    if (read_pair(_lo_table.GetByName("pos"), pos.x, pos.y)) set_pos(pos.x, pos.y);
+    if (read_pair(_lo_table, "pos", pos.x, pos.y)) set_pos(pos.x, pos.y);
     int w = m_region.get_w(), h = m_region.get_h();
-    if (read_pair(_lo_table.GetByName("size"), w, h)) set_size(w, h);
+    if (read_pair(_lo_table, "size", w, h)) set_size(w, h);
     read_bool(_lo_table, "can_resize", m_can_resize);
     read_bool(_lo_table, "can_drag", m_can_drag);
     LuaPlus::LuaObject const alignment = _lo_table.GetByName("alignment");

@@ -368,20 +368,13 @@ void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaOb
     LuaPlus::LuaObject const files = _lo_entry.GetByName("file_names");
     LuaPlus::LuaObject const volume = _lo_entry.GetByName("volume");
     if (!files.IsTable() || files.GetTableCount() < 1 || !volume.IsNumber()) return;
-    auto flag = [&_lo_entry](char const *p_key) {
-        LuaPlus::LuaObject const value = _lo_entry.GetByName(p_key);
-        return value.IsBoolean() && value.GetBoolean();
-    };
-    auto number = [&_lo_entry](char const *p_key, float _default) {
-        LuaPlus::LuaObject const value = _lo_entry.GetByName(p_key);
-        return value.IsNumber() ? value.GetFloat() : _default;
-    };
-    SSound sound;
-    bool const looping = flag("looping");
-    sound.m_simultaneously = flag("simultaneously");
-    sound.m_is_music = flag("is_music");
-    sound.m_fade_in = number("fade_in", 0.0f);
-    sound.m_fade_out = number("fade_out", 500.0f);
+    SSound sound; // its defaults stand for the keys that are missing
+    bool looping = false;
+    read_bool(_lo_entry, "looping", looping);
+    read_bool(_lo_entry, "simultaneously", sound.m_simultaneously);
+    read_bool(_lo_entry, "is_music", sound.m_is_music);
+    read_float(_lo_entry, "fade_in", sound.m_fade_in);
+    read_float(_lo_entry, "fade_out", sound.m_fade_out);
     char const *p_event_name = _lo_key.IsString() ? _lo_key.GetString() : "";
     EEventType id;
     if (!CWndEvent::get_id_by_name(p_event_name, id)) {
@@ -546,19 +539,14 @@ void CWindowVisual::load_fonts(LuaPlus::LuaObject const &_lo_fonts) {
 }
 
 // { pos = { x, y }, size = { w, h }, time = milliseconds }: where a show slides the window to.
+// { pos = { x, y }, size = { w, h }, time = milliseconds }: where a show slides the window to.
 void CWindowVisual::load_movement(LuaPlus::LuaObject const &_lo_movement) {
-    LuaPlus::LuaObject const pos = _lo_movement.GetByName("pos");
-    LuaPlus::LuaObject const size = _lo_movement.GetByName("size");
-    LuaPlus::LuaObject const time = _lo_movement.GetByName("time");
-    if (pos.IsTable()) {
-        m_movement_destination.x = static_cast<int>(pos.GetByIndex(1).GetNumber());
-        m_movement_destination.y = static_cast<int>(pos.GetByIndex(2).GetNumber());
-    }
-    if (size.IsTable()) {
-        m_movement_destination.w = static_cast<int>(size.GetByIndex(1).GetNumber());
-        m_movement_destination.h = static_cast<int>(size.GetByIndex(2).GetNumber());
-    }
-    if (time.IsNumber()) m_movement_time = static_cast<unsigned>(time.GetNumber());
+    SRect &d = m_movement_destination;
+    read_pair(_lo_movement, "pos", d.x, d.y);
+    read_pair(_lo_movement, "size", d.w, d.h);
+    int time = static_cast<int>(m_movement_time);
+    read_int(_lo_movement, "time", time);
+    m_movement_time = static_cast<unsigned>(time);
 }
 
 // ---------------------------------------------------------------------------------------------
