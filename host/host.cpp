@@ -145,12 +145,7 @@ void CHost::frame() {
 
 // The configuration's "[host] startup" line, as a game's autoexec: commands separated by ';'.
 void CHost::run_startup_commands() {
-    IGDFRegistry *p_gdf = GetGDFRegistry();
-    IConfigFile *p_config = p_gdf ? p_gdf->get_config() : nullptr;
-    IConfigSection *p_section = p_config ? p_config->get_section("host") : nullptr;
-    IConfigValue *p_value = p_section ? p_section->get_value("startup", false) : nullptr;
-    if (!p_value) return;
-    std::string const commands = p_value->get_string("");
+    std::string const commands = qorbase::get_config_string("host", "startup", "");
     size_t start = 0;
     while (start < commands.size()) {
         size_t const end = std::min(commands.find(';', start), commands.size());

@@ -60,16 +60,20 @@ public:
     void on_key_up(unsigned _key) override;
     void on_char(unsigned _code) override;
 
-    // The screen size read at init, in real pixels.
     // The work of the commands "ui_export", "ui_import" and "print_stats_page".
     void export_layout(char const *_file);
     void import_layout(char const *_file);
     void print_stats_page();
 
+    // The screen size read at init, in real pixels.
     int get_screen_w() const { return m_scr_w; }
     int get_screen_h() const { return m_scr_h; }
 
 private:
+    // A string of the engine's configuration, _default without it; a _required section that is
+    // missing breaks a contract.
+    static char const *config_string(char const *_section, char const *_key, char const *_default,
+                                     bool _required);
     void draw_plaque();
     void read_screen_size();
     void load_game_library();

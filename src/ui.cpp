@@ -5,7 +5,7 @@
 //   lifecycle           init (and its steps), update, draw, shutdown
 //   input               the listeners
 //   stats pages
-//   configuration       config_section
+//   configuration       config_string
 #include "ui.h"
 
 #include "engine_interfaces.h"
@@ -43,27 +43,6 @@ char const k_default_background[] = "_back.tga";
 
 CTimeProfiler *gp_time_profiler = nullptr;
 CUserInterface *gp_user_interface = nullptr;
-
-// The section of the engine's configuration, with the contracts on the way there.
-IConfigSection *config_section(char const *_name) {
-    IGDFRegistry *p_registry = GetGDFRegistry();
-    IConfigFile *p_cfg = p_registry ? p_registry->get_config() : nullptr;
-    if (!QOR_CHECK(p_cfg)) return nullptr;
-    IConfigSection *p_sect = p_cfg->get_section(_name);
-    if (!QOR_CHECK(p_sect)) return nullptr;
-    return p_sect;
-}
-
-// A string of a section, or _default without the section or the key. _value_check names the
-// value in the contract report.
-char const *config_string(char const *_section, char const *_key, char const *_default,
-                          char const *_value_check) {
-    IConfigSection *p_sect = config_section(_section);
-    if (!p_sect) return _default;
-    IConfigValue *p_value = p_sect->get_value(_key, true);
-    if (!QOR_CHECK_AS(p_value, _value_check)) return _default;
-    return p_value->get_string(_default);
-}
 
 // The first token of a command's arguments, quotes allowing blanks; false when there is none.
 bool first_token(char const *_arguments, string &_token) {
@@ -190,7 +169,7 @@ void CUserInterface::init_desktop() {
     mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
     mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
 
-    char const *cursor = config_string("ui", "cursor", k_default_cursor, "p_cursor");
+    char const *cursor = config_string("ui", "cursor", k_default_cursor, true);
     CPointer &pointer = mp_desktop->get_pointer();
     pointer.set_size(32, 32);
     CMaterial *p_material = mp_desktop->create_material();
@@ -220,7 +199,7 @@ void CUserInterface::register_event_names() {
 // The start-up plaque goes straight to the renderer, full screen, and is presented at once:
 // nothing else of the library is there to draw yet.
 void CUserInterface::draw_plaque() {
-    char const *name = config_string("ui", "init_plaque", k_default_plaque, "p_background");
+    char const *name = config_string("ui", "init_plaque", k_default_plaque, true);
 
     IRenderQOR *p_render = engine_interfaces().get_render(true);
     if (!p_render) return;
@@ -247,7 +226,7 @@ void CUserInterface::read_screen_size() {
 }
 
 void CUserInterface::load_game_library() {
-    char const *name = config_string("ui_libraries", "gameui_library", k_no_library, "p_library");
+    char const *name = config_string("ui_libraries", "gameui_library", k_no_library, true);
     if (strcmp(name, k_no_library) == 0) {
         qordebug::error(
             "GameUI library name is not specified.\nPlease, specify parameter '%s' in '[%s]' section "
@@ -391,6 +370,16 @@ IStatsPage *CUserInterface::get_current_stats_page() {
 }
 
 // ---------------------------------------------------------------------------------------------
+// Configuration
+// ---------------------------------------------------------------------------------------------
+
+char const *CUserInterface::config_string(char const *_section, char const *_key, char const *_default,
+                                          bool _required) {
+    if (_required) QOR_CHECK_AS(qorbase::find_config_section(_section), "p_sect");
+    return qorbase::get_config_string(_section, _key, _default);
+}
+
+// ---------------------------------------------------------------------------------------------
 // The commands' work
 // ---------------------------------------------------------------------------------------------
 
@@ -402,7 +391,7 @@ void CUserInterface::export_layout(char const *_file) {
 void CUserInterface::import_layout(char const *_file) {
     if (!mp_desktop) return;
     mp_desktop->import(qorbase::FILE_CATEGORY_UI, _file);
-    char const *background = config_string("ui", "background", k_default_background, "p_background");
+    char const *background = config_string("ui", "background", k_default_background, true);
     CMaterial *p_material = mp_desktop->create_material();
     if (p_material) p_material->init("ui_image", background, nullptr, nullptr, nullptr, nullptr, true, false);
     mp_desktop->add_material(MAT_NAME_NORMAL, p_material);

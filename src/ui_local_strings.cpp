@@ -37,15 +37,6 @@ float const k_build_font_size = 300.0f;
 // Reading the file
 // ---------------------------------------------------------------------------------------------
 
-// The configured name; the default when the section or the key is missing.
-string strings_file_name() {
-    IGDFRegistry *p_registry = GetGDFRegistry();
-    IConfigFile *p_cfg = p_registry ? p_registry->get_config() : nullptr;
-    IConfigSection *p_sect = p_cfg ? p_cfg->get_section("ui") : nullptr;
-    IConfigValue *p_name = p_sect ? p_sect->get_value(k_strings_key, true) : nullptr;
-    return p_name ? p_name->get_string(k_default_strings_file) : k_default_strings_file;
-}
-
 // Behind the mark, little-endian 16-bit units; a trailing odd byte is a unit of its own.
 void read_wide_text(CCachedFileReader &_reader, unsigned _size, CText &_text) {
     size_t const rest = _size - 2;
@@ -138,7 +129,7 @@ void read_local_strings(IFileReader *_p_stream, char const *_file_name, local_st
 
 // A file that can't be opened leaves the table as it was.
 void CUserInterface::load_local_strings() {
-    string const file_name = strings_file_name();
+    string const file_name = config_string("ui", k_strings_key, k_default_strings_file, false);
     IFileSystem *p_files = GetFileSystem();
     IFileReader *p_stream =
         p_files ? p_files->open_file(qorbase::FILE_CATEGORY_UI, file_name.c_str()) : nullptr;

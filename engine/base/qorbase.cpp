@@ -243,6 +243,17 @@ void make_path(int _category, char const *_path, char *_p_out, unsigned _size) {
     snprintf(_p_out, _size, "%s%s%s", root, needs_slash ? "/" : "", path);
 }
 
+IConfigSection *find_config_section(char const *_section) {
+    IConfigFile *p_config = _section ? GetGDFRegistry()->get_config() : nullptr;
+    return p_config ? p_config->get_section(_section) : nullptr;
+}
+
+char const *get_config_string(char const *_section, char const *_key, char const *_default) {
+    IConfigSection *p_section = find_config_section(_section);
+    IConfigValue *p_value = p_section && _key ? p_section->get_value(_key, false) : nullptr;
+    return p_value ? p_value->get_string(_default) : _default;
+}
+
 void set_log_sink(log_sink_t _sink, void *_user) {
     gp_log_sink = _sink;
     gp_log_user = _sink ? _user : nullptr;

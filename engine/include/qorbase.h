@@ -133,6 +133,14 @@ char const *get_category_root(int _category);
 // Full path of a file in a category; result in _p_out, truncated to _size.
 void make_path(int _category, char const *_path, char *_p_out, unsigned _size);
 
+// A section of the engine's configuration (GetGDFRegistry's); null without the configuration or
+// the section.
+IConfigSection *find_config_section(char const *_section);
+// The text of a key of a section of the engine's configuration; _default without the
+// configuration, the section or the key. Reading creates nothing; the text belongs to the
+// configuration.
+char const *get_config_string(char const *_section, char const *_key, char const *_default);
+
 // Where IFileSystem::log writes; null restores stdout.
 typedef void (*log_sink_t)(char const *_line, void *_user);
 void set_log_sink(log_sink_t _sink, void *_user);

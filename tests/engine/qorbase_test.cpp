@@ -98,6 +98,14 @@ TEST_F(GdfRegistryTest, ReadsStringsQuotedStringsAndNumbers) {
     EXPECT_TRUE(m_capture.reports().empty());
 }
 
+TEST_F(GdfRegistryTest, ConfigStringsFallBackToTheirDefaultAndCreateNothing) {
+    EXPECT_STREQ(qorbase::get_config_string("ui", "cursor", "x"), "kursor.tga");
+    EXPECT_STREQ(qorbase::get_config_string("ui", "absent", "x"), "x");
+    EXPECT_STREQ(qorbase::get_config_string("nowhere", "cursor", "x"), "x");
+    EXPECT_EQ(qorbase::find_config_section("nowhere"), nullptr);
+    EXPECT_EQ(section("ui")->get_value("absent", false), nullptr);
+}
+
 TEST_F(GdfRegistryTest, ValuesWithoutContentOrNumberGiveDefaults) {
     IConfigValue *p_empty = value("ui", "empty");
     EXPECT_FALSE(p_empty->has_content());
