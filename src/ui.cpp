@@ -56,24 +56,25 @@ bool first_token(char const *_arguments, string &_token) {
     }
 }
 
-void cmd_ui_export(char const *_arguments, void *_user) {
+// A command whose argument is a file name: the service's work on the first token, or the
+// command's use when there is none.
+void run_with_file(char const *_arguments, void *_user, char const *_command,
+                   void (CUserInterface::*_work)(char const *)) {
     if (!_user || !_arguments) return;
     string file;
     if (!first_token(_arguments, file)) {
-        qordebug::warning("Use of command 'ui_export':\nui_export [filename]");
+        qordebug::warning("Use of command '%s':\n%s [filename]", _command, _command);
         return;
     }
-    static_cast<CUserInterface *>(_user)->export_layout(file.c_str());
+    (static_cast<CUserInterface *>(_user)->*_work)(file.c_str());
+}
+
+void cmd_ui_export(char const *_arguments, void *_user) {
+    run_with_file(_arguments, _user, "ui_export", &CUserInterface::export_layout);
 }
 
 void cmd_ui_import(char const *_arguments, void *_user) {
-    if (!_user || !_arguments) return;
-    string file;
-    if (!first_token(_arguments, file)) {
-        qordebug::warning("Use of command 'ui_import':\nui_import [filename]");
-        return;
-    }
-    static_cast<CUserInterface *>(_user)->import_layout(file.c_str());
+    run_with_file(_arguments, _user, "ui_import", &CUserInterface::import_layout);
 }
 
 void cmd_print_stats_page(char const *, void *_user) {
