@@ -1,6 +1,7 @@
-// Windows that stand for a position rather than a rectangle. A pointer's position is its hot spot;
-// a cursor's is its lower left corner. The const get_pos of the window keeps giving the top left
-// corner, for saving and dragging; the reference point comes from the non-const get_pos.
+// Windows that stand for a point rather than a rectangle: the pointer, whose position is its hot
+// spot, and the text cursor, whose position is its lower left corner. The const get_pos of the
+// window keeps giving the top left corner, for saving and dragging; the reference point comes
+// from the non-const get_pos.
 #pragma once
 #include "ui_window_visual.h"
 
@@ -8,7 +9,21 @@ namespace qorui {
 
 class CDesktop;
 
-class CPointer : public CWindowVisual {
+// A visual window placed and read by a reference point at an offset from its top left corner.
+class CReferencePointWindow : public CWindowVisual {
+public:
+    using CWindowVisual::CWindowVisual;
+
+    virtual void set_pos(int _x, int _y) override;
+    using CWindow::get_pos;
+    virtual point_t get_pos();
+
+protected:
+    // The reference point, from the top left corner.
+    virtual point_t reference_offset() const = 0;
+};
+
+class CPointer : public CReferencePointWindow {
 public:
     // Appears and vanishes at once: no fades.
     CPointer(IWindowDesktop *_p_desktop, char const *_name);
@@ -16,28 +31,26 @@ public:
 
     QOR_CLASS_ID(CPointer, CWindowVisual, "Pointer")
 
-    virtual void set_pos(int _x, int _y) override;
-    using CWindow::get_pos;
-    virtual point_t get_pos();
-
     // The window stays; the reference point moves by the difference.
     void set_hotspot(point_t const &_hotspot) { m_hotspot = _hotspot; }
 
+protected:
+    point_t reference_offset() const override { return m_hotspot; }
+
 private:
-    friend class CDesktop;
+    friend class CDesktop; // hangs the pointer from itself without making it a child
     point_t m_hotspot;
 };
 
-class CCursor : public CWindowVisual {
+class CCursor : public CReferencePointWindow {
 public:
-    CCursor(IWindowDesktop *_p_desktop, char const *_name);
+    using CReferencePointWindow::CReferencePointWindow;
     virtual ~CCursor() {}
 
     QOR_CLASS_ID(CCursor, CWindowVisual, "Cursor")
 
-    virtual void set_pos(int _x, int _y) override;
-    using CWindow::get_pos;
-    virtual point_t get_pos();
+protected:
+    point_t reference_offset() const override { return point_t{0, get_h()}; }
 };
 
 } // namespace qorui
