@@ -1,5 +1,5 @@
 // The library's binding to the engine: the cache of engine interfaces fetched from the server,
-// the library's one Lua state, and the server pointer that RegisterInterface hands in.
+// and the library's one Lua state.
 #pragma once
 #include "qor_memory.h"
 
@@ -85,9 +85,6 @@ CEngineInterfaces &engine_interfaces();
 
 // The library's one Lua state, created at the first call and never destroyed.
 LuaPlus::LuaState &lua_machine();
-
-// The server from RegisterInterface, until CUserInterface::init hands it to the cache.
-extern IInterfaceServer *g_interface_server;
 
 // An evaluator of expressions that an engine may implement; nothing in the library calls it.
 class IExpressionEvaluator {

@@ -9,6 +9,7 @@
 #pragma once
 #include "qor_memory.h"
 #include "ui_interfaces.h"
+#include "ui_render.h"
 #include "ui_string.h"
 
 #include "qor_input.h"
@@ -69,6 +70,10 @@ public:
     int get_screen_w() const { return m_scr_w; }
     int get_screen_h() const { return m_scr_h; }
 
+    // The engine's server, handed in by RegisterInterface; init gives it to the cache of
+    // interfaces.
+    void set_server(IInterfaceServer *_p_server) { mp_server = _p_server; }
+
 private:
     // A string of the engine's configuration, _default without it; a _required section that is
     // missing breaks a contract.
@@ -84,10 +89,14 @@ private:
     void unregister_commands();
     void draw_build_version();
 
+    IInterfaceServer *mp_server;              // the engine's, not owned
+    CRender m_render;                         // the desktop's bridge to the engine's renderer
     CDesktop *mp_desktop;                     // owned
     CConsole *mp_console;                     // a child of the desktop, owned by the window tree
     void *mp_reserved;                        // only the constructor writes it
     qor_vector<CStatsPage *> m_stats_pages;   // in order of creation; owned
+    IStatsPage *mp_ui_page;                   // the desktop's figures, one of m_stats_pages
+    CStatsPage *mp_build_version_page;        // made at the first drawn frame; one of m_stats_pages
     qor_map<string, CString> m_local_strings; // local strings by key
     int m_scr_w;                              // "scr_resx" at init
     int m_scr_h;                              // "scr_resy" at init

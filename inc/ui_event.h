@@ -81,12 +81,12 @@ public:
     EDispatchType get_dispatch_type() const { return m_dispatch_type; }
     void set_dispatch_type(EDispatchType _type) const { m_dispatch_type = _type; }
 
-    // The names of layouts. A name is registered once; a later registration changes nothing.
+    // The names of layouts, one table for the library. A name is registered once; a later
+    // registration changes nothing.
     static bool register_event_name(string const &_name, EEventType _id);
     static bool get_id_by_name(string const &_name, EEventType &_id);
     // The first name in sort order with that value.
     static bool get_name_by_id(EEventType _id, string &_name);
-    static qor_map<string, EEventType, std::less<string>> m_events_names;
 
 private:
     friend class CEventDispatcher;

@@ -13,8 +13,6 @@
 
 namespace qorui {
 
-IInterfaceServer *g_interface_server = nullptr;
-
 CEngineInterfaces::CEngineInterfaces()
     : mp_server(nullptr), mp_load_processor(nullptr), mp_input_system(nullptr), mp_system_timer(nullptr),
       mp_var_manager(nullptr), mp_cmd_manager(nullptr), mp_collision_system_base(nullptr),

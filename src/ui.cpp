@@ -41,9 +41,6 @@ char const k_no_library[] = "no_lib";
 char const k_default_cursor[] = "kursor.tga";
 char const k_default_background[] = "_back.tga";
 
-CTimeProfiler *gp_time_profiler = nullptr;
-CUserInterface *gp_user_interface = nullptr;
-
 // The first token of a command's arguments, quotes allowing blanks; false when there is none.
 bool first_token(char const *_arguments, string &_token) {
     CTokenizerRules rules(_arguments, static_cast<unsigned>(std::strlen(_arguments)), default_separators());
@@ -105,13 +102,10 @@ extern "C" __attribute__((visibility("default"))) int RegisterInterface(IInterfa
     using namespace qorui;
     if (!QOR_CHECK(_p_server)) return -1;
     static CTimeProfiler s_time_profiler;
-    gp_time_profiler = &s_time_profiler;
-    _p_server->register_interface(gp_time_profiler);
+    _p_server->register_interface(&s_time_profiler);
     static CUserInterface s_user_interface;
-    gp_user_interface = &s_user_interface;
-    int const result = _p_server->register_interface(gp_user_interface);
-    g_interface_server = _p_server;
-    return result;
+    s_user_interface.set_server(_p_server);
+    return _p_server->register_interface(&s_user_interface);
 }
 
 namespace qorui {
@@ -122,8 +116,8 @@ namespace qorui {
 
 // Touches neither the engine nor the server.
 CUserInterface::CUserInterface()
-    : mp_desktop(nullptr), mp_console(nullptr), mp_reserved(nullptr), m_scr_w(0), m_scr_h(0),
-      m_hide_console(false) {}
+    : mp_server(nullptr), mp_desktop(nullptr), mp_console(nullptr), mp_reserved(nullptr), mp_ui_page(nullptr),
+      mp_build_version_page(nullptr), m_scr_w(0), m_scr_h(0), m_hide_console(false) {}
 
 // The pages go from the last to the first.
 CUserInterface::~CUserInterface() {
@@ -140,7 +134,7 @@ CUserInterface::~CUserInterface() {
 
 // The order is settled: each step relies on the ones before it.
 void CUserInterface::init(bool _hide_console) {
-    engine_interfaces().set_server(g_interface_server);
+    engine_interfaces().set_server(mp_server);
     draw_plaque();
     m_hide_console = _hide_console;
     engine_interfaces().get_time_profiler(true)->enable();
@@ -154,6 +148,7 @@ void CUserInterface::init(bool _hide_console) {
     }
     load_local_strings();
     init_desktop();
+    mp_ui_page = create_stats_page("ui");
     register_commands();
     register_event_names();
 }
@@ -162,10 +157,9 @@ void CUserInterface::init(bool _hide_console) {
 // pointer with the cursor's picture.
 void CUserInterface::init_desktop() {
     get_fonts_factory().init();
-    static CRender s_render;
-    s_render.init(engine_interfaces().get_render(true));
+    m_render.init(engine_interfaces().get_render(true));
     if (!QOR_CHECK(mp_desktop == NULL)) return;
-    mp_desktop = new CDesktop(&s_render, 1024, 768, "desktop");
+    mp_desktop = new CDesktop(&m_render, 1024, 768, "desktop");
     mp_desktop->send_event(mp_desktop, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
     mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
     mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
@@ -235,7 +229,7 @@ void CUserInterface::load_game_library() {
             "gameui_library", "ui_libraries");
         return;
     }
-    g_interface_server->load_module(1, name);
+    if (mp_server) mp_server->load_module(1, name);
 }
 
 void CUserInterface::register_commands() {
@@ -252,11 +246,12 @@ void CUserInterface::unregister_commands() {
         p_commands->unregister_command(command.mp_name);
 }
 
-// The first of the two calls of a frame. The "ui" page is made at the first update.
+// The first of the two calls of a frame; the "ui" page, when it is shown, gets the desktop's
+// figures.
 void CUserInterface::update(int _time) {
-    if (mp_desktop) mp_desktop->update(_time);
-    static IStatsPage *sp_ui_page = create_stats_page("ui");
-    if (sp_ui_page && sp_ui_page->is_show() && mp_desktop) mp_desktop->show_stats(sp_ui_page, 0);
+    if (!mp_desktop) return;
+    mp_desktop->update(_time);
+    if (mp_ui_page->is_show()) mp_desktop->show_stats(mp_ui_page, 0);
 }
 
 // The second call of a frame: the desktop draws the whole tree. Without a desktop, nothing.

@@ -1,11 +1,16 @@
+// Events: their names, the event object, and the dispatch of callbacks.
 #include "ui_event.h"
 #include "ui_window.h"
 
 namespace qorui {
 
-qor_map<string, EEventType, std::less<string>> CWndEvent::m_events_names;
-
 namespace {
+
+// The names that layouts give events, in sort order.
+qor_map<string, EEventType> &event_names() {
+    static qor_map<string, EEventType> s_names;
+    return s_names;
+}
 // The callbacks' allocator is made at the library's load, before any static that owns windows, so
 // that it is destroyed after all of them.
 bool const s_allocator_ready = [] {
@@ -22,18 +27,18 @@ CWindow *CWndEvent::get_receiver() const {
 }
 
 bool CWndEvent::register_event_name(string const &_name, EEventType _id) {
-    return m_events_names.insert(std::make_pair(_name, _id)).second;
+    return event_names().insert(std::make_pair(_name, _id)).second;
 }
 
 bool CWndEvent::get_id_by_name(string const &_name, EEventType &_id) {
-    auto const found = m_events_names.find(_name);
-    if (found == m_events_names.end()) return false;
+    auto const found = event_names().find(_name);
+    if (found == event_names().end()) return false;
     _id = found->second;
     return true;
 }
 
 bool CWndEvent::get_name_by_id(EEventType _id, string &_name) {
-    for (auto const &entry : m_events_names) {
+    for (auto const &entry : event_names()) {
         if (entry.second == _id) {
             _name = entry.first;
             return true;

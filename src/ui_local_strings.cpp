@@ -189,8 +189,9 @@ CStatsPage *make_build_version_page(CUserInterface &_service) {
 // Made at the first drawn frame; drawn, when shown, on the desktop's canvas in the fixed font at a
 // large size, in a 2D batch of its own.
 void CUserInterface::draw_build_version() {
-    static CStatsPage *const sp_page = make_build_version_page(*this);
-    if (!sp_page || !sp_page->is_show() || !mp_desktop) return;
+    if (!mp_build_version_page) mp_build_version_page = make_build_version_page(*this);
+    CStatsPage *const p_page = mp_build_version_page;
+    if (!p_page || !p_page->is_show() || !mp_desktop) return;
     IRender *p_render = mp_desktop->get_render();
     CFont *p_font = mp_desktop->get_font(FNT_NAME_FIXED);
     if (!QOR_CHECK(p_render) || !QOR_CHECK(p_font)) return;
@@ -199,7 +200,7 @@ void CUserInterface::draw_build_version() {
     p_font->set_size(k_build_font_size);
     // The last window drawn left its own clip behind (the pointer's); the page spans the desktop.
     mp_desktop->get_canvas().set_clip_area_all();
-    sp_page->draw(&mp_desktop->get_canvas(), p_font);
+    p_page->draw(&mp_desktop->get_canvas(), p_font);
     p_font->set_size(size);
     p_render->end_draw();
 }
