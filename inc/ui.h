@@ -95,7 +95,7 @@ private:
     CConsole *mp_console;                     // a child of the desktop, owned by the window tree
     void *mp_reserved;                        // only the constructor writes it
     qor_vector<CStatsPage *> m_stats_pages;   // in order of creation; owned
-    IStatsPage *mp_ui_page;                   // the desktop's figures, one of m_stats_pages
+    IStatsPage *mp_ui_page;                   // the desktop's figures, made at the first update
     CStatsPage *mp_build_version_page;        // made at the first drawn frame; one of m_stats_pages
     qor_map<string, CString> m_local_strings; // local strings by key
     int m_scr_w;                              // "scr_resx" at init

@@ -32,7 +32,9 @@ public:
     void on_key_down(unsigned int _key, unsigned int _value);
     void on_key_up(unsigned int _key);
     void on_char(unsigned int _char);
-    void show_stats(IStatsPage *, unsigned int) {}
+    // The figures a developer watches, on the page's lines from _line on: the windows of the tree,
+    // what the last frame sent to the engine, and the time between the last two frames.
+    void show_stats(IStatsPage *_p_page, unsigned int _line);
 
     // Called by windows and game code
     CWindow *get_active_window();
@@ -86,6 +88,8 @@ private:
     qor_vector<CWindow *> m_input_subscribers;
     std::list<CWindow *, qor_allocator<CWindow *>> m_delete_queue;
     bool m_pointer_pressed;
+    int64_t m_last_draw_ticks; // the performance counter at the last draw; 0 before the first
+    float m_frame_ms;          // between the last two draws
 };
 
 } // namespace qorui

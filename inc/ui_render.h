@@ -7,6 +7,13 @@
 
 namespace qorui {
 
+// What one frame sent to the engine, from its outermost begin_draw to its end_draw.
+struct SRenderFigures {
+    unsigned m_materials_set; // one for each drawing of the canvas, and for each font change
+    unsigned m_quads;
+    unsigned m_lines;
+};
+
 class IRender {
 public:
     virtual ~IRender() {}
@@ -29,6 +36,8 @@ public:
     // A 3D view in the middle of a 2D frame: the 2D batch closes round it and opens again.
     virtual void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) = 0;
     virtual IAviTexture *get_avi_texture(int _id) = 0;
+    // The figures of the last frame that ended.
+    virtual SRenderFigures get_frame_figures() const = 0;
 };
 
 class CRender : public IRender {
@@ -54,6 +63,7 @@ public:
                    rgba_t const &_c_to) override;
     void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) override;
     IAviTexture *get_avi_texture(int _id) override;
+    SRenderFigures get_frame_figures() const override { return m_last_frame; }
 
     // Attaches the engine's renderer and reads the real screen size from "scr_resx", "scr_resy".
     virtual void init(IRenderQOR *_p_render);
@@ -74,6 +84,8 @@ private:
     float m_scale_y; // 2 / m_res_h
     int m_scr_w;
     int m_scr_h;
+    SRenderFigures m_frame;      // counted since the outermost begin_draw
+    SRenderFigures m_last_frame; // the last frame that ended
 };
 
 } // namespace qorui

@@ -148,7 +148,6 @@ void CUserInterface::init(bool _hide_console) {
     }
     load_local_strings();
     init_desktop();
-    mp_ui_page = create_stats_page("ui");
     register_commands();
     register_event_names();
 }
@@ -246,12 +245,12 @@ void CUserInterface::unregister_commands() {
         p_commands->unregister_command(command.mp_name);
 }
 
-// The first of the two calls of a frame; the "ui" page, when it is shown, gets the desktop's
-// figures.
+// The first of the two calls of a frame. The "ui" page is made at the first update; when it is
+// shown it gets the desktop's figures.
 void CUserInterface::update(int _time) {
-    if (!mp_desktop) return;
-    mp_desktop->update(_time);
-    if (mp_ui_page->is_show()) mp_desktop->show_stats(mp_ui_page, 0);
+    if (mp_desktop) mp_desktop->update(_time);
+    if (!mp_ui_page) mp_ui_page = create_stats_page("ui");
+    if (mp_ui_page->is_show() && mp_desktop) mp_desktop->show_stats(mp_ui_page, 0);
 }
 
 // The second call of a frame: the desktop draws the whole tree. Without a desktop, nothing.

@@ -39,7 +39,8 @@ void send(CWindow *_p_from, CWindow *_p_to, EEventType _id) {
 CDesktop::CDesktop(IRender *_p_render, int _w, int _h, char const *_name)
     : CWindowVisual(this, _name), m_pointer(this, "desktop pointer"), mp_render(nullptr),
       mp_pointed_window(nullptr), mp_dragged_window(nullptr), mp_pressed_window(nullptr), m_pointer_pos{0, 0},
-      m_last_click_time(0), mp_last_clicked_window(nullptr), m_pointer_pressed(false) {
+      m_last_click_time(0), mp_last_clicked_window(nullptr), m_pointer_pressed(false), m_last_draw_ticks(0),
+      m_frame_ms(0.0f) {
     if (QOR_CHECK(_p_render)) {
         mp_render = _p_render;
         mp_render->set_resolution(_w, _h);
@@ -336,6 +337,11 @@ void CDesktop::update(int _value) {
 
 void CDesktop::draw() {
     if (!QOR_CHECK(mp_render) || m_is_hidden) return;
+    int64_t const ticks = qorplatform::query_performance_counter();
+    if (m_last_draw_ticks != 0)
+        m_frame_ms = static_cast<float>(static_cast<double>(ticks - m_last_draw_ticks) * 1000.0 /
+                                        static_cast<double>(qorplatform::query_performance_frequency()));
+    m_last_draw_ticks = ticks;
     mp_render->begin_draw();
     if (m_exclusive_windows.empty()) {
         m_canvas.set_clip_area_all();
@@ -357,6 +363,24 @@ void CDesktop::on_event_show(CWndEvent const *_p_event) {
 void CDesktop::on_event_hide(CWndEvent const *_p_event) {
     CWindowVisual::on_event_hide(_p_event);
     send(this, &m_pointer, EVENT_HIDE);
+}
+
+void CDesktop::show_stats(IStatsPage *_p_page, unsigned int _line) {
+    if (!QOR_CHECK(_p_page)) return;
+    qor_vector<CWindow *> windows;
+    get_children(windows);
+    unsigned shown = 0;
+    for (CWindow *p_wnd : windows) {
+        CWindow *p_up = p_wnd;
+        while (p_up && p_up != this && !p_up->is_hidden())
+            p_up = p_up->get_parent();
+        if (p_up == this) ++shown;
+    }
+    SRenderFigures const figures = mp_render ? mp_render->get_frame_figures() : SRenderFigures{0, 0, 0};
+    _p_page->print(_line, "Windows: %u, shown %u", static_cast<unsigned>(windows.size()), shown);
+    _p_page->print(_line + 1, "Materials set: %u, quads: %u, lines: %u", figures.m_materials_set,
+                   figures.m_quads, figures.m_lines);
+    _p_page->print(_line + 2, "Frame: %.1f ms", m_frame_ms);
 }
 
 point_t CDesktop::get_pointer_pos() {

@@ -16,7 +16,7 @@ int screen_var(IVarManagerBase *_p_vars, char const *_name) {
 
 CRender::CRender()
     : mp_render(nullptr), m_in_draw_2d(0), m_in_draw_3d(0), m_res_w(0), m_res_h(0), m_scale_x(0.0f),
-      m_scale_y(0.0f), m_scr_w(0), m_scr_h(0) {}
+      m_scale_y(0.0f), m_scr_w(0), m_scr_h(0), m_frame{0, 0, 0}, m_last_frame{0, 0, 0} {}
 
 void CRender::init(IRenderQOR *_p_render) {
     QOR_CHECK(_p_render);
@@ -43,8 +43,10 @@ vec2_t CRender::to_device(point_t const &_p) const {
                   static_cast<float>((static_cast<double>(_p.y) / m_res_h - 0.5) * -2.0)};
 }
 
+// The outermost begin starts the frame's figures, and its end keeps them.
 void CRender::begin_draw() {
     if (!has_render()) return;
+    if (m_in_draw_2d == 0) m_frame = SRenderFigures{0, 0, 0};
     mp_render->begin_2d();
     ++m_in_draw_2d;
 }
@@ -52,7 +54,7 @@ void CRender::begin_draw() {
 void CRender::end_draw() {
     if (!QOR_CHECK(mp_render && m_in_draw_2d > 0)) return;
     mp_render->end_2d();
-    --m_in_draw_2d;
+    if (--m_in_draw_2d == 0) m_last_frame = m_frame;
 }
 
 int CRender::create_material(char const *_material_template, char const *_diffuse, char const *_bump,
@@ -68,7 +70,9 @@ void CRender::destroy_material(int _handle) {
 }
 
 void CRender::set_material(int _handle) {
-    if (has_render()) mp_render->set_material(_handle);
+    if (!has_render()) return;
+    mp_render->set_material(_handle);
+    ++m_frame.m_materials_set;
 }
 
 // The engine takes the lower left corner of the area.
@@ -93,12 +97,14 @@ void CRender::draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_
     if (!has_render()) return;
     vec2_t const d0 = to_device(_p0), d1 = to_device(_p1), d2 = to_device(_p2), d3 = to_device(_p3);
     mp_render->draw_quad(d0, _t0, _c0, d1, _t1, _c1, d2, _t2, _c2, d3, _t3, _c3);
+    ++m_frame.m_quads;
 }
 
 void CRender::draw_line(point_t const &_from, point_t const &_to, rgba_t const &_c_from,
                         rgba_t const &_c_to) {
     if (!has_render()) return;
     mp_render->draw_line(to_device(_from), _c_from, to_device(_to), _c_to, 1.0f);
+    ++m_frame.m_lines;
 }
 
 void CRender::render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) {

@@ -4,6 +4,9 @@
 #include "ui_desktop.h"
 
 #include "test_world.h"
+#include "ui.h"
+#include "ui_material.h"
+#include "ui_stats_page.h"
 
 #include <gtest/gtest.h>
 
@@ -192,6 +195,22 @@ TEST_F(DesktopTest, FramesDrawTheTreeAndThePointerLast) {
     desktop().draw();
     EXPECT_EQ(1, pointer_draws);
     EXPECT_EQ(0, b_draws);
+}
+
+// The "ui" page's figures: the windows of the tree, what the last frame sent, the frame's time.
+TEST_F(DesktopTest, StatsShowTheWindowsTheLastFrameAndItsTime) {
+    mp_a->add_material(MAT_NAME_NORMAL, m_world.colour(1, 2, 3));
+    mp_b->set_hidden(true);
+    m_world.frame();
+    m_world.clock().advance_ms(16);
+    m_world.frame();
+    CUserInterface service;
+    IStatsPage *p_page = service.create_stats_page("ui");
+    desktop().show_stats(p_page, 2);
+    CText const &text = static_cast<CStatsPage *>(p_page)->get_text();
+    EXPECT_STREQ("<color 255 255 255 255>Windows: 3, shown 2", text.get_string(2)->get_c()); // a1 inside a
+    EXPECT_STREQ("<color 255 255 255 255>Materials set: 1, quads: 1, lines: 0", text.get_string(3)->get_c());
+    EXPECT_STREQ("<color 255 255 255 255>Frame: 16.0 ms", text.get_string(4)->get_c());
 }
 
 TEST(Pointer, PositionsAreThoseOfTheHotSpotOrTheLowerLeftCorner) {

@@ -11,6 +11,7 @@
 #include "ui_desktop.h"
 #include "ui_font.h"
 #include "ui_material.h"
+#include "ui_stats_page.h"
 #include "ui_time_profiler.h"
 
 #include <gtest/gtest.h>
@@ -141,6 +142,13 @@ TEST_F(ServiceTest, InitPutsEverythingInPlaceAndShutdownTakesItBack) {
     std::string const sequence = host().recorder().sequence();
     EXPECT_EQ(0u, sequence.find("begin_2d"));
     EXPECT_NE(std::string::npos, sequence.find("draw_quad")); // the pointer at least
+    IStatsPage *p_ui = service().get_stats_page("ui");        // made at the first update, filled while shown
+    ASSERT_NE(nullptr, p_ui);
+    p_ui->show(true);
+    service().update(16);
+    p_ui->show(false);
+    EXPECT_EQ(0u, std::string(static_cast<CStatsPage *>(p_ui)->get_text().get_string(0)->get_c())
+                      .find("<color 255 255 255 255>Windows: "));
 
     shutdown();
     EXPECT_EQ(0u, host().input().get_pointer_listeners_count());
