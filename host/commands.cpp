@@ -1,3 +1,5 @@
+// The host's console commands and variables: registration, running by name or line, completion
+// of names in order, and the "set" command.
 #include "commands.h"
 
 #include "qordebug.h"

@@ -1,3 +1,5 @@
+// The reference engine: its interfaces on the server, the configuration's copy, the library's
+// loading, the startup commands, and the frames or the input script of a run.
 #include "host.h"
 #include "input_script.h"
 

@@ -1,3 +1,5 @@
+// Pictures of the host: TGA and PNG files loaded to RGBA (truncated files refused), PNG written,
+// and two pictures compared with a picture of their differences.
 #include "image_io.h"
 
 #define STB_IMAGE_IMPLEMENTATION

@@ -1,3 +1,6 @@
+// Input scripts: their lines read into steps (moves, buttons, wheel, keys, characters, waits,
+// screenshots, commands), with the line of the first bad one in the message, and the steps played
+// on the host.
 #include "input_script.h"
 #include "host.h"
 #include "image_io.h"

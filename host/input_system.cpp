@@ -1,3 +1,5 @@
+// The host's input system: the lists of pointer and key listeners and the delivery of input to
+// them, in the order they were added.
 #include "input_system.h"
 
 #include <algorithm>

@@ -1,3 +1,5 @@
+// The host's interface server: registration, queries by identifier and version, listeners told of
+// registrations and withdrawals, and modules loaded by file name.
 #include "interface_server.h"
 
 #include "qor_platform.h"

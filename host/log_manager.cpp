@@ -1,3 +1,5 @@
+// The host's log manager: named loggers with prefixes, messages kept in order as 16-bit text with
+// their level and printed as UTF-8 to stdout unless quiet, and visits of a range of them.
 #include "log_manager.h"
 
 #include <cstdio>

@@ -1,3 +1,4 @@
+// The recording renderer: every call with its arguments, handed on to a target renderer.
 #include "recording_renderer.h"
 
 namespace qorhost {

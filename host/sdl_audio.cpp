@@ -1,3 +1,5 @@
+// Sound through SDL2: the mixer that converts WAV files to its rate and channels and mixes the
+// playing voices with their volume, fades and looping, and the audio device that it feeds.
 #include "sdl_audio.h"
 
 #include <algorithm>

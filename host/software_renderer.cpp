@@ -1,3 +1,8 @@
+// The software renderer.
+//
+//   materials and textures   ui_color, ui_image, textures by folder, the missing texture's checker
+//   clip                     the clip rectangle and its stack
+//   drawing                  quads by the top-left rule, alpha blending, lines
 #include "software_renderer.h"
 
 #include "qordebug.h"

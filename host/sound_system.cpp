@@ -1,3 +1,5 @@
+// The host's sound system: the check of PCM WAV files, sources made from the interface data, and
+// their states, volume and looping handed to the sound output.
 #include "sound_system.h"
 
 #include "qorMemoryManager.h"

@@ -1,3 +1,5 @@
+// The host in an SDL2 window: keys as Windows virtual-key codes, text as character codes, SDL's
+// events delivered as the library's input, and frames shown in the window on the real clock.
 #include "window_host.h"
 
 #include "host.h"

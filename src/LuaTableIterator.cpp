@@ -1,3 +1,4 @@
+// The readers of typed fields of Lua tables and the writer of pairs, shared by every layout.
 #include "LuaTableIterator.h"
 
 namespace qorui {

@@ -1,3 +1,5 @@
+// The scanner of command arguments and font files: separators, comments, quoted tokens and
+// terminators, with the end of the text thrown as a failure.
 #include "tokenizer.h"
 #include <cstdlib>
 #include <cstring>

@@ -1,3 +1,7 @@
+// The canvas of a visual window.
+//
+//   lines and rectangles   plain, tiled and nine-patch materials, faded by the window
+//   text                   one quad per character, colour tags, texts of many lines, measuring
 #include "ui_canvas.h"
 #include "qordebug.h"
 #include "ui_debug.h"

@@ -1,3 +1,11 @@
+// The desktop.
+//
+//   construction and destruction
+//   hit test and pointer input   the window under the pointer, press, click, double click, drag
+//   keys and wheel               the active window, then the subscribers
+//   activation                   the stack of active windows, hiding and deleting
+//   frames                       deferred deletion, update, draw, the stats page's figures
+//   layouts and helpers          export, grid rounding, window paths
 #include "ui_desktop.h"
 #include "engine_interfaces.h"
 #include "qor_platform.h"

@@ -1,3 +1,5 @@
+// Charsets read from "nehe" files (a square grid of character cells and their widths) and the
+// fonts that draw them at a size with a material.
 #include "ui_font.h"
 #include "qorbase.h"
 #include "qordebug.h"

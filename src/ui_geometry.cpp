@@ -1,3 +1,4 @@
+// Regions under size constraints, their point test, and the names of alignments.
 #include "ui_geometry.h"
 #include <cstring>
 

@@ -1,3 +1,5 @@
+// The library's loggers: named loggers of the engine's log manager, with a prefix, narrow and wide
+// formatting and three levels.
 #include "ui_logger.h"
 #include "engine_interfaces.h"
 #include "qor_log.h"

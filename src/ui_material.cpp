@@ -1,3 +1,5 @@
+// Materials: the engine's material handle over the render bridge, the texture's part and size,
+// the nine-patch borders, clones, and their layout tables with and without presets.
 #include "ui_material.h"
 #include "LuaTableIterator.h"
 #include "engine_interfaces.h"

@@ -1,3 +1,5 @@
+// The render bridge: desktop pixels to the engine's device coordinates, clip areas, 2D frames
+// with 3D views inside them, and the figures of each frame.
 #include "ui_render.h"
 #include "engine_interfaces.h"
 #include "qor_commands.h"

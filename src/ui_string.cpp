@@ -1,3 +1,5 @@
+// Strings of 16-bit units: construction from narrow UTF-8 and wide text with their contracts,
+// the conversion back to UTF-8, insertion, and the removal of tags.
 #include "ui_string.h"
 #include "ui_debug.h"
 

@@ -1,3 +1,10 @@
+// The text buffer: lines of CString with their fonts, a caret that may stand one line past the
+// end, editing, trimming to the line limit, and the events the owner window gets.
+//
+//   reading              lines, fonts and the caret's line
+//   settings             caret, editability, line mode, the limit, clearing
+//   editing              insertion, breaks, deletion, caret movement
+//   lines and the owner  appending, deleting and trimming lines; events to the owner
 #include "ui_text.h"
 #include "ui_debug.h"
 #include "ui_window.h"

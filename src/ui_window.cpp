@@ -1,3 +1,11 @@
+// The window tree.
+//
+//   construction and destruction   the default handlers; a subtree goes with its window
+//   sending, routing, filtering    dispatch types, the filters of hidden and disabled windows
+//   handlers                       the default behaviour of each event
+//   tree, flags, geometry          attaching, the front, lookup; alignment and maximising
+//   persistence                    layout tables, children by their numbers, import
+//   the factory                    class names to creators
 #include "ui_window.h"
 #include "LuaTableIterator.h"
 #include "engine_interfaces.h"

@@ -1,3 +1,12 @@
+// The visual window.
+//
+//   construction and destruction
+//   resources                      materials and fonts, fonts looked up from visual ancestors
+//   margins and the client area
+//   pointer state, drawing, filtering
+//   effects                        fades, movement, auto hide
+//   sounds                         sources by event, played and stopped, loaded and saved
+//   layouts, texts in layouts      the visual keys; local strings and lines with fonts
 #include "ui_window_visual.h"
 #include "LuaTableIterator.h"
 #include "engine_interfaces.h"

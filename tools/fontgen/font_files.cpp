@@ -1,3 +1,5 @@
+// The font generator's files: the colour argument, the "nehe" description, the TGA texture and
+// the lines of "fonts.lua".
 #include "font_files.h"
 
 #include <cctype>

@@ -1,3 +1,5 @@
+// The font generator's model: the list of character codes, and the square grid of cells the
+// glyphs are laid out in, with their places and drawn widths.
 #include "font_grid.h"
 
 #include <algorithm>

@@ -1,3 +1,4 @@
+// Glyphs of a TrueType face rasterised by FreeType into cells of the font's grid.
 #include "glyph_raster.h"
 
 #include <fstream>
