@@ -1,3 +1,4 @@
+// The one test host of the test program and the data folders it runs on.
 #include "test_host.h"
 
 #include "qorbase.h"
