@@ -129,9 +129,7 @@ void *steady_allocation(size_t _size) {
 
 } // namespace
 
-void *qor_malloc(size_t _size) {
-    return g_route(_size);
-}
+void *qor_malloc(size_t _size) { return g_route(_size); }
 
 void *qor_calloc(size_t _count, size_t _size) {
     if (_size && _count > SIZE_MAX / _size) return nullptr;
@@ -178,17 +176,13 @@ void qor_small_free(void *_p) {
     g_mm.small_free(_p);
 }
 
-int qor_get_memory_status(SMMHeapStats *_p_out) {
-    return g_module ? g_mm.get_memory_status(_p_out) : 0;
-}
+int qor_get_memory_status(SMMHeapStats *_p_out) { return g_module ? g_mm.get_memory_status(_p_out) : 0; }
 
 int qor_get_stats_for_modules(SMMHeapStats *_p_out, int _max) {
     return g_module ? g_mm.get_stats_for_modules(_p_out, _max) : -1;
 }
 
-int qor_get_memory_block_status(void const *_p) {
-    return g_module ? g_mm.get_memory_block_status(_p) : 0;
-}
+int qor_get_memory_block_status(void const *_p) { return g_module ? g_mm.get_memory_block_status(_p) : 0; }
 
 bool qor_check_memory_corrupt() {
     if (!g_module) return false;
@@ -196,9 +190,7 @@ bool qor_check_memory_corrupt() {
     return true;
 }
 
-int qor_heap_id() {
-    return g_heap;
-}
+int qor_heap_id() { return g_heap; }
 
 // ---------------------------------------------------------------------------------------------
 // Fixed pools
@@ -275,33 +267,13 @@ void SPool::add_block() {
 // LuaJIT allocate as they always do.
 // ---------------------------------------------------------------------------------------------
 
-void *operator new(size_t _size) {
-    return qorui::qor_malloc(_size);
-}
-void *operator new[](size_t _size) {
-    return qorui::qor_malloc(_size);
-}
-void *operator new(size_t _size, std::nothrow_t const &) noexcept {
-    return qorui::qor_malloc(_size);
-}
-void *operator new[](size_t _size, std::nothrow_t const &) noexcept {
-    return qorui::qor_malloc(_size);
-}
-void operator delete(void *_p) noexcept {
-    qorui::qor_free(_p);
-}
-void operator delete[](void *_p) noexcept {
-    qorui::qor_free(_p);
-}
-void operator delete(void *_p, size_t) noexcept {
-    qorui::qor_free(_p);
-}
-void operator delete[](void *_p, size_t) noexcept {
-    qorui::qor_free(_p);
-}
-void operator delete(void *_p, std::nothrow_t const &) noexcept {
-    qorui::qor_free(_p);
-}
-void operator delete[](void *_p, std::nothrow_t const &) noexcept {
-    qorui::qor_free(_p);
-}
+void *operator new(size_t _size) { return qorui::qor_malloc(_size); }
+void *operator new[](size_t _size) { return qorui::qor_malloc(_size); }
+void *operator new(size_t _size, std::nothrow_t const &) noexcept { return qorui::qor_malloc(_size); }
+void *operator new[](size_t _size, std::nothrow_t const &) noexcept { return qorui::qor_malloc(_size); }
+void operator delete(void *_p) noexcept { qorui::qor_free(_p); }
+void operator delete[](void *_p) noexcept { qorui::qor_free(_p); }
+void operator delete(void *_p, size_t) noexcept { qorui::qor_free(_p); }
+void operator delete[](void *_p, size_t) noexcept { qorui::qor_free(_p); }
+void operator delete(void *_p, std::nothrow_t const &) noexcept { qorui::qor_free(_p); }
+void operator delete[](void *_p, std::nothrow_t const &) noexcept { qorui::qor_free(_p); }

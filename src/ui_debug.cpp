@@ -11,8 +11,8 @@ void report_contract(char const *_expression, char const *_message, char const *
         qordebug::assert_func("Expression:   %s\n%s\nFile: %s \nLine: %d\nFunction %s", _expression, _message,
                               _file, _line, _function);
     else
-        qordebug::assert_func("Expression:   %s, \nFile: %s \nLine: %d\nFunction %s", _expression, _file,
-                              _line, _function);
+        qordebug::assert_func("Expression:   %s, \nFile: %s \nLine: %d\nFunction %s", _expression, _file, _line,
+                              _function);
 }
 
 } // namespace qorui

@@ -18,9 +18,7 @@ struct SPooledItem : CPooled<SPooledItem, 4> {
     char m_payload[24];
 };
 
-SFixedPool &item_pool() {
-    return *SPooledItem::m_pool.mp_pool;
-}
+SFixedPool &item_pool() { return *SPooledItem::m_pool.mp_pool; }
 
 // The record of this library's heap in the manager's statistics.
 SMMHeapStats heap_stats() {
@@ -45,8 +43,7 @@ TEST(PooledAllocation, BlocksComeOnePerNElementsAndHandOutRisingAddresses) {
     uint32_t const used = item_pool().m_used;
 
     SPooledItem *items[5];
-    for (int i = 0; i < 4; ++i)
-        items[i] = new SPooledItem;
+    for (int i = 0; i < 4; ++i) items[i] = new SPooledItem;
     EXPECT_EQ(blocks + 1, item_pool().m_blocks); // four takes: one block
     for (int i = 1; i < 4; ++i)
         EXPECT_EQ(reinterpret_cast<char *>(items[i - 1]) + item_pool().m_element_size,
@@ -60,8 +57,7 @@ TEST(PooledAllocation, BlocksComeOnePerNElementsAndHandOutRisingAddresses) {
     EXPECT_EQ(items[2], again);
     EXPECT_EQ(blocks + 2, item_pool().m_blocks);
     items[2] = again;
-    for (SPooledItem *p : items)
-        delete p;
+    for (SPooledItem *p : items) delete p;
     EXPECT_EQ(used, item_pool().m_used);
 }
 
@@ -104,20 +100,17 @@ TEST(Realloc, FollowsTheFiveRules) {
     EXPECT_EQ(block, qor_msize(p));
     EXPECT_EQ(p, qor_realloc(p, block)); // still fits
 
-    for (int i = 0; i < 40; ++i)
-        p[i] = static_cast<char>(i);
+    for (int i = 0; i < 40; ++i) p[i] = static_cast<char>(i);
     char *q = static_cast<char *>(qor_realloc(p, 1 << 20)); // grows, in place or moved
     ASSERT_NE(nullptr, q);
-    for (int i = 0; i < 40; ++i)
-        ASSERT_EQ(static_cast<char>(i), q[i]);
+    for (int i = 0; i < 40; ++i) ASSERT_EQ(static_cast<char>(i), q[i]);
     EXPECT_GE(qor_msize(q), size_t(1) << 20);
     qor_free(q);
 }
 
 TEST(Realloc, CallocZeroFills) {
     unsigned char *p = static_cast<unsigned char *>(qor_calloc(16, 8));
-    for (int i = 0; i < 128; ++i)
-        ASSERT_EQ(0, p[i]);
+    for (int i = 0; i < 128; ++i) ASSERT_EQ(0, p[i]);
     qor_free(p);
 }
 
@@ -149,8 +142,7 @@ TEST(Routing, StatusWrappersAnswerOnceLoaded) {
 }
 
 TEST(ManagerLoading, MissingManagerEndsTheProcessWithItsMessage) {
-    qortest::SChildResult const result =
-        qortest::run_child("mm_probe", {"QOR_MM_LIBRARY=libqorNoSuchManager.so"});
+    qortest::SChildResult const result = qortest::run_child("mm_probe", {"QOR_MM_LIBRARY=libqorNoSuchManager.so"});
     EXPECT_EQ(1, result.m_exit_code);
     EXPECT_NE(std::string::npos, result.m_output.find("MemoryManager: libqorMemoryManager.so load error!"))
         << result.m_output;
@@ -159,8 +151,8 @@ TEST(ManagerLoading, MissingManagerEndsTheProcessWithItsMessage) {
 
 TEST(ManagerLoading, MissingEntryPointNamesTheFirstInLookupOrder) {
     // The incomplete manager lacks "MMExpand" and "MMSmallFree"; Expand comes first.
-    qortest::SChildResult const result = qortest::run_child(
-        "mm_probe", {"QOR_MM_LIBRARY=" + qortest::bin_dir() + "/libqorIncompleteManager.so"});
+    qortest::SChildResult const result =
+        qortest::run_child("mm_probe", {"QOR_MM_LIBRARY=" + qortest::bin_dir() + "/libqorIncompleteManager.so"});
     EXPECT_EQ(1, result.m_exit_code);
     EXPECT_NE(std::string::npos,
               result.m_output.find("qorMemoryManager error: libqorMemoryManager.so load error!\nCannot find "
