@@ -17,6 +17,8 @@ void for_each_entry(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
 void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
 // A number, truncated toward zero.
 void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
+// Only a number with no fraction: any other number leaves the value as well.
+void read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
 void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value);
 void read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value);
 

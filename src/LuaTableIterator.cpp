@@ -12,6 +12,11 @@ void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value
     if (value.IsNumber()) _value = static_cast<int>(value.GetNumber());
 }
 
+void read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
+    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
+    if (value.IsInteger()) _value = value.GetInteger();
+}
+
 void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
     if (value.IsNumber()) _value = value.GetFloat();
