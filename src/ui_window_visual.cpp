@@ -567,9 +567,10 @@ void CWindowVisual::load_movement(LuaPlus::LuaObject const &_lo_movement) {
 
 namespace {
 
-// The local string of a key, else the key's own text.
-CString local_or_own(char const *_p_key) {
-    IUserInterface *p_ui = engine_interfaces().get_user_interface(false);
+// The local string of a key, else the key's own text. A required service that is missing is a
+// critical error.
+CString local_or_own(char const *_p_key, bool _required = false) {
+    IUserInterface *p_ui = engine_interfaces().get_user_interface(_required);
     unsigned short const *p_local = p_ui ? p_ui->get_local_string(_p_key) : nullptr;
     return p_local ? CString(p_local, -1) : CString(_p_key, -1);
 }
@@ -607,6 +608,20 @@ void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, C
         for (int line = std::max(before - 1, 0); line <= after - 2; ++line)
             _text.set_string_font(static_cast<unsigned>(line), p_font);
     });
+}
+
+// ---------------------------------------------------------------------------------------------
+// Text events
+// ---------------------------------------------------------------------------------------------
+
+// EVENT_SET_TEXT does the work, also a derived class's.
+void CWindowVisual::forward_set_str(CWndEvent const *_p_event) {
+    _p_event->rewind();
+    string key;
+    *_p_event >> key;
+    CWndEvent set_text(EVENT_SET_TEXT);
+    set_text << static_cast<wstring const &>(local_or_own(key.c_str(), true));
+    send_event(this, &set_text, CWndEvent::DISPATCH_NONE);
 }
 
 } // namespace qorui
