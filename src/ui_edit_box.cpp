@@ -37,8 +37,8 @@ struct SKeyAction {
 };
 
 SKeyAction const k_key_actions[] = {
-    {KEY_BACK, &CText::on_back_space}, {KEY_RETURN, &CText::on_new_line}, {KEY_END, &CText::on_end},
-    {KEY_HOME, &CText::on_home},       {KEY_LEFT, &CText::on_caret_left}, {KEY_UP, &CText::on_caret_up},
+    {KEY_BACK, &CText::on_back_space},   {KEY_RETURN, &CText::on_new_line}, {KEY_END, &CText::on_end},
+    {KEY_HOME, &CText::on_home},         {KEY_LEFT, &CText::on_caret_left}, {KEY_UP, &CText::on_caret_up},
     {KEY_RIGHT, &CText::on_caret_right}, {KEY_DOWN, &CText::on_caret_down}, {KEY_INSERT, &CText::on_insert},
     {KEY_DELETE, &CText::on_delete},
 };
@@ -336,8 +336,9 @@ void CEditBox::on_event_draw(CWndEvent const *_p_event) {
     int const bar_w = p_bar ? p_bar->get_w() : 0;
     float const scroll = p_bar ? p_bar->get_position() : 0.0f;
     m_canvas.set_clip_area(m_left_margin, 0, get_w() - bar_w - m_right_margin - m_left_margin, get_h());
-    m_canvas.text_out(m_text_offset.x + m_left_margin, m_text_offset.y + m_top_margin + static_cast<int>(-scroll),
-                      m_line_interval, m_text, get_font(FNT_NAME_DEFAULT));
+    m_canvas.text_out(m_text_offset.x + m_left_margin,
+                      m_text_offset.y + m_top_margin + static_cast<int>(-scroll), m_line_interval, m_text,
+                      get_font(FNT_NAME_DEFAULT));
 }
 
 // ---------------------------------------------------------------------------------------------

@@ -49,7 +49,8 @@ protected:
     }
     // A layout of the box with these keys.
     void load(std::string const &_keys) {
-        lua_machine().DoString(("edit_probe = { name = 'edit', class_name = 'EditBox', " + _keys + " }").c_str());
+        lua_machine().DoString(
+            ("edit_probe = { name = 'edit', class_name = 'EditBox', " + _keys + " }").c_str());
         LuaPlus::LuaObject table = lua_machine().GetGlobals().GetByName("edit_probe");
         mp_box->load_state(table);
     }
@@ -72,9 +73,9 @@ TEST_F(EditBoxTest, KeysEditTheTextAndPlaceTheCaret) {
         char const *mp_text;
         int m_x, m_y;
     } const rows[] = {
-        {8, "ab|d", 4, 20},   {13, "ab|c|d", 4, 38}, {35, "ab|cd", 22, 20}, {36, "ab|cd", 4, 20},
-        {37, "ab|cd", 4, 20}, {38, "ab|cd", 13, 2},  {39, "ab|cd", 22, 20}, {40, "ab|cd", 12, 20},
-        {45, "ab|cd", 12, 20}, {46, "ab|c", 12, 20}, {65, "ab|cd", 12, 20},
+        {8, "ab|d", 4, 20},    {13, "ab|c|d", 4, 38}, {35, "ab|cd", 22, 20}, {36, "ab|cd", 4, 20},
+        {37, "ab|cd", 4, 20},  {38, "ab|cd", 13, 2},  {39, "ab|cd", 22, 20}, {40, "ab|cd", 12, 20},
+        {45, "ab|cd", 12, 20}, {46, "ab|c", 12, 20},  {65, "ab|cd", 12, 20},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_key);
@@ -240,9 +241,9 @@ TEST_F(EditBoxTest, SetStrWithoutALocalStringShowsTheKey) {
 // Keys of the wrong type or with unknown names leave the fields as they were.
 TEST_F(EditBoxTest, LayoutKeysLoadOnlyWithTheirTypes) {
     load("text = { { string = 'hi' } }, text_alignment = 'ALIGNMENT_CENTER', "
-                              "auto_scroll = true, scroll_speed = 0.5, is_scrollable_v = true");
+         "auto_scroll = true, scroll_speed = 0.5, is_scrollable_v = true");
     load("text = 'no', text_alignment = 'CENTER', auto_scroll = 1, scroll_speed = 'x', "
-                              "is_scrollable_v = 'no', is_scrollable_h = true");
+         "is_scrollable_v = 'no', is_scrollable_h = true");
     EXPECT_EQ("hi|", text());
     EXPECT_TRUE(mp_box->get_scrollable_v());
     EXPECT_TRUE(mp_box->get_scrollable_h());
