@@ -19,6 +19,8 @@ void for_each_entry(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
 bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
 // A number, truncated toward zero.
 bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
+// Only a number with no fraction: any other number leaves the value as well.
+bool read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
 bool read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value);
 bool read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value);
 // A string that is one of the names of g_alignment_names.

@@ -11,6 +11,7 @@ namespace qorui {
 
 class CFont;
 class CMaterial;
+class CStaticText;
 class CString;
 class CText;
 
@@ -64,6 +65,9 @@ public:
     void set_left_margin(int _margin);
     void set_right_margin(int _margin);
     void set_uniform_margins(int _margin);
+
+    // A new static text child named _name, placed on _area, showing _text.
+    CStaticText *make_static_text(CString const &_text, CRectArea const &_area, char const *_name);
 
     // Effects
     float get_transparency() const override { return m_transparency; }

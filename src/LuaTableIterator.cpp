@@ -16,6 +16,13 @@ bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value
     return true;
 }
 
+bool read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
+    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
+    if (!value.IsInteger()) return false;
+    _value = value.GetInteger();
+    return true;
+}
+
 bool read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
     if (!value.IsNumber()) return false;

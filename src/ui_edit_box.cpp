@@ -47,24 +47,6 @@ int const k_caret_w = 3;
 int const k_caret_h = 14;
 int const k_scroll_bar_size = 16;
 
-uint32_t now() {
-    return qorplatform::get_tick_count();
-}
-
-void set_dispatch(CWndEvent const *_p_event, CWndEvent::EDispatchType _type) {
-    _p_event->set_dispatch_type(_type);
-}
-
-// A plain rectangle of one colour, owned by the caller.
-CMaterial *create_colour_material(IWindowDesktop *_p_desktop, rgba_t const &_colour) {
-    if (!QOR_CHECK(_p_desktop)) return nullptr;
-    CMaterial *p_material = _p_desktop->create_material();
-    if (!QOR_CHECK(p_material)) return nullptr;
-    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
-    p_material->set_color(_colour);
-    return p_material;
-}
-
 } // namespace
 
 // ---------------------------------------------------------------------------------------------
@@ -76,7 +58,7 @@ CMaterial *create_colour_material(IWindowDesktop *_p_desktop, rgba_t const &_col
 CCaret::CCaret(IWindowDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_last_blink(0), m_blink_time(500) {
     add_material(MAT_NAME_NORMAL, nullptr);
-    add_material(MAT_NAME_CHECKED, create_colour_material(_p_desktop, rgba_t(120, 120, 120, 150)));
+    add_material(MAT_NAME_CHECKED, create_color_material(_p_desktop, rgba_t(120, 120, 120, 150)));
     set_passive(true);
 }
 
@@ -84,7 +66,7 @@ CCaret::CCaret(IWindowDesktop *_p_desktop, char const *_name)
 // is unsigned, so the tick's wrap does no harm.
 void CCaret::on_event_update(CWndEvent const *_p_event) {
     CWindowVisual::on_event_update(_p_event);
-    uint32_t const tick = now();
+    uint32_t const tick = qorplatform::get_tick_count();
     if (tick - m_last_blink < m_blink_time) return;
     m_is_checked = !m_is_checked;
     m_last_blink = tick;
@@ -94,7 +76,7 @@ void CCaret::on_event_update(CWndEvent const *_p_event) {
 void CCaret::on_event_changed(CWndEvent const *_p_event) {
     CWindowVisual::on_event_changed(_p_event);
     m_is_checked = true;
-    m_last_blink = now();
+    m_last_blink = qorplatform::get_tick_count();
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -188,7 +170,7 @@ void CEditBox::on_event_key_down(CWndEvent const *_p_event) {
         if (entry.m_key != key) continue;
         (m_text.*entry.m_action)();
         set_real_caret_pos();
-        set_dispatch(_p_event, CWndEvent::DISPATCH_NONE);
+        _p_event->set_dispatch_type(CWndEvent::DISPATCH_NONE);
         return;
     }
 }
@@ -203,7 +185,7 @@ void CEditBox::on_event_char(CWndEvent const *_p_event) {
     if (!std::iswprint(ch)) return;
     m_text.insert(ch, false);
     set_real_caret_pos();
-    set_dispatch(_p_event, CWndEvent::DISPATCH_NONE);
+    _p_event->set_dispatch_type(CWndEvent::DISPATCH_NONE);
 }
 
 void CEditBox::on_event_set_text(CWndEvent const *_p_event) {
@@ -262,7 +244,7 @@ void CEditBox::on_event_page_down(CWndEvent const *) {
 void CEditBox::on_event_update(CWndEvent const *_p_event) {
     CWindowVisual::on_event_update(_p_event);
     if (!m_auto_scroll || m_is_hidden) return;
-    uint32_t const tick = now();
+    uint32_t const tick = qorplatform::get_tick_count();
     if (m_last_update != 0 && mp_scroll_bar_vert) {
         mp_scroll_bar_vert->set_small_step(static_cast<float>(tick - m_last_update) * m_scroll_speed);
         on_event_line_down(nullptr);

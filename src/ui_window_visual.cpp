@@ -7,8 +7,10 @@
 #include "ui_debug.h"
 #include "ui_font.h"
 #include "ui_interfaces.h"
+#include "ui_local_strings.h"
 #include "ui_logger.h"
 #include "ui_material.h"
+#include "ui_static_text.h"
 #include "ui_string.h"
 #include "ui_text.h"
 
@@ -180,6 +182,16 @@ void CWindowVisual::on_child_attached() {
         CWindowVisual const *p_va = as_visual(p_a), *p_vb = as_visual(p_b);
         return p_va && p_vb && p_va->m_z_order > p_vb->m_z_order;
     });
+}
+
+CStaticText *CWindowVisual::make_static_text(CString const &_text, CRectArea const &_area,
+                                             char const *_name) {
+    CStaticText *p_text = new CStaticText(mp_desktop, _name);
+    attach_child(p_text);
+    p_text->set_pos(_area.x, _area.y);
+    p_text->set_size(_area.w, _area.h);
+    p_text->set_text(_text);
+    return p_text;
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -565,21 +577,9 @@ void CWindowVisual::load_movement(LuaPlus::LuaObject const &_lo_movement) {
 // Texts in layouts
 // ---------------------------------------------------------------------------------------------
 
-namespace {
-
-// The local string of a key, else the key's own text. A required service that is missing is a
-// critical error.
-CString local_or_own(char const *_p_key, bool _required = false) {
-    IUserInterface *p_ui = engine_interfaces().get_user_interface(_required);
-    unsigned short const *p_local = p_ui ? p_ui->get_local_string(_p_key) : nullptr;
-    return p_local ? CString(p_local, -1) : CString(_p_key, -1);
-}
-
-} // namespace
-
 void CWindowVisual::load_string(LuaPlus::LuaObject &_lo_table, char const *_key, CString &_string) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsString()) _string = local_or_own(value.GetString());
+    if (value.IsString()) _string = local_string_or_key(value.GetString(), false);
 }
 
 void CWindowVisual::save_string(LuaPlus::LuaObject &_lo_table, char const *_key, CString const &_string) {
@@ -594,7 +594,7 @@ void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, C
     for_each_entry(lines, [&](LuaPlus::LuaObject const &, LuaPlus::LuaObject const &entry) {
         if (!entry.IsTable() || !entry.GetByName("string").IsString()) return;
         int const before = static_cast<int>(_text.get_num_strings());
-        _text.insert_str(local_or_own(entry.GetByName("string").GetString()).c_str(), false);
+        _text.insert_str(local_string_or_key(entry.GetByName("string").GetString(), false).c_str(), false);
         LuaPlus::LuaObject const font = entry.GetByName("font");
         if (!font.IsString()) return;
         static HUID const string_font("STRING_FONT");
@@ -620,7 +620,7 @@ void CWindowVisual::forward_set_str(CWndEvent const *_p_event) {
     string key;
     *_p_event >> key;
     CWndEvent set_text(EVENT_SET_TEXT);
-    set_text << static_cast<wstring const &>(local_or_own(key.c_str(), true));
+    set_text << static_cast<wstring const &>(local_string_or_key(key.c_str(), true));
     send_event(this, &set_text, CWndEvent::DISPATCH_NONE);
 }
 

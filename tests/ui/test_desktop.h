@@ -27,6 +27,7 @@ public:
     qorui::CMaterial *create_material() override { return new CBridgeMaterial(mp_render); }
     qorui::IRender *get_render() override { return mp_render; }
     qorui::point_t get_pointer_pos() override { return m_pointer_pos; }
+    qorui::CMaterial *get_material(qorui::HUID const &) override { return nullptr; } // it has none
 
     qorui::IRender *mp_render = nullptr; // the bridge of create_material
     qorui::point_t m_pointer_pos{0, 0};
