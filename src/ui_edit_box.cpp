@@ -94,18 +94,10 @@ CEditBox::CEditBox(IWindowDesktop *_p_desktop, char const *_name)
     set_real_caret_pos();
     m_text.set_owner(this);
 
-    typedef void (CEditBox::*handler_t)(CWndEvent const *);
-    static struct {
-        EEventType m_id;
-        handler_t m_handler;
-    } const handlers[] = {
-        {EVENT_LINE_UP, &CEditBox::on_event_line_up},
-        {EVENT_LINE_DOWN, &CEditBox::on_event_line_down},
-        {EVENT_PAGE_UP, &CEditBox::on_event_page_up},
-        {EVENT_PAGE_DOWN, &CEditBox::on_event_page_down},
-    };
-    for (auto const &entry : handlers)
-        register_callback(entry.m_id, CEventCallback(this, entry.m_handler));
+    register_callback(EVENT_LINE_UP, CEventCallback(this, &CEditBox::on_event_line_up));
+    register_callback(EVENT_LINE_DOWN, CEventCallback(this, &CEditBox::on_event_line_down));
+    register_callback(EVENT_PAGE_UP, CEventCallback(this, &CEditBox::on_event_page_up));
+    register_callback(EVENT_PAGE_DOWN, CEventCallback(this, &CEditBox::on_event_page_down));
     send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
 }
 
