@@ -105,6 +105,9 @@ protected:
 
     // The opacity of this frame: the parent's, times the running fade.
     void calculate_transparency();
+    // The narrow string of an EVENT_SET_STR, as the local string of that key or as it stands when
+    // there is none, sent to the window itself as EVENT_SET_TEXT.
+    void forward_set_str(CWndEvent const *_p_event);
 
 public:
     // An entry of the material and font maps.

@@ -4,7 +4,6 @@
 #include "LuaTableIterator.h"
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
-#include "ui_local_strings.h"
 #include "ui_text.h"
 
 namespace qorui {
@@ -50,12 +49,7 @@ void CStaticText::on_event_set_text(CWndEvent const *_p_event) {
 // so that the set-text handler of a derived class does the work.
 void CStaticText::on_event_set_str(CWndEvent const *_p_event) {
     CWindowVisual::on_event_set_str(_p_event);
-    _p_event->rewind();
-    string key;
-    *_p_event >> key;
-    CWndEvent set_text(EVENT_SET_TEXT);
-    set_text << static_cast<wstring const &>(local_string_or_key(key.c_str(), true));
-    send_event(this, &set_text, CWndEvent::DISPATCH_NONE);
+    forward_set_str(_p_event);
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -94,10 +88,8 @@ void CStaticText::save_state(LuaPlus::LuaObject &_lo_table) {
 void CStaticText::load_state(LuaPlus::LuaObject &_lo_table) {
     CWindowVisual::load_state(_lo_table);
     load_string(_lo_table, "text", m_text);
-    string name;
-    read_string(_lo_table, "text_alignment", name);
     EAlignment alignment;
-    if (find_alignment(name.c_str(), alignment)) set_text_alignment(alignment);
+    if (read_alignment(_lo_table, "text_alignment", alignment)) set_text_alignment(alignment);
 }
 
 } // namespace qorui

@@ -610,4 +610,18 @@ void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, C
     });
 }
 
+// ---------------------------------------------------------------------------------------------
+// Text events
+// ---------------------------------------------------------------------------------------------
+
+// EVENT_SET_TEXT does the work, also a derived class's.
+void CWindowVisual::forward_set_str(CWndEvent const *_p_event) {
+    _p_event->rewind();
+    string key;
+    *_p_event >> key;
+    CWndEvent set_text(EVENT_SET_TEXT);
+    set_text << static_cast<wstring const &>(local_string_or_key(key.c_str(), true));
+    send_event(this, &set_text, CWndEvent::DISPATCH_NONE);
+}
+
 } // namespace qorui
