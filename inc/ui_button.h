@@ -17,7 +17,7 @@ class CButton : public CWindowVisual {
 public:
     // Passive: a press on the button activates the window that holds it.
     CButton(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CButton() {}
+    virtual ~CButton();
 
     QOR_CLASS_ID(CButton, CWindowVisual, "Button")
 
@@ -38,7 +38,7 @@ class CCheckBox : public CWindowVisual {
 public:
     // A 16 by 16 checker; not passive, so a check box can be the active window.
     CCheckBox(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CCheckBox() {}
+    virtual ~CCheckBox();
 
     QOR_CLASS_ID(CCheckBox, CWindowVisual, "CheckBox")
 
@@ -70,7 +70,7 @@ private:
 class CRadioButton : public CCheckBox {
 public:
     CRadioButton(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CRadioButton() {}
+    virtual ~CRadioButton();
 
     QOR_CLASS_ID(CRadioButton, CCheckBox, "RadioButton")
 

@@ -11,7 +11,7 @@ class CStaticText : public CWindowVisual {
 public:
     // Passive, left aligned, empty; a slot for the normal material that holds none.
     CStaticText(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CStaticText() {}
+    virtual ~CStaticText();
 
     QOR_CLASS_ID(CStaticText, CWindowVisual, "StaticText")
 

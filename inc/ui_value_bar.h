@@ -16,7 +16,7 @@ class CButton;
 class CValueBar : public CWindowVisual {
 public:
     CValueBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CValueBar() {}
+    virtual ~CValueBar();
 
     QOR_CLASS_ID(CValueBar, CWindowVisual, "ValueBar")
 
@@ -58,7 +58,7 @@ protected:
 class CProgressBar : public CValueBar {
 public:
     CProgressBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CProgressBar() {}
+    virtual ~CProgressBar();
 
     QOR_CLASS_ID(CProgressBar, CValueBar, "ProgressBar")
 
@@ -69,7 +69,7 @@ protected:
 class CScrollBar : public CValueBar {
 public:
     CScrollBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CScrollBar() {}
+    virtual ~CScrollBar();
 
     QOR_CLASS_ID(CScrollBar, CValueBar, "ScrollBar")
 

@@ -23,6 +23,10 @@ CButton::CButton(IWindowDesktop *_p_desktop, char const *_name) : CWindowVisual(
     set_passive(true);
 }
 
+// Destructors stay in the library, so that a program that builds these windows can't lend them
+// its own deletion.
+CButton::~CButton() {}
+
 // The pushed font wins over the checked one even when the window has no pushed font; the plain
 // button font and then the default font stand in for a missing one.
 CFont *CButton::choose_font() {
@@ -72,6 +76,8 @@ void CButton::load_state(LuaPlus::LuaObject &_lo_table) {
 
 CCheckBox::CCheckBox(IWindowDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_checker_w(16), m_checker_h(16), m_just_clicked(false) {}
+
+CCheckBox::~CCheckBox() {}
 
 void CCheckBox::set_checker_size(int _w, int _h) {
     m_checker_w = _w;
@@ -136,6 +142,8 @@ void CCheckBox::load_state(LuaPlus::LuaObject &_lo_table) {
 // ---------------------------------------------------------------------------------------------
 
 CRadioButton::CRadioButton(IWindowDesktop *_p_desktop, char const *_name) : CCheckBox(_p_desktop, _name) {}
+
+CRadioButton::~CRadioButton() {}
 
 // The group is read at the moment of the click: every radio button under the same parent, derived
 // classes included; check boxes and other windows are left alone. A button that is on stays on.

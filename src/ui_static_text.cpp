@@ -25,6 +25,10 @@ CStaticText::CStaticText(IWindowDesktop *_p_desktop, char const *_name)
     set_passive(true);
 }
 
+// Destructors stay in the library, so that a program that builds these windows can't lend them
+// its own deletion.
+CStaticText::~CStaticText() {}
+
 void CStaticText::set_text_alignment(EAlignment _alignment) {
     m_text_alignment = _alignment;
     send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);

@@ -32,6 +32,10 @@ CValueBar::CValueBar(IWindowDesktop *_p_desktop, char const *_name)
     add_material(MAT_NAME_NORMAL, create_color_material(mp_desktop, rgba_t(52, 52, 52, 50)));
 }
 
+// Destructors stay in the library, so that a program that builds these windows can't lend them
+// its own deletion.
+CValueBar::~CValueBar() {}
+
 // Written so that a NaN fails the comparisons and takes the bound: the invariant holds for any value.
 void CValueBar::clamp_position() {
     if (!(m_position >= m_min)) m_position = m_min;
@@ -108,6 +112,8 @@ CProgressBar::CProgressBar(IWindowDesktop *_p_desktop, char const *_name) : CVal
     set_passive(true);
 }
 
+CProgressBar::~CProgressBar() {}
+
 // The fill always grows from the left, whatever the orientation; its height is the bar size less
 // the margins.
 void CProgressBar::on_event_draw(CWndEvent const *_p_event) {
@@ -150,6 +156,8 @@ CScrollBar::CScrollBar(IWindowDesktop *_p_desktop, char const *_name)
     register_callback(EVENT_SCROLL_LARGE_STEP, CEventCallback(this, &CScrollBar::on_event_scroll_large_step));
     set_passive(true);
 }
+
+CScrollBar::~CScrollBar() {}
 
 // Each button owns a clone of the desktop's material, so the desktop's can change or go.
 CButton *CScrollBar::add_button(char const *_name, HUID const &_normal, HUID const &_highlighted,
@@ -328,13 +336,19 @@ void CScrollBar::on_event_button_scroller_drag_begin(CWndEvent const *) {
 // The movement counts only while the pointer stands on the side it moves to, measured from where
 // it took hold of the scroller: a pointer that ran past the end of the track has no effect on its
 // way back until it reaches the grab point again. One pixel of movement is the range over the track.
+//
+// The scroller's own drag handler has run before this one and moved it by the movement. The grab
+// point belongs to the scroller where the layout put it, so that movement is taken off again:
+// measured from the moved scroller, a pointer that holds the scroller where it took hold of it
+// would stand exactly on the grab point after every step, and no movement towards the minimum
+// would ever count.
 void CScrollBar::on_event_button_scroller_drag(CWndEvent const *_p_event) {
     _p_event->rewind();
     point_t movement{0, 0};
     *_p_event >> movement;
     int const moved = along(movement);
     int const pointer = along(get_pointer_pos_in(this));
-    int const grab = along(mp_button_scroller->get_pos()) + along(m_drag_offset);
+    int const grab = along(mp_button_scroller->get_pos()) - moved + along(m_drag_offset);
     float delta = 0.0f;
     if ((moved > 0 && pointer >= grab) || (moved < 0 && pointer < grab)) {
         int const track = get_track_length();

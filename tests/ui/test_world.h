@@ -4,11 +4,14 @@
 // draw, and a frame is compared with a checked-in golden picture.
 #pragma once
 #include "qor_platform.h"
+#include "recording_renderer.h"
 #include "software_renderer.h"
 #include "ui_desktop.h"
 #include "ui_render.h"
 
+#include <initializer_list>
 #include <string>
+#include <vector>
 
 namespace qortest {
 
@@ -46,16 +49,38 @@ public:
 
     // One frame: update, then draw into a frame cleared to a dark grey.
     void frame();
+
+    // What the last frame drew, in desktop pixels and in order: clip areas ("clip") and quads
+    // ("quad"), each quad with the handle of the material set for it and its first corner's colour.
+    struct SDrawn {
+        std::string m_op;
+        qorui::CRectArea m_rect;
+        int m_handle;
+        rgba_t m_colour;
+    };
+    std::vector<SDrawn> drawn() const;
+    // The clip areas of the last frame as "x,y wxh", in order, joined by "; ".
+    std::string clips() const;
+    // The quads of the last frame in the font's material: the characters it drew, in order.
+    std::vector<qorui::CRectArea> glyphs(qorui::CFont *_p_font) const;
     // The last frame against tests/golden/<_name>.png.
     void expect_golden(char const *_name);
 
 private:
     qorplatform::CManualClock m_clock{10000};
     qorhost::CSoftwareRenderer m_renderer;
+    qorhost::CRecordingRenderer m_recorder{&m_renderer}; // the calls of the last frame
     qorui::CRender m_render;
     qorui::CDesktop *mp_desktop = nullptr;
     float m_x, m_y; // where the desktop has the pointer, fractions included
 };
+
+// The enumerator's name of an event, "EVENT_CLICK"; the number for a gap.
+std::string event_name(qorui::EEventType _id);
+// From now on, the name of each of the events that reaches _p_wnd goes to _log, behind the window's
+// own handlers; _log must outlive the window.
+void log_events(qorui::CWindow *_p_wnd, std::initializer_list<qorui::EEventType> _ids,
+                std::vector<std::string> &_log);
 
 // _actual against tests/golden/<_name>.png with a tolerance of 2 per channel; a difference image
 // and the actual picture are kept in a temporary folder named in the failure. With
