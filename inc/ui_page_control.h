@@ -26,7 +26,7 @@ public:
     };
 
     CPageControl(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CPageControl() {}
+    virtual ~CPageControl();
 
     QOR_CLASS_ID(CPageControl, CWindowVisual, "PageControl")
 

@@ -41,6 +41,10 @@ CPageControl::CPageControl(IWindowDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_active_page_idx(-1), m_tab_w(64), m_tab_h(32), m_tabs_interval(8),
       m_tabs_pages_interval(8), m_tabs_orientation(TABS_HORIZONTAL), m_tabs_alignment(ALIGNMENT_LEFT) {}
 
+// The destructor stays in the library, so that a program that builds a page control can't lend it
+// its own deletion.
+CPageControl::~CPageControl() {}
+
 // ---------------------------------------------------------------------------------------------
 // Pages
 // ---------------------------------------------------------------------------------------------

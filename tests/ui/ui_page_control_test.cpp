@@ -1,6 +1,7 @@
 // The page control through the desktop's input path: switching by tab clicks and by show events
-// from anywhere, disabled pages, the layout of both orientations, contract reports, and a layout
-// that goes out and comes back into an empty desktop.
+// from anywhere, disabled pages, the order of a switch's events, what is drawn, the layout of both
+// orientations, contract reports, a deleted page, and a layout that goes out and comes back into an
+// empty desktop.
 #include "ui_page_control.h"
 
 #include "engine_interfaces.h"
@@ -8,6 +9,8 @@
 #include "test_support.h"
 #include "test_world.h"
 #include "ui_button.h"
+#include "ui_font.h"
+#include "ui_material.h"
 
 #include <gtest/gtest.h>
 
@@ -24,10 +27,16 @@ char const *const k_names[] = {"video", "audio", "keys"};
 class CProbe : public CPageControl {
 public:
     using CPageControl::CPageControl;
-    using CPageControl::m_active_page_idx;
-    using CPageControl::m_pages;
     using CPageControl::m_tabs;
     using CPageControl::on_event_tab_click;
+    // What get_active_page answers while the active index is _idx.
+    CWindowVisual *active_page_at(int _idx) {
+        int const kept = m_active_page_idx;
+        m_active_page_idx = _idx;
+        CWindowVisual *p_page = get_active_page();
+        m_active_page_idx = kept;
+        return p_page;
+    }
 };
 
 class PageControlTest : public ::testing::Test {
@@ -50,8 +59,11 @@ protected:
     void send(int _page, EEventType _id) {
         m_world.desktop().send_event(m_pages[_page], _id, CWndEvent::DISPATCH_NONE);
     }
-    // Page _shown alone is visible and its tab alone checked; -1: none is shown (and the tab of a
-    // disabled page keeps its checked state).
+    static std::vector<int> rect_of(CWindow *_p_wnd) {
+        return {_p_wnd->get_pos().x, _p_wnd->get_pos().y, _p_wnd->get_w(), _p_wnd->get_h()};
+    }
+    // Page _shown alone is visible and its tab alone checked; -1: none is shown, and the tabs are
+    // not looked at (the tab of a disabled active page stays checked).
     void expect_shown(int _shown, char const *_when) {
         SCOPED_TRACE(_when);
         for (int i = 0; i < (int)m_pages.size(); ++i) {
@@ -142,7 +154,29 @@ TEST_F(PageControlTest, ATabSizeActsOnLaterTabsWhileThePagesFollowItAtOnce) {
     EXPECT_EQ(274, m_tabs[4]->get_pos().x); // + 50 + 8: each tab moves on by its own width
 }
 
-TEST(PageControlLayout, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem) {
+// Tabs in their built-in looks, the checked one lighter; of the pages, only the shown one.
+TEST_F(PageControlTest, TheTabsAndOnlyTheShownPageAreDrawn) {
+    m_pages[0]->add_material(MAT_NAME_NORMAL, m_world.colour(200, 0, 0));
+    m_pages[1]->add_material(MAT_NAME_NORMAL, m_world.colour(210, 0, 0));
+    click_tab(1);
+    m_world.move_to(0, 0);
+    m_world.clock().advance_ms(1000); // past every fade
+    m_world.frame();
+    m_world.frame();
+    int const glyph =
+        m_world.desktop().get_font(FNT_NAME_DEFAULT)->get_char_material('A')->get_material_handle();
+    std::vector<std::string> quads;
+    for (auto const &drawn : m_world.drawn())
+        if (drawn.m_op == "quad" && drawn.m_handle != glyph)
+            quads.push_back(std::to_string(drawn.m_rect.x) + "," + std::to_string(drawn.m_rect.y) + " " +
+                            std::to_string(drawn.m_colour.r) + "/" + std::to_string(drawn.m_colour.a));
+    EXPECT_EQ((std::vector<std::string>{"10,20 52/100", "10,60 210/255", "82,20 125/120", "154,20 52/100"}),
+              quads);
+}
+
+// One control through the rows in turn: each row sets everything that its layout depends on, but
+// an unknown orientation lays nothing out and leaves the layout of the row before.
+TEST_F(PageControlTest, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem) {
     struct {
         char const *m_case;
         int m_orientation;
@@ -152,34 +186,21 @@ TEST(PageControlLayout, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem)
         int m_page[4]; // x, y, w, h
     } const rows[] = {
         {"horizontal", 0, ALIGNMENT_LEFT, 0, 8, {0, 72, 144}, {0, 0, 0}, {0, 40, 300, 160}},
+        {"orientation 2: none", 2, ALIGNMENT_LEFT, 5, 4, {0, 72, 144}, {0, 0, 0}, {0, 40, 300, 160}},
         {"horizontal, bottom ignored", 0, ALIGNMENT_BOTTOM, 5, 8, {5, 77, 149}, {5, 5, 5}, {5, 45, 290, 150}},
         {"vertical", 1, ALIGNMENT_RIGHT, 0, 8, {0, 0, 0}, {0, 40, 80}, {72, 0, 228, 200}},
         // 200 - (32 + 4) * 3 - 5
         {"vertical at the bottom", 1, ALIGNMENT_BOTTOM, 5, 4, {5, 5, 5}, {87, 123, 159}, {77, 5, 218, 190}},
-        {"orientation 2: none", 2, ALIGNMENT_LEFT, 5, 4, {0, 72, 144}, {0, 0, 0}, {0, 40, 300, 160}},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_case);
-        qortest::CWorld world;
-        CPageControl *p_control =
-            world.place(&world.desktop(), new CPageControl(&world.desktop(), "options"), 10, 20, 300, 200);
-        qor_vector<CWindowVisual *> pages;
-        for (char const *p_name : k_names)
-            pages.push_back(p_control->add_page(p_name));
-        p_control->set_tabs_orientation(static_cast<CPageControl::ETabsOrientation>(row.m_orientation));
-        p_control->set_tabs_alignment(row.m_alignment);
-        p_control->set_tabs_interval(row.m_tabs_interval);
-        p_control->set_uniform_margins(row.m_margin);
+        mp_control->set_tabs_orientation(static_cast<CPageControl::ETabsOrientation>(row.m_orientation));
+        mp_control->set_tabs_alignment(row.m_alignment);
+        mp_control->set_tabs_interval(row.m_tabs_interval);
+        mp_control->set_uniform_margins(row.m_margin);
         for (int i = 0; i < 3; ++i) {
-            CWindow *p_tab = p_control->get_child(k_names[i], "Button", true);
-            EXPECT_EQ(row.m_tab_x[i], p_tab->get_pos().x) << i;
-            EXPECT_EQ(row.m_tab_y[i], p_tab->get_pos().y) << i;
-            EXPECT_EQ(64, p_tab->get_w());
-            EXPECT_EQ(32, p_tab->get_h());
-            EXPECT_EQ((std::vector<int>(row.m_page, row.m_page + 4)),
-                      (std::vector<int>{pages[i]->get_pos().x, pages[i]->get_pos().y, pages[i]->get_w(),
-                                        pages[i]->get_h()}))
-                << i;
+            EXPECT_EQ((std::vector<int>{row.m_tab_x[i], row.m_tab_y[i], 64, 32}), rect_of(m_tabs[i])) << i;
+            EXPECT_EQ((std::vector<int>(row.m_page, row.m_page + 4)), rect_of(m_pages[i])) << i;
         }
     }
 }
@@ -195,31 +216,12 @@ TEST_F(PageControlTest, BrokenContractsAreReportedAndChangeNothing) {
         {"_idx >= 0 && _idx < (int)m_pages.size()", [this] { mp_control->set_active_page(3); }},
         {"_idx >= 0 && _idx < (int)m_pages.size()", [this] { mp_control->set_active_page(-1); }},
         {"idx != -1", [this] { m_world.click_at(2, 2); }},
-        {"_p_event && _p_event->get_receiver()",
-         [this] {
-             CWndEvent click(EVENT_CLICK);
-             mp_control->on_event_tab_click(&click);
-         }},
+        {"_p_event && _p_event->get_receiver()", [this] { mp_control->on_event_tab_click(nullptr); }},
         {"m_active_page_idx >= 0 && m_active_page_idx < (int)m_pages.size()",
-         [this] {
-             mp_control->m_active_page_idx = 7;
-             EXPECT_EQ(nullptr, mp_control->get_active_page());
-             mp_control->m_active_page_idx = 0;
-         }},
+         [this] { EXPECT_EQ(nullptr, mp_control->active_page_at(7)); }},
         {"m_pages.size() == m_tabs.size()",
-         [this] {
-             mp_control->m_tabs.push_back(nullptr);
-             mp_control->set_active_page(1);
-             mp_control->m_tabs.pop_back();
-         }},
-        {"p_tab",
-         [this] {
-             mp_control->m_tabs.push_back(nullptr);
-             mp_control->m_pages.push_back(nullptr);
-             mp_control->set_tabs_interval(8);
-             mp_control->m_tabs.pop_back();
-             mp_control->m_pages.pop_back();
-         }},
+         [this] { mp_control->m_tabs.push_back(nullptr), mp_control->set_active_page(1); }},
+        {"p_tab", [this] { mp_control->m_tabs.push_back(nullptr), mp_control->set_tabs_interval(8); }},
     };
     for (auto const &row : rows) {
         qortest::CReportCapture capture;
@@ -228,6 +230,7 @@ TEST_F(PageControlTest, BrokenContractsAreReportedAndChangeNothing) {
         ASSERT_FALSE(reports.empty()) << row.m_expression;
         EXPECT_EQ(0u, reports[0].find(std::string("Expression:   ") + row.m_expression + ", \n"))
             << reports[0];
+        mp_control->m_tabs.resize(m_tabs.size()); // the pairs in step again
         expect_shown(0, row.m_expression);
     }
 }
