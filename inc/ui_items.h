@@ -122,6 +122,12 @@ public:
     // without that column or without a line in it reports and sorts as an empty text.
     void sort_by_column(unsigned int _col, ESortOrder _order = SORT_ASCENDING);
 
+    // Grows with every change of the rows (added, inserted, removed, reordered, loaded), not with
+    // the marks: a view that derives something from all rows, such as the height of the tallest,
+    // works it out again only when this has moved. A row changed in place by its own load_state
+    // isn't counted.
+    unsigned int get_revision() const { return m_revision; }
+
     // Persistence, as CItem's. Loading replaces every row; a value that isn't a table reports
     // and leaves the rows as they are.
     void save_state(LuaPlus::LuaObject &_lo_table, CWindowVisual *_p_desktop);
@@ -131,6 +137,7 @@ private:
     qor_vector<CItem *> m_items; // display order; owned
     int m_selected_idx;          // -1 for none
     int m_checked_idx;           // -1 for none
+    unsigned int m_revision;     // changes of the rows so far; wraps around
 };
 
 } // namespace qorui

@@ -138,6 +138,8 @@ void CCheckBox::on_event_draw(CWndEvent const *_p_event) {
                           p_font);
 }
 
+// The label isn't a layout key: the code that builds a box names it, as a dialog names the captions
+// of its buttons; a layout that wants text beside a box places a static text there.
 void CCheckBox::save_state(LuaPlus::LuaObject &_lo_table) {
     CWindowVisual::save_state(_lo_table);
     _lo_table.SetNumber("checker_w", m_checker_w);

@@ -118,7 +118,7 @@ void CItem::load_columns(LuaPlus::LuaObject &_lo_table, CWindowVisual *_p_deskto
 // CItems: rows
 // ---------------------------------------------------------------------------------------------
 
-CItems::CItems() : m_selected_idx(-1), m_checked_idx(-1) {}
+CItems::CItems() : m_selected_idx(-1), m_checked_idx(-1), m_revision(0) {}
 
 CItems::~CItems() {
     remove_all();
@@ -132,6 +132,7 @@ CItem *CItems::get(unsigned int _idx) const {
 unsigned int CItems::add(CItem *_p_item) {
     if (!QOR_CHECK(_p_item)) return static_cast<unsigned int>(-1);
     m_items.push_back(_p_item);
+    ++m_revision;
     return get_count() - 1;
 }
 
@@ -139,6 +140,7 @@ void CItems::insert(CItem *_p_item, unsigned int _idx) {
     if (!QOR_CHECK(_p_item)) return;
     if (!QOR_CHECK(_idx < m_items.size())) _idx = get_count();
     m_items.insert(m_items.begin() + _idx, _p_item);
+    ++m_revision;
 }
 
 void CItems::remove(unsigned int _idx) {
@@ -146,11 +148,13 @@ void CItems::remove(unsigned int _idx) {
     m_selected_idx = -1;
     delete m_items[_idx];
     m_items.erase(m_items.begin() + _idx);
+    ++m_revision;
 }
 
 void CItems::remove_all() {
     m_selected_idx = -1;
     m_checked_idx = -1;
+    ++m_revision;
     while (!m_items.empty()) {
         delete m_items.back();
         m_items.pop_back();
@@ -244,6 +248,7 @@ void CItems::sort_by_column(unsigned int _col, ESortOrder _order) {
     std::stable_sort(entries.begin(), entries.end(), _order == SORT_DESCENDING ? key_greater : key_less);
     for (size_t i = 0; i < entries.size(); ++i)
         m_items[i] = entries[i].mp_item;
+    ++m_revision;
     m_selected_idx = -1;
     m_checked_idx = -1;
 }

@@ -136,50 +136,18 @@ std::vector<CRectArea> CWorld::glyphs(CFont *_p_font) const {
 }
 
 std::string event_name(EEventType _id) {
-    static char const *const names[] = {"EVENT_UPDATE",
-                                        "EVENT_DRAW",
-                                        "EVENT_HIDE",
-                                        "EVENT_SHOW",
-                                        "EVENT_SHOW_MAXIMIZED",
-                                        "EVENT_SHOW_NORMAL",
-                                        "EVENT_ACTIVATE",
-                                        "EVENT_DEACTIVATE",
-                                        "EVENT_LOST_FOCUS",
-                                        "EVENT_ENABLE",
-                                        "EVENT_DISABLE",
-                                        "EVENT_RESIZE",
-                                        "EVENT_RESIZED",
-                                        "EVENT_DRAG_BEGIN",
-                                        "EVENT_DRAG",
-                                        "EVENT_DRAG_END",
-                                        "EVENT_REPORT_POINT_INSIDE",
-                                        "EVENT_POINTER_ENTER",
-                                        "EVENT_POINTER_EXIT",
-                                        "EVENT_POINTER_MOVE",
-                                        "EVENT_POINTER_POS",
-                                        "EVENT_POINTER_DOWN",
-                                        "EVENT_POINTER_UP",
-                                        "EVENT_WHEEL_ROTATED",
-                                        "EVENT_CLICK",
-                                        "EVENT_DOUBLE_CLICK",
-                                        "EVENT_CHANGED",
-                                        "EVENT_SET_TEXT",
-                                        "EVENT_SET_STR",
-                                        nullptr,
-                                        nullptr,
-                                        "EVENT_KEY_DOWN",
-                                        "EVENT_KEY_UP",
-                                        "EVENT_CHAR",
-                                        "EVENT_LINE_UP",
-                                        "EVENT_LINE_DOWN",
-                                        "EVENT_PAGE_UP",
-                                        "EVENT_PAGE_DOWN",
-                                        "EVENT_SCROLL_SMALL_STEP",
-                                        "EVENT_SCROLL_LARGE_STEP",
-                                        "EVENT_CHECKED",
-                                        "EVENT_UNCHECKED",
-                                        "EVENT_HIGHLIGHTED",
-                                        "EVENT_RESOURCE_INVALIDATE"};
+    // clang-format off
+    static char const *const names[] = {
+        "EVENT_UPDATE", "EVENT_DRAW", "EVENT_HIDE", "EVENT_SHOW", "EVENT_SHOW_MAXIMIZED", "EVENT_SHOW_NORMAL",
+        "EVENT_ACTIVATE", "EVENT_DEACTIVATE", "EVENT_LOST_FOCUS", "EVENT_ENABLE", "EVENT_DISABLE",
+        "EVENT_RESIZE", "EVENT_RESIZED", "EVENT_DRAG_BEGIN", "EVENT_DRAG", "EVENT_DRAG_END",
+        "EVENT_REPORT_POINT_INSIDE", "EVENT_POINTER_ENTER", "EVENT_POINTER_EXIT", "EVENT_POINTER_MOVE",
+        "EVENT_POINTER_POS", "EVENT_POINTER_DOWN", "EVENT_POINTER_UP", "EVENT_WHEEL_ROTATED", "EVENT_CLICK",
+        "EVENT_DOUBLE_CLICK", "EVENT_CHANGED", "EVENT_SET_TEXT", "EVENT_SET_STR", nullptr, nullptr,
+        "EVENT_KEY_DOWN", "EVENT_KEY_UP", "EVENT_CHAR", "EVENT_LINE_UP", "EVENT_LINE_DOWN", "EVENT_PAGE_UP",
+        "EVENT_PAGE_DOWN", "EVENT_SCROLL_SMALL_STEP", "EVENT_SCROLL_LARGE_STEP", "EVENT_CHECKED",
+        "EVENT_UNCHECKED", "EVENT_HIGHLIGHTED", "EVENT_RESOURCE_INVALIDATE"};
+    // clang-format on
     size_t const index = static_cast<size_t>(_id);
     if (index < sizeof(names) / sizeof(names[0]) && names[index]) return names[index];
     return std::to_string(index);

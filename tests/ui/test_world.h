@@ -1,7 +1,8 @@
 // One world for the library's tests: a desktop of its own on the host's software renderer, with
 // the default fonts of the data folder and a clock that the test holds. Input goes through the
 // desktop as the engine's would (pointer moves, presses, keys, characters), frames are update and
-// draw, and a frame is compared with a checked-in golden picture.
+// draw, the calls of the last frame are recorded on their way to the renderer, and a frame is
+// compared with a checked-in golden picture.
 #pragma once
 #include "qor_platform.h"
 #include "recording_renderer.h"
