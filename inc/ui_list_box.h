@@ -71,6 +71,9 @@ private:
     struct SRowSpan;
 
     // Layout
+    // Stores a value that the layout depends on and lays the list out again.
+    template <class TValue>
+    void relayout(TValue &_field, TValue _value);
     int get_header_h() const { return m_show_columns ? m_columns_h : 0; }
     int get_rows_top() const { return m_top_margin + get_header_h(); }
     int get_row_pitch() { return get_item_height() + m_item_spacing; }

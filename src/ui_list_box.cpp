@@ -58,6 +58,13 @@ CListBox::CListBox(IWindowDesktop *_p_desktop, char const *_name)
 // its own deletion.
 CListBox::~CListBox() {}
 
+// Every change of the layout is sent, also one to the same value.
+template <class TValue>
+void CListBox::relayout(TValue &_field, TValue _value) {
+    _field = _value;
+    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+}
+
 unsigned int CListBox::add_column() {
     m_columns.push_back(SColumn{CString(), 0});
     send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
@@ -65,9 +72,7 @@ unsigned int CListBox::add_column() {
 }
 
 void CListBox::set_column_w(unsigned int _idx, int _w) {
-    if (!QOR_CHECK(_idx < m_columns.size())) return;
-    m_columns[_idx].m_w = _w;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    if (QOR_CHECK(_idx < m_columns.size())) relayout(m_columns[_idx].m_w, _w);
 }
 
 void CListBox::set_column_title(unsigned int _idx, CString const &_title) {
@@ -75,23 +80,19 @@ void CListBox::set_column_title(unsigned int _idx, CString const &_title) {
 }
 
 void CListBox::set_item_height(int _h) {
-    m_custom_item_height = _h;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_custom_item_height, _h);
 }
 
 void CListBox::set_item_icon_size(int _size) {
-    m_item_icon_size = _size;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_item_icon_size, _size);
 }
 
 void CListBox::set_columns_h(int _h) {
-    m_columns_h = _h;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_columns_h, _h);
 }
 
 void CListBox::show_columns(bool _show) {
-    m_show_columns = _show;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_show_columns, _show);
 }
 
 int CListBox::get_right_margin() const {
@@ -224,24 +225,23 @@ void CListBox::on_event_key_down(CWndEvent const *_p_event) {
     _p_event->rewind();
     int key = 0;
     *_p_event >> key;
-    static struct {
-        int m_key;
-        EEventType m_step;
-        int m_direction;
-    } const steps[] = {{k_vk_up, EVENT_SCROLL_SMALL_STEP, -1},
-                       {k_vk_down, EVENT_SCROLL_SMALL_STEP, 1},
-                       {k_vk_page_up, EVENT_SCROLL_LARGE_STEP, -1},
-                       {k_vk_page_down, EVENT_SCROLL_LARGE_STEP, 1}};
-    auto const step = std::find_if(std::begin(steps), std::end(steps),
-                                   [key](decltype(steps[0]) &_step) { return _step.m_key == key; });
-    if (step != std::end(steps))
-        send_scroll_step(step->m_step, step->m_direction);
-    else if (key == k_vk_home || key == k_vk_end) {
-        if (!mp_scroll_bar_vert->is_hidden())
-            mp_scroll_bar_vert->set_position(key == k_vk_home ? mp_scroll_bar_vert->get_min()
-                                                              : mp_scroll_bar_vert->get_max());
-    } else
+    CScrollBar *p_bar = mp_scroll_bar_vert;
+    switch (key) {
+    case k_vk_up:
+    case k_vk_down:
+        send_scroll_step(EVENT_SCROLL_SMALL_STEP, key == k_vk_up ? -1 : 1);
+        break;
+    case k_vk_page_up:
+    case k_vk_page_down:
+        send_scroll_step(EVENT_SCROLL_LARGE_STEP, key == k_vk_page_up ? -1 : 1);
+        break;
+    case k_vk_home:
+    case k_vk_end:
+        if (!p_bar->is_hidden()) p_bar->set_position(key == k_vk_home ? p_bar->get_min() : p_bar->get_max());
+        break;
+    default:
         return;
+    }
     _p_event->set_dispatch_type(CWndEvent::DISPATCH_NONE);
 }
 

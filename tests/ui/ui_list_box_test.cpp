@@ -215,6 +215,7 @@ TEST_F(ListBoxTest, TheSelectedRowFollowsThePointerAndAClickChecksIt) {
         {"a click on the checked row", CLICK, 100, 75, 2, 2, {"EVENT_CLICK"}},
         {"below the last row", MOVE, 100, 120, 2, 2, {}},
         {"into the left margin", MOVE, 22, 40, 2, 2, {}},
+        {"into the right margin", MOVE, 217, 40, 2, 2, {}},
         {"out of the list", MOVE, 300, 40, -1, 2, {}},
         {"back in below the rows", MOVE, 100, 120, -1, 2, {}},
         {"a click with no row under the pointer", CLICK, 100, 120, -1, 2, {"EVENT_CLICK"}},
@@ -245,26 +246,35 @@ TEST_F(ListBoxTest, OnTheSpacingBetweenRowsTheRowAboveIsSelected) {
 
 // The checked mark over the selected one, both as wide as the rows' clip and 2 more on each side;
 // the checked row in the checked font, unless checks aren't shown: then neither shows, though a
-// click still checks.
+// click still checks. The body keeps its normal look under the pointer and while pressed.
 TEST_F(ListBoxTest, TheMarksAndTheCheckedFontShowOnlyWhileChecksAreAllowed) {
     mp_list->add_font(FNT_NAME_CHECKED, get_fonts_factory().create("courier", &m_world.desktop()));
-    fill(3);
+    mp_list->add_material(MAT_NAME_NORMAL, m_world.colour(5, 0, 0));
+    mp_list->add_material(MAT_NAME_HIGHLIGHTED, m_world.colour(6, 0, 0));
+    mp_list->add_material(MAT_NAME_PUSHED, m_world.colour(7, 0, 0));
+    events_t events;
+    qortest::log_events(mp_list, {EVENT_CHECKED}, events);
     for (bool const allowed : {true, false}) {
         SCOPED_TRACE(allowed);
         load(allowed ? "allow_check_items = true" : "allow_check_items = false");
-        events_t events;
-        qortest::log_events(mp_list, {EVENT_CHECKED}, events);
+        mp_list->get_items().remove_all();
+        fill(3);
+        events.clear();
         m_world.click_at(100, 35);
         m_world.move_to(100, 75);
+        m_world.press(); // held through the frame
         m_world.frame();
-        EXPECT_EQ(allowed ? events_t{"EVENT_CHECKED"} : events_t{}, events); // the first pass checked it
+        EXPECT_EQ(events_t{"EVENT_CHECKED"}, events);
         EXPECT_EQ(0, mp_list->get_items().get_checked_idx());
+        EXPECT_EQ("20,30 200x108", quads_of_red(5));
+        EXPECT_EQ("", quads_of_red(6) + quads_of_red(7));
         EXPECT_EQ("22,74 196x20", quads_of_red(1)); // the bar is hidden
         EXPECT_EQ(allowed ? "22,34 196x20" : "", quads_of_red(2));
         EXPECT_EQ(allowed ? std::set<int>{34} : std::set<int>{},
                   line_tops(mp_list->get_font(FNT_NAME_CHECKED)));
         EXPECT_EQ(allowed ? (std::set<int>{54, 74}) : (std::set<int>{34, 54, 74}),
                   line_tops(font(FNT_NAME_DEFAULT)));
+        m_world.release();
     }
 }
 
