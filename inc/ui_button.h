@@ -24,6 +24,11 @@ public:
     virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
     virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
 
+    // The part of a control that wears the desktop's look for it: a clone of each of the desktop's
+    // materials _normal, _highlighted and _pushed becomes the button's own normal, highlighted and
+    // pushed material, so the desktop's can change or go. One the desktop lacks is left out.
+    void dress_from_desktop(HUID const &_normal, HUID const &_highlighted, HUID const &_pushed);
+
     // The caption; owners assign it directly.
     CString m_text;
 

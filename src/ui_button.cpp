@@ -4,6 +4,7 @@
 #include "LuaTableIterator.h"
 #include "qorscriptsystem.h"
 #include "ui_logger.h"
+#include "ui_material.h"
 
 namespace qorui {
 
@@ -26,6 +27,18 @@ CButton::CButton(IWindowDesktop *_p_desktop, char const *_name) : CWindowVisual(
 // Destructors stay in the library, so that a program that builds these windows can't lend them
 // its own deletion.
 CButton::~CButton() {}
+
+void CButton::dress_from_desktop(HUID const &_normal, HUID const &_highlighted, HUID const &_pushed) {
+    if (!mp_desktop) return;
+    struct {
+        HUID const &m_own;
+        HUID const &m_desktops;
+    } const looks[] = {
+        {MAT_NAME_NORMAL, _normal}, {MAT_NAME_HIGHLIGHTED, _highlighted}, {MAT_NAME_PUSHED, _pushed}};
+    for (auto const &look : looks)
+        if (CMaterial *p_material = mp_desktop->get_material(look.m_desktops))
+            add_material(look.m_own, p_material->clone());
+}
 
 // The pushed font wins over the checked one even when the window has no pushed font; the plain
 // button font and then the default font stand in for a missing one.

@@ -159,21 +159,12 @@ CScrollBar::CScrollBar(IWindowDesktop *_p_desktop, char const *_name)
 
 CScrollBar::~CScrollBar() {}
 
-// Each button owns a clone of the desktop's material, so the desktop's can change or go.
 CButton *CScrollBar::add_button(char const *_name, HUID const &_normal, HUID const &_highlighted,
                                 HUID const &_pushed) {
     CButton *p_button = new CButton(mp_desktop, _name);
     attach_child(p_button);
     p_button->set_size(m_bar_size, m_bar_size);
-    if (!mp_desktop) return p_button;
-    struct {
-        HUID const &m_own;
-        HUID const &m_desktops;
-    } const looks[] = {
-        {MAT_NAME_NORMAL, _normal}, {MAT_NAME_HIGHLIGHTED, _highlighted}, {MAT_NAME_PUSHED, _pushed}};
-    for (auto const &look : looks)
-        if (CMaterial *p_material = mp_desktop->get_material(look.m_desktops))
-            p_button->add_material(look.m_own, p_material->clone());
+    p_button->dress_from_desktop(_normal, _highlighted, _pushed);
     return p_button;
 }
 
