@@ -37,8 +37,8 @@ public:
     void render_view(IRenderCamera *) override {}
     void finish_view() override {}
     void present() override {}
-    int create_material(char const *, char const *, char const *, char const *, char const *, char const *, bool,
-                        bool) override {
+    int create_material(char const *, char const *, char const *, char const *, char const *, char const *,
+                        bool, bool) override {
         return m_next_handle++;
     }
     void destroy_material(int) override {}
@@ -46,9 +46,9 @@ public:
     void begin_2d() override { m_vertices.clear(); }
     void end_2d() override {}
     void set_material(int _handle) override { m_material = _handle; }
-    void draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const &_c0, vec2_t const &_p1, vec2_t const &_t1,
-                   rgba_t const &_c1, vec2_t const &_p2, vec2_t const &_t2, rgba_t const &_c2, vec2_t const &_p3,
-                   vec2_t const &_t3, rgba_t const &_c3) override {
+    void draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const &_c0, vec2_t const &_p1,
+                   vec2_t const &_t1, rgba_t const &_c1, vec2_t const &_p2, vec2_t const &_t2,
+                   rgba_t const &_c2, vec2_t const &_p3, vec2_t const &_t3, rgba_t const &_c3) override {
         if (m_vertices.size() + 4 > m_vertices.capacity()) return; // never grows inside a frame
         m_vertices.push_back(SVertex{_p0, _t0, _c0});
         m_vertices.push_back(SVertex{_p1, _t1, _c1});

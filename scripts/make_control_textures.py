@@ -131,9 +131,14 @@ BODY = rounded(0, 0, 16, 16, 3.5)
 INNER = rounded(1, 1, 15, 15, 2.5)
 
 
+# The centre of a nine-patch repeats, so the body is flat with a lighter top rim and a darker
+# bottom rim inside its edge: the bevel stays in the corners and edges.
 def body(state):
     s = STATES[state]
-    return Picture().fill(BODY, s["edge"]).shade(INNER, s["top"], s["bottom"])
+    middle = tuple((a + b) // 2 for a, b in zip(s["top"], s["bottom"]))
+    picture = Picture().fill(BODY, s["edge"]).fill(INNER, middle)
+    picture.fill(lambda px, py: 1 <= py <= 3 and INNER(px, py), s["top"])
+    return picture.fill(lambda px, py: 13 <= py <= 15 and INNER(px, py), s["bottom"])
 
 
 def buttons():
@@ -145,7 +150,8 @@ def scrollers():
     for state in ("", "_highlighted", "_pushed"):
         s = STATES[state]
         grip = (s["edge"][0], s["edge"][1], s["edge"][2], 200)
-        picture = Picture().fill(rounded(2, 0, 14, 16, 4), s["edge"]).shade(rounded(3, 1, 13, 15, 3), s["top"], s["bottom"])
+        middle = tuple((a + b) // 2 for a, b in zip(s["top"], s["bottom"]))
+        picture = Picture().fill(rounded(2, 0, 14, 16, 4), s["edge"]).fill(rounded(3, 1, 13, 15, 3), middle)
         picture.fill(lambda px, py: 5 <= px <= 11 and (6.5 <= py <= 7.5 or 8.5 <= py <= 9.5), grip)
         picture.save("scroller%s.tga" % state)
 

@@ -111,8 +111,11 @@ CFont *CWindowVisual::get_font(HUID const &_id) {
         p_ancestor = as_visual(p_wnd);
     if (!p_ancestor) return nullptr;
     CFont *p_font = p_ancestor->get_font(_id);
-    auto &entry = m_fonts.emplace(_id, SResource<CFont>{_id, nullptr, false}).first->second;
-    if (!entry.m_owned) entry.mp_resource = p_font;
+    // A font looked up before has its entry already: no new node in a steady frame.
+    if (found == m_fonts.end())
+        m_fonts.emplace(_id, SResource<CFont>{_id, p_font, false});
+    else if (!found->second.m_owned)
+        found->second.mp_resource = p_font;
     return p_font;
 }
 

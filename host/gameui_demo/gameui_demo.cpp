@@ -94,7 +94,8 @@ CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
 }
 
 // Materials of a window by state, from presets; null names are skipped.
-void dress(CDesktop *_p_desktop, CWindowVisual *_p_wnd, std::initializer_list<std::pair<HUID, char const *>> _looks) {
+void dress(CDesktop *_p_desktop, CWindowVisual *_p_wnd,
+           std::initializer_list<std::pair<HUID, char const *>> _looks) {
     for (auto const &look : _looks)
         if (look.second) _p_wnd->add_material(look.first, preset(_p_desktop, look.second));
 }
@@ -107,8 +108,8 @@ TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int 
     return _p_wnd;
 }
 
-CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption, int _x,
-                     int _y) {
+CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
+                     int _x, int _y) {
     CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
     dress(_p_desktop, p_button,
           {{MAT_NAME_NORMAL, "button_normal"},
@@ -154,8 +155,8 @@ void dress_desktop_for_scroll_bars(CDesktop *_p_desktop) {
 }
 
 // A dialog-like window: a title bar to drag it by, over a body of the given size.
-CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, int _x, int _y, int _w,
-                           int _h) {
+CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, int _x, int _y,
+                           int _w, int _h) {
     CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, _w, _h);
     p_dialog->set_can_drag(true);
     p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
@@ -181,8 +182,21 @@ void make_message_dialog(CDesktop *_p_desktop, char const *_name, char const *_t
     make_button(_p_desktop, p_dialog, "cancel", "Cancel", 234, 150);
 }
 
+// A scroll bar made by code has parts of no size: square step buttons as thick as the bar and a
+// scroller _length long.
+void size_parts(CScrollBar *_p_bar, int _length) {
+    for (CButton *p_button : {_p_bar->get_button_min(), _p_bar->get_button_max()})
+        p_button->set_size(16, 16);
+    if (_p_bar->get_horizontal())
+        _p_bar->get_button_scroller()->set_size(_length, 16);
+    else
+        _p_bar->get_button_scroller()->set_size(16, _length);
+    _p_bar->set_scroller_for_position();
+}
+
 // The everyday controls: a check box, a radio group, a scroll bar with its value, a progress bar
-// and an edit box with a vertical scroll bar.
+// and an edit box. (An edit box saves neither its text nor whether it has a scroll bar, so the
+// scene keeps to what its layout brings back.)
 void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     CWindowVisual *p_dialog = make_dialog(_p_desktop, "controls", "Controls", _x, _y, 420, 330);
     make_checker<CCheckBox>(_p_desktop, p_dialog, "subtitles", "Subtitles", "checker", 16, 40);
@@ -200,14 +214,14 @@ void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     CScrollBar *p_volume = place(p_dialog, new CScrollBar(_p_desktop, "volume"), 90, 106, 310, 16);
     p_volume->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "bar_track"));
     dress(_p_desktop, p_volume->get_button_min(),
-          {{MAT_NAME_NORMAL, "arrow_left"}, {MAT_NAME_HIGHLIGHTED, "arrow_left_highlighted"},
+          {{MAT_NAME_NORMAL, "arrow_left"},
+           {MAT_NAME_HIGHLIGHTED, "arrow_left_highlighted"},
            {MAT_NAME_PUSHED, "arrow_left_pushed"}});
     dress(_p_desktop, p_volume->get_button_max(),
-          {{MAT_NAME_NORMAL, "arrow_right"}, {MAT_NAME_HIGHLIGHTED, "arrow_right_highlighted"},
+          {{MAT_NAME_NORMAL, "arrow_right"},
+           {MAT_NAME_HIGHLIGHTED, "arrow_right_highlighted"},
            {MAT_NAME_PUSHED, "arrow_right_pushed"}});
-    for (CButton *p_button : {p_volume->get_button_min(), p_volume->get_button_max()})
-        p_button->set_size(16, 16);
-    p_volume->get_button_scroller()->set_size(40, 16);
+    size_parts(p_volume, 40);
     p_volume->set_max(100);
     p_volume->set_position(70);
 
@@ -220,8 +234,6 @@ void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     CEditBox *p_notes = place(p_dialog, new CEditBox(_p_desktop, "notes"), 16, 166, 388, 110);
     p_notes->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
     p_notes->set_uniform_margins(4);
-    p_notes->set_scrollable_v(true);
-    if (CWindow *p_bar = p_notes->get_child("scroll bar vert", nullptr, true)) p_bar->set_w(16);
 
     make_button(_p_desktop, p_dialog, "apply", "Apply", 294, 288);
 }
