@@ -38,6 +38,9 @@ ui_material_presets = {
     -- Value bars: the track and the filled part of a progress bar.
     bar_track = { material_template = "ui_color", color = { r = 16, g = 20, b = 28, a = 220 } },
     progress = { material_template = "ui_color", color = { r = 110, g = 196, b = 132, a = 230 } },
+    -- Lists: the row under the pointer and the chosen row.
+    row_under_pointer = { material_template = "ui_color", color = { r = 78, g = 100, b = 140, a = 160 } },
+    row_chosen = { material_template = "ui_color", color = { r = 236, g = 186, b = 84, a = 110 } },
     -- Panels and the text fields on them, as the console's.
     panel = { material_template = "ui_color", color = { r = 100, g = 100, b = 100, a = 150 } },
     text_field = { material_template = "ui_color", color = { r = 15, g = 15, b = 15, a = 150 } },

@@ -9,7 +9,12 @@
 #include "engine_interfaces.h"
 #include "ui_button.h"
 #include "ui_desktop.h"
+#include "ui_drop_down_list.h"
 #include "ui_edit_box.h"
+#include "ui_items.h"
+#include "ui_list_box.h"
+#include "ui_page_control.h"
+#include "ui_selector_box.h"
 #include "ui_font.h"
 #include "ui_interfaces.h"
 #include "ui_material.h"
@@ -140,8 +145,9 @@ TChecker *make_checker(CDesktop *_p_desktop, CWindowVisual *_p_parent, char cons
     return p_checker;
 }
 
-// The desktop's pictures for the step buttons and scrollers of the scroll bars made by code.
-void dress_desktop_for_scroll_bars(CDesktop *_p_desktop) {
+// The desktop's pictures for the step buttons and scrollers of the scroll bars and selectors made
+// by code.
+void dress_desktop_for_step_buttons(CDesktop *_p_desktop) {
     dress(_p_desktop, _p_desktop,
           {{MAT_NAME_BUTTON_UP, "arrow_up"},
            {MAT_NAME_BUTTON_UP_HIGHLIGHTED, "arrow_up_highlighted"},
@@ -149,6 +155,12 @@ void dress_desktop_for_scroll_bars(CDesktop *_p_desktop) {
            {MAT_NAME_BUTTON_DOWN, "arrow_down"},
            {MAT_NAME_BUTTON_DOWN_HIGHLIGHTED, "arrow_down_highlighted"},
            {MAT_NAME_BUTTON_DOWN_PUSHED, "arrow_down_pushed"},
+           {MAT_NAME_BUTTON_LEFT, "arrow_left"},
+           {MAT_NAME_BUTTON_LEFT_HIGHLIGHTED, "arrow_left_highlighted"},
+           {MAT_NAME_BUTTON_LEFT_PUSHED, "arrow_left_pushed"},
+           {MAT_NAME_BUTTON_RIGHT, "arrow_right"},
+           {MAT_NAME_BUTTON_RIGHT_HIGHLIGHTED, "arrow_right_highlighted"},
+           {MAT_NAME_BUTTON_RIGHT_PUSHED, "arrow_right_pushed"},
            {MAT_NAME_BUTTON_SCROLLER, "scroller"},
            {MAT_NAME_BUTTON_SCROLLER_HIGHLIGHTED, "scroller_highlighted"},
            {MAT_NAME_BUTTON_SCROLLER_PUSHED, "scroller_pushed"}});
@@ -238,6 +250,88 @@ void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     make_button(_p_desktop, p_dialog, "apply", "Apply", 294, 288);
 }
 
+// A row of one text per column, with an icon when given.
+CItem *row(std::initializer_list<char const *> _texts, CMaterial *_p_icon) {
+    qor_vector<CText> texts;
+    for (char const *p_text : _texts)
+        texts.emplace_back(CString(p_text));
+    return new CItem(std::move(texts), _p_icon);
+}
+
+// The look of a list: its body, the row under the pointer and the chosen row.
+void dress_list(CDesktop *_p_desktop, CListBox *_p_list) {
+    _p_list->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    _p_list->add_material(MAT_NAME_SELECTION, preset(_p_desktop, "row_under_pointer"));
+    _p_list->add_material(MAT_NAME_CHECKED, preset(_p_desktop, "row_chosen"));
+    _p_list->add_material(MAT_NAME_LISTBOX_HEADER, preset(_p_desktop, "bar_track"));
+}
+
+// A tabbed options screen: "Video" holds a list of display modes in three columns with icons,
+// "Game" a selector of the language and a drop-down of the difficulty.
+void make_options_dialog(CDesktop *_p_desktop, int _x, int _y) {
+    CWindowVisual *p_dialog = make_dialog(_p_desktop, "options", "Options", _x, _y, 440, 300);
+    CPageControl *p_pages = place(p_dialog, new CPageControl(_p_desktop, "pages"), 10, 34, 420, 256);
+    p_pages->set_tab_size(90, 26);
+    CWindowVisual *p_video = p_pages->add_page("Video");
+    CWindowVisual *p_game = p_pages->add_page("Game");
+    for (char const *p_tab : {"Video", "Game"})
+        if (CButton *p_button = class_cast<CButton>(p_pages->get_child(p_tab, "Button", true)))
+            dress(_p_desktop, p_button,
+                  {{MAT_NAME_NORMAL, "button_normal"},
+                   {MAT_NAME_HIGHLIGHTED, "button_highlighted"},
+                   {MAT_NAME_PUSHED, "button_pushed"},
+                   {MAT_NAME_CHECKED, "button_checked"}});
+
+    CListBox *p_modes = place(p_video, new CListBox(_p_desktop, "modes"), 0, 0, 420, 222);
+    dress_list(_p_desktop, p_modes);
+    char const *const titles[] = {"Resolution", "Rate", "Aspect"};
+    int const widths[] = {170, 100, 100};
+    for (unsigned i = 0; i < 3; ++i) {
+        p_modes->add_column();
+        p_modes->set_column_w(i, widths[i]);
+        p_modes->set_column_title(i, CString(titles[i]));
+    }
+    p_modes->set_columns_h(22);
+    p_modes->set_item_height(24);
+    p_modes->show_columns(true);
+    int const sizes[][2] = {{640, 480},   {800, 600},  {1024, 768},  {1280, 720},
+                            {1280, 1024}, {1600, 900}, {1920, 1080}, {2560, 1440}};
+    for (auto const &size : sizes) {
+        for (char const *p_rate : {"60 Hz", "75 Hz", "120 Hz"}) {
+            bool const wide = size[0] * 9 == size[1] * 16;
+            char const *p_aspect = wide ? "16:9" : size[0] * 4 == size[1] * 5 ? "5:4" : "4:3";
+            std::string const resolution = std::to_string(size[0]) + " x " + std::to_string(size[1]);
+            p_modes->get_items().add(row({resolution.c_str(), p_rate, p_aspect},
+                                         preset(_p_desktop, wide ? "radio_on" : "checker_on")));
+        }
+    }
+    if (CScrollBar *p_bar = p_modes->get_scroll_bar_vert()) {
+        p_bar->set_w(16);
+        p_bar->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "bar_track"));
+        size_parts(p_bar, 30);
+    }
+    p_modes->send_event(p_modes, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+
+    p_game->make_static_text(CString("Language"), CRectArea(0, 8, 110, 20), "language label");
+    CSelectorBox *p_language = place(p_game, new CSelectorBox(_p_desktop, "language"), 120, 6, 220, 24);
+    p_language->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    for (char const *p_language_name : {"English", "Deutsch",
+                                        "Fran\xC3\xA7"
+                                        "ais",
+                                        "\xD0\xA0\xD1\x83\xD1\x81\xD1\x81\xD0\xBA\xD0\xB8\xD0\xB9"})
+        p_language->get_items().add(row({p_language_name}, nullptr));
+    p_language->get_items().select(0);
+
+    p_game->make_static_text(CString("Difficulty"), CRectArea(0, 48, 110, 20), "difficulty label");
+    CDropDownList *p_level = place(p_game, new CDropDownList(_p_desktop, "level"), 120, 46, 220, 24);
+    p_level->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    dress_list(_p_desktop, p_level->get_list_box());
+    p_level->get_list_box()->set_item_height(22);
+    for (char const *p_level_name : {"Story", "Easy", "Normal", "Hard", "Nightmare"})
+        p_level->get_items().add(row({p_level_name}, nullptr));
+    p_level->check(2);
+}
+
 IUserInterface *user_interface() {
     return static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
 }
@@ -266,12 +360,13 @@ void cmd_gameui_demo_scene(char const *, void *) {
     p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
     place(p_bar, new CDemoText(p_desktop, "heading", "qorui - demo scene"), 16, 8, 400, 20);
     lua_machine().DoFile(16, "ui_material_presets.lua");
-    dress_desktop_for_scroll_bars(p_desktop);
+    dress_desktop_for_step_buttons(p_desktop);
     make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
     make_message_dialog(p_desktop, "second dialog",
                         "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
                         120, 420);
     make_controls_dialog(p_desktop, 540, 80);
+    make_options_dialog(p_desktop, 540, 430);
     if (ILogger *p_logger = demo_logger()) p_logger->write("Demo scene built", 0);
 }
 

@@ -146,6 +146,29 @@ TEST(HostEndToEnd, AnInputScriptWorksTheControls) {
     expect_golden(run.m_out, "typed.png", "controls_typed_1024x768");
 }
 
+// The options dialog of the demo scene, driven by an input script: the list of display modes
+// scrolled by its scroll bar and the wheel with a row clicked, the second tab chosen, the
+// drop-down opened and a row of it chosen.
+TEST(HostEndToEnd, AnInputScriptWorksTheLists) {
+    std::string const script = qortest::make_temp_dir() + "/lists.script";
+    qortest::write_file(script, "wait 12\n"
+                                "move 450 170        # from the centre onto the list's scroller (962, 554)\n"
+                                "press\nmove 0 1\nmove 0 59\nrelease\n"
+                                "move -262 40        # a row (700, 654)\n"
+                                "press\nrelease\nwheel -2\nwait 2\nscreenshot list.png\n"
+                                "move -7 -177        # the tab 'Game' (693, 477)\n"
+                                "press\nrelease\nwait 12\n"
+                                "move 87 79          # the drop-down (780, 556)\n"
+                                "press\nrelease\nwait 12\nscreenshot opened.png\n"
+                                "move -60 90         # its row 'Hard' (720, 646)\n"
+                                "press\nrelease\nwait 12\nscreenshot chosen.png\n");
+    SRun const run = run_host({"--script", script});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    expect_golden(run.m_out, "list.png", "lists_scrolled_1024x768");
+    expect_golden(run.m_out, "opened.png", "lists_drop_down_opened_1024x768");
+    expect_golden(run.m_out, "chosen.png", "lists_drop_down_chosen_1024x768");
+}
+
 namespace {
 
 // A copy of the data folder, for runs that write layouts into it; without the startup line when
