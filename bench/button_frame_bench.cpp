@@ -2,6 +2,7 @@
 // 1024 by 768 desktop, each with a caption of ten characters, updated and drawn into a renderer
 // that only copies the vertices into a buffer made once. The counters give the quads of a frame
 // and the library's heap allocations per frame, which a steady frame should not make.
+#include "bench_desktop.h"
 #include "qorMemoryManager.h"
 #include "qorbase.h"
 #include "qordebug.h"
@@ -79,19 +80,9 @@ uint64_t allocations() {
 }
 
 void BM_FrameOf1000Buttons(benchmark::State &_state) {
-    qordebug::set_report_handler([](qordebug::EReportKind, char const *, void *) {}, nullptr);
-    std::string const data = QOR_SOURCE_DIR "/data";
-    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
-    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
-    get_fonts_factory().init();
-
     CVertexCopyRenderer renderer;
-    CRender render;
-    render.init(&renderer);
-    render.set_resolution(1024, 768);
-    CDesktop desktop(&render, 1024, 768, "desktop");
-    desktop.send_event(&desktop, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
-    desktop.add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", &desktop));
+    CBenchDesktop bench(&renderer);
+    CDesktop &desktop = bench.desktop();
     for (int row = 0; row < 25; ++row) {
         for (int column = 0; column < 40; ++column) {
             char name[16];

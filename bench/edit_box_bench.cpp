@@ -1,6 +1,7 @@
 // Typing into an edit box through the desktop, as a player types: 10,000 characters by the
 // desktop's on_char into a box 80 characters of the default font wide, on a desktop with the
 // default fonts over the recording renderer.
+#include "bench_desktop.h"
 #include "qorbase.h"
 #include "qordebug.h"
 #include "recording_renderer.h"
@@ -23,22 +24,12 @@ int const k_characters = 10000;
 
 class CTypingWorld {
 public:
-    CTypingWorld() {
-        qordebug::set_report_handler([](qordebug::EReportKind, char const *, void *) {}, nullptr);
-        std::string const data = std::string(QOR_SOURCE_DIR) + "/data";
-        qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
-        qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
-        m_render.init(&m_renderer);
-        m_render.set_resolution(1024, 768);
-        get_fonts_factory().init();
-        mp_desktop = new CDesktop(&m_render, 1024, 768, "desktop");
-        mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
+    CTypingWorld() : m_bench(&m_renderer), mp_desktop(&m_bench.desktop()) {
         mp_box = new CEditBox(mp_desktop, "edit");
         mp_desktop->attach_child(mp_box);
         mp_box->set_size(columns_w(), 400);
         mp_desktop->set_active_window(mp_box);
     }
-    ~CTypingWorld() { delete mp_desktop; }
 
     // The letters typed, 'a' to 'z' over and over; a return after every 80 when _lines is set.
     void type(bool _lines) {
@@ -60,8 +51,8 @@ private:
     }
 
     qorhost::CRecordingRenderer m_renderer;
-    CRender m_render;
-    CDesktop *mp_desktop = nullptr;
+    CBenchDesktop m_bench;
+    CDesktop *mp_desktop;
     CEditBox *mp_box = nullptr;
 };
 

@@ -2,6 +2,7 @@
 // frame (update and draw) with 100 and with 10,000 rows, at the top and scrolled halfway; a sort
 // of 10,000 rows by a column, alone and with the frame behind it; and 10,000 rows inserted one at a
 // time through the list's items, taken in by the next update.
+#include "bench_desktop.h"
 #include "qorbase.h"
 #include "qordebug.h"
 #include "recording_renderer.h"
@@ -49,16 +50,7 @@ CItem *make_row(unsigned _i) {
 // comes from the default font.
 class CListWorld {
 public:
-    CListWorld() {
-        qordebug::set_report_handler([](qordebug::EReportKind, char const *, void *) {}, nullptr);
-        std::string const data = std::string(QOR_SOURCE_DIR) + "/data";
-        qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
-        qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
-        m_render.init(&m_renderer);
-        m_render.set_resolution(1024, 768);
-        get_fonts_factory().init();
-        mp_desktop = new CDesktop(&m_render, 1024, 768, "desktop");
-        mp_desktop->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("arial_white", mp_desktop));
+    CListWorld() : m_bench(&m_renderer), mp_desktop(&m_bench.desktop()) {
         mp_list = new CListBox(mp_desktop, "list");
         mp_desktop->attach_child(mp_list);
         mp_list->set_pos(100, 100);
@@ -70,7 +62,6 @@ public:
         for (unsigned c = 0; c < 3; ++c)
             mp_list->set_column_w(c, widths[c]);
     }
-    ~CListWorld() { delete mp_desktop; }
 
     void fill(unsigned _rows) {
         for (unsigned i = 0; i < _rows; ++i)
@@ -86,8 +77,8 @@ public:
 
 private:
     qorhost::CRecordingRenderer m_renderer;
-    CRender m_render;
-    CDesktop *mp_desktop = nullptr;
+    CBenchDesktop m_bench;
+    CDesktop *mp_desktop;
     CListBox *mp_list = nullptr;
 };
 
