@@ -4,6 +4,7 @@
 
 #include "qorMemoryManager.h"
 #include "qordebug.h"
+#include "test_common.h"
 
 #include <gtest/gtest.h>
 
@@ -19,34 +20,6 @@
 
 namespace {
 
-struct SReport {
-    qordebug::EReportKind m_kind;
-    std::string m_text;
-};
-
-void capture_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
-    static_cast<std::vector<SReport> *>(_user)->push_back(SReport{_kind, _text});
-}
-
-void write_text(std::string const &_path, std::string const &_text) {
-    FILE *out = fopen(_path.c_str(), "wb");
-    ASSERT_NE(out, nullptr) << _path;
-    fwrite(_text.data(), 1, _text.size(), out);
-    fclose(out);
-}
-
-std::string read_text(std::string const &_path) {
-    std::string text;
-    FILE *in = fopen(_path.c_str(), "rb");
-    if (!in) return "<missing>";
-    char buffer[4096];
-    size_t count;
-    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0)
-        text.append(buffer, count);
-    fclose(in);
-    return text;
-}
-
 bool exists(std::string const &_path) {
     struct stat info;
     return stat(_path.c_str(), &info) == 0;
@@ -59,28 +32,18 @@ int const k_categories[] = {qorbase::FILE_CATEGORY_STATS, qorbase::FILE_CATEGORY
 // back afterwards.
 class BaseTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        char pattern[] = "/tmp/qorbase_test_XXXXXX";
-        ASSERT_NE(mkdtemp(pattern), nullptr);
-        m_dir = pattern;
-        qordebug::set_report_handler(capture_report, &m_reports, false, &mp_previous_handler,
-                                     &mp_previous_user);
-    }
+    void SetUp() override { m_dir = qortest::make_temp_dir(); }
 
     void TearDown() override {
         qorbase::set_gdf_path(nullptr);
         for (int category : k_categories)
             qorbase::set_category_root(category, "");
-        qordebug::set_report_handler(mp_previous_handler, mp_previous_user);
-        std::filesystem::remove_all(m_dir);
     }
 
     std::string path(char const *_name) const { return m_dir + "/" + _name; }
 
     std::string m_dir;
-    std::vector<SReport> m_reports;
-    qordebug::report_handler_t mp_previous_handler = nullptr;
-    void *mp_previous_user = nullptr;
+    qortest::CReportCapture m_capture;
 };
 
 // ---------------------------------------------------------------------------------------------
@@ -108,7 +71,7 @@ protected:
     void SetUp() override {
         BaseTest::SetUp();
         m_gdf = path("qor.gdf");
-        write_text(m_gdf, k_gdf);
+        qortest::write_file(m_gdf, k_gdf);
         qorbase::set_gdf_path(m_gdf.c_str());
     }
 
@@ -132,7 +95,7 @@ TEST_F(GdfRegistryTest, ReadsStringsQuotedStringsAndNumbers) {
     vec2_t const size = value("ui", "console_size")->get_vec2(0, 0);
     EXPECT_EQ(size.x, 400.0f);
     EXPECT_EQ(size.y, 500.0f);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(GdfRegistryTest, ValuesWithoutContentOrNumberGiveDefaults) {
@@ -166,9 +129,10 @@ TEST_F(GdfRegistryTest, MissingFileGivesEmptyRegistryAndWarning) {
     std::string const missing = path("absent.gdf");
     qorbase::set_gdf_path(missing.c_str());
     EXPECT_EQ(section("ui"), nullptr);
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
-    EXPECT_NE(m_reports[0].m_text.find(missing), std::string::npos) << m_reports[0].m_text;
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_WARNING);
+    EXPECT_NE(m_capture.reports()[0].m_text.find(missing), std::string::npos)
+        << m_capture.reports()[0].m_text;
 }
 
 TEST_F(GdfRegistryTest, SetVec2IsWrittenBackByFlushWithCommentsKept) {
@@ -178,24 +142,24 @@ TEST_F(GdfRegistryTest, SetVec2IsWrittenBackByFlushWithCommentsKept) {
     value("ui", "never_set"); // made without content: not written
     qorbase::flush_gdf();
 
-    EXPECT_EQ(read_text(m_gdf), "; The engine's configuration.\n"
-                                "\n"
-                                "[ui]\n"
-                                "# The plaque.\n"
-                                "init_plaque = \"other plaque.tga\"\n"
-                                "cursor=kursor.tga\n"
-                                "console_pos = 1.5, -2\n"
-                                "console_size = 400 500\n"
-                                "lines = 42\n"
-                                "octal_looking = 010\n"
-                                "words = many\n"
-                                "empty =\n"
-                                "new_size = 640, 480\n"
-                                "\n"
-                                "[ui_libraries]\n"
-                                "gameui_library = libgameui_demo.so\n");
+    EXPECT_EQ(qortest::read_file(m_gdf), "; The engine's configuration.\n"
+                                         "\n"
+                                         "[ui]\n"
+                                         "# The plaque.\n"
+                                         "init_plaque = \"other plaque.tga\"\n"
+                                         "cursor=kursor.tga\n"
+                                         "console_pos = 1.5, -2\n"
+                                         "console_size = 400 500\n"
+                                         "lines = 42\n"
+                                         "octal_looking = 010\n"
+                                         "words = many\n"
+                                         "empty =\n"
+                                         "new_size = 640, 480\n"
+                                         "\n"
+                                         "[ui_libraries]\n"
+                                         "gameui_library = libgameui_demo.so\n");
     EXPECT_FALSE(exists(m_gdf + ".tmp"));
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(GdfRegistryTest, SetVec2ReadsBackTheSameFloats) {
@@ -216,20 +180,20 @@ TEST_F(GdfRegistryTest, UnchangedRegistryIsNotWritten) {
 }
 
 TEST_F(GdfRegistryTest, FileWithoutFinalLineBreakOrWithCrLfKeepsIt) {
-    write_text(m_gdf, "[ui]\r\n; note\r\nconsole_pos = 20, 30\r\ncursor = a.tga");
+    qortest::write_file(m_gdf, "[ui]\r\n; note\r\nconsole_pos = 20, 30\r\ncursor = a.tga");
     qorbase::set_gdf_path(m_gdf.c_str());
     value("ui", "console_pos")->set_vec2(5, 6);
     qorbase::flush_gdf();
-    EXPECT_EQ(read_text(m_gdf), "[ui]\r\n; note\r\nconsole_pos = 5, 6\r\ncursor = a.tga");
+    EXPECT_EQ(qortest::read_file(m_gdf), "[ui]\r\n; note\r\nconsole_pos = 5, 6\r\ncursor = a.tga");
 }
 
 TEST_F(GdfRegistryTest, PendingChangesAreWrittenBeforeThePathChanges) {
     value("ui", "console_pos")->set_vec2(3, 4);
     std::string const other = path("other.gdf");
-    write_text(other, "[ui]\n");
+    qortest::write_file(other, "[ui]\n");
     qorbase::set_gdf_path(other.c_str());
-    EXPECT_NE(read_text(m_gdf).find("console_pos = 3, 4\n"), std::string::npos);
-    EXPECT_EQ(read_text(other), "[ui]\n");
+    EXPECT_NE(qortest::read_file(m_gdf).find("console_pos = 3, 4\n"), std::string::npos);
+    EXPECT_EQ(qortest::read_file(other), "[ui]\n");
 }
 
 TEST_F(GdfRegistryTest, SetVec2IsWrittenBackAtProcessEnd) {
@@ -246,7 +210,7 @@ TEST_F(GdfRegistryTest, SetVec2IsWrittenBackAtProcessEnd) {
     ASSERT_EQ(waitpid(child, &status, 0), child);
     ASSERT_TRUE(WIFEXITED(status));
     EXPECT_EQ(WEXITSTATUS(status), 0);
-    std::string const text = read_text(m_gdf);
+    std::string const text = qortest::read_file(m_gdf);
     EXPECT_NE(text.find("\nconsole_pos = 7, 8\n"), std::string::npos) << text;
     EXPECT_NE(text.find("# The plaque.\n"), std::string::npos);
     EXPECT_FALSE(exists(m_gdf + ".tmp"));
@@ -262,7 +226,7 @@ TEST_F(ConfigFileTest, BuildVersionIsReadFromCommonSection) {
     qorbase::set_category_root(qorbase::FILE_CATEGORY_CONFIG, m_dir.c_str());
     std::string const text =
         "; made by the build\n[$$common$$]\nbuild_version = \"1.2.3 (nightly)\"\nline = 12\n";
-    write_text(path("build_version.cfg"), text);
+    qortest::write_file(path("build_version.cfg"), text);
 
     IConfigFile *p_file = ReadConfigFile(qorbase::FILE_CATEGORY_CONFIG, "build_version.cfg", 0);
     ASSERT_NE(p_file, nullptr);
@@ -275,8 +239,8 @@ TEST_F(ConfigFileTest, BuildVersionIsReadFromCommonSection) {
     p_common->get_value("line", true)->set_vec2(1, 2); // memory only
     EXPECT_EQ(p_common->get_value("line", true)->get_vec2(0, 0).y, 2.0f);
     p_file->close(true);
-    EXPECT_EQ(read_text(path("build_version.cfg")), text);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_EQ(qortest::read_file(path("build_version.cfg")), text);
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(ConfigFileTest, UnreadableFileGivesNullWithoutReport) {
@@ -285,7 +249,7 @@ TEST_F(ConfigFileTest, UnreadableFileGivesNullWithoutReport) {
     EXPECT_EQ(ReadConfigFile(qorbase::FILE_CATEGORY_CONFIG, "build_version.cfg", 0), nullptr);
     EXPECT_EQ(ReadConfigFile(qorbase::FILE_CATEGORY_CONFIG, "folder.cfg", 0), nullptr);
     EXPECT_EQ(ReadConfigFile(qorbase::FILE_CATEGORY_CONFIG, nullptr, 0), nullptr);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -319,7 +283,7 @@ TEST_F(FileSystemTest, MakePathJoinsTheCategoryRoot) {
 TEST_F(FileSystemTest, LoadFileGivesContentSizeAndTerminator) {
     qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
     std::string const content("line 1\n\0binary\xff", 15);
-    write_text(path("data.bin"), content);
+    qortest::write_file(path("data.bin"), content);
 
     void *p_content = nullptr;
     unsigned const size =
@@ -331,24 +295,24 @@ TEST_F(FileSystemTest, LoadFileGivesContentSizeAndTerminator) {
     EXPECT_EQ(MMGetMemoryBlockStatus(p_content), 1); // the manager's block, as the caller frees it
     MMDeallocate(p_content);
 
-    write_text(path("empty.txt"), "");
+    qortest::write_file(path("empty.txt"), "");
     p_content = nullptr;
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_UI, "empty.txt", &p_content, false), 0u);
     ASSERT_NE(p_content, nullptr); // read, with nothing in it
     EXPECT_EQ(static_cast<char *>(p_content)[0], '\0');
     MMDeallocate(p_content);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(FileSystemTest, LoadFileWithoutContentTestsExistence) {
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, m_dir.c_str());
-    write_text(path("font.nehe"), "12345");
+    qortest::write_file(path("font.nehe"), "12345");
     mkdir(path("folder").c_str(), 0755);
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_FONTS, "font.nehe", nullptr, true), 5u);
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_FONTS, "absent.nehe", nullptr, true), 0u);
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_FONTS, "folder", nullptr, true), 0u);
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_STATS, "font.nehe", nullptr, true), 0u);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(FileSystemTest, MissingFileIsReportedUnlessQuiet) {
@@ -356,13 +320,14 @@ TEST_F(FileSystemTest, MissingFileIsReportedUnlessQuiet) {
     void *p_content = nullptr;
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_UI, "absent.lua", &p_content, true), 0u);
     EXPECT_EQ(p_content, nullptr);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 
     EXPECT_EQ(GetFileSystem()->load_file(qorbase::FILE_CATEGORY_UI, "absent.lua", &p_content, false), 0u);
     EXPECT_EQ(p_content, nullptr);
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
-    EXPECT_NE(m_reports[0].m_text.find(path("absent.lua")), std::string::npos) << m_reports[0].m_text;
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_WARNING);
+    EXPECT_NE(m_capture.reports()[0].m_text.find(path("absent.lua")), std::string::npos)
+        << m_capture.reports()[0].m_text;
 }
 
 TEST_F(FileSystemTest, SaveFileCreatesFoldersAndReplacesWholeFile) {
@@ -370,26 +335,27 @@ TEST_F(FileSystemTest, SaveFileCreatesFoldersAndReplacesWholeFile) {
     std::string const first = "a longer first content\n";
     GetFileSystem()->save_file(qorbase::FILE_CATEGORY_STATS, "dumps/2024/stats.txt", first.data(),
                                static_cast<unsigned>(first.size()), 0);
-    EXPECT_EQ(read_text(path("dumps/2024/stats.txt")), first);
+    EXPECT_EQ(qortest::read_file(path("dumps/2024/stats.txt")), first);
     GetFileSystem()->save_file(qorbase::FILE_CATEGORY_STATS, "dumps/2024/stats.txt", "short", 5, 0);
-    EXPECT_EQ(read_text(path("dumps/2024/stats.txt")), "short");
+    EXPECT_EQ(qortest::read_file(path("dumps/2024/stats.txt")), "short");
     EXPECT_FALSE(exists(path("dumps/2024/stats.txt.tmp")));
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(FileSystemTest, SaveFileThatCannotBeWrittenIsReportedAndOldFileStays) {
     qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_dir.c_str());
-    write_text(path("blocker"), "a file where a folder should be");
+    qortest::write_file(path("blocker"), "a file where a folder should be");
     GetFileSystem()->save_file(qorbase::FILE_CATEGORY_STATS, "blocker/stats.txt", "x", 1, 0);
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
-    EXPECT_NE(m_reports[0].m_text.find(path("blocker/stats.txt")), std::string::npos) << m_reports[0].m_text;
-    EXPECT_EQ(read_text(path("blocker")), "a file where a folder should be");
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_WARNING);
+    EXPECT_NE(m_capture.reports()[0].m_text.find(path("blocker/stats.txt")), std::string::npos)
+        << m_capture.reports()[0].m_text;
+    EXPECT_EQ(qortest::read_file(path("blocker")), "a file where a folder should be");
 }
 
 TEST_F(FileSystemTest, OpenFileReadsFromSeekPositionShortAtEnd) {
     qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
-    write_text(path("strings.lang"), "0123456789");
+    qortest::write_file(path("strings.lang"), "0123456789");
     IFileReader *p_reader = GetFileSystem()->open_file(qorbase::FILE_CATEGORY_UI, "strings.lang");
     ASSERT_NE(p_reader, nullptr);
     EXPECT_EQ(p_reader->m_size, 10u);
@@ -403,7 +369,7 @@ TEST_F(FileSystemTest, OpenFileReadsFromSeekPositionShortAtEnd) {
     delete p_reader;
 
     EXPECT_EQ(GetFileSystem()->open_file(qorbase::FILE_CATEGORY_UI, "absent.lang"), nullptr);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 void capture_line(char const *_line, void *_user) {

@@ -3,6 +3,7 @@
 
 #include "qorbase.h"
 #include "qordebug.h"
+#include "test_common.h"
 
 #include <gtest/gtest.h>
 #include <lua.hpp>
@@ -19,15 +20,6 @@ using LuaPlus::LuaObject;
 using LuaPlus::LuaState;
 
 namespace {
-
-struct SReport {
-    qordebug::EReportKind m_kind;
-    std::string m_text;
-};
-
-void capture_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
-    static_cast<std::vector<SReport> *>(_user)->push_back(SReport{_kind, _text});
-}
 
 std::string dump_text(LuaObject const &_object, char const *_name, int _indent = 0) {
     std::ostringstream out;
@@ -52,22 +44,15 @@ protected:
     void SetUp() override {
         mp_state = LuaState::Create(true, true);
         ASSERT_NE(mp_state, nullptr);
-        qordebug::set_report_handler(capture_report, &m_reports, false, &mp_previous_handler,
-                                     &mp_previous_user);
     }
-    void TearDown() override {
-        qordebug::set_report_handler(mp_previous_handler, mp_previous_user);
-        LuaState::Destroy(mp_state);
-    }
+    void TearDown() override { LuaState::Destroy(mp_state); }
 
     LuaObject global(char const *_name) { return mp_state->GetGlobals()[_name]; }
     // Runs code that has to succeed.
     void run(char const *_code) { ASSERT_EQ(mp_state->DoString(_code), 0) << mp_state->GetLastError(); }
 
     LuaState *mp_state = nullptr;
-    std::vector<SReport> m_reports;
-    qordebug::report_handler_t mp_previous_handler = nullptr;
-    void *mp_previous_user = nullptr;
+    qortest::CReportCapture m_capture;
 };
 
 // ---------------------------------------------------------------------------------------------
@@ -123,7 +108,7 @@ TEST_F(LuaTest, WrongTypesGiveNeutralValuesWithoutReport) {
     EXPECT_EQ(unbound.GetState(), nullptr);
     EXPECT_TRUE(unbound["x"].IsNil());
     unbound.SetString("x", "y");
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(LuaTest, CopiesShareTablesAndOutliveTheOriginal) {
@@ -208,8 +193,8 @@ TEST_F(LuaTest, ObjectsOfAnotherStateAreRefused) {
         t.AssignNewTable(mp_state).SetString("k", "kept");
         t.SetObject("k", foreign);
         EXPECT_STREQ(t["k"].GetString(), "kept");
-        ASSERT_EQ(m_reports.size(), 1u);
-        EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_ASSERT);
+        ASSERT_EQ(m_capture.reports().size(), 1u);
+        EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_ASSERT);
     }
     LuaState::Destroy(p_other);
 }
@@ -220,20 +205,20 @@ TEST_F(LuaTest, ObjectsOfAnotherStateAreRefused) {
 
 TEST_F(LuaTest, DoStringReportsSyntaxAndRuntimeErrors) {
     EXPECT_NE(mp_state->DoString("x = = 1"), 0);
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
-    EXPECT_NE(m_reports[0].m_text.find(mp_state->GetLastError()), std::string::npos);
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_WARNING);
+    EXPECT_NE(m_capture.reports()[0].m_text.find(mp_state->GetLastError()), std::string::npos);
     EXPECT_NE(std::string(mp_state->GetLastError()).find("unexpected symbol near '='"), std::string::npos)
         << mp_state->GetLastError();
 
     EXPECT_EQ(mp_state->DoString("y = 1; error('boom')"), LUA_ERRRUN);
     EXPECT_NE(std::string(mp_state->GetLastError()).find("boom"), std::string::npos);
     EXPECT_EQ(global("y").GetInteger(), 1); // what ran before the error stays
-    EXPECT_EQ(m_reports.size(), 2u);
+    EXPECT_EQ(m_capture.reports().size(), 2u);
 
     EXPECT_EQ(mp_state->DoString("error('quiet one')", true), LUA_ERRRUN);
     EXPECT_NE(std::string(mp_state->GetLastError()).find("quiet one"), std::string::npos);
-    EXPECT_EQ(m_reports.size(), 2u);
+    EXPECT_EQ(m_capture.reports().size(), 2u);
     EXPECT_EQ(mp_state->DoString("z = string.format('%03d', 7)"), 0); // standard libraries are open
     EXPECT_STREQ(global("z").GetString(), "007");
 }
@@ -242,14 +227,11 @@ class LuaFileTest : public LuaTest {
 protected:
     void SetUp() override {
         LuaTest::SetUp();
-        char pattern[] = "/tmp/qorscript_test_XXXXXX";
-        ASSERT_NE(mkdtemp(pattern), nullptr);
-        m_dir = pattern;
+        m_dir = qortest::make_temp_dir();
         qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
     }
     void TearDown() override {
         qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, "");
-        std::filesystem::remove_all(m_dir);
         LuaTest::TearDown();
     }
     void save(char const *_name, std::string const &_text) {
@@ -265,15 +247,15 @@ TEST_F(LuaFileTest, DoFileRunsAFileOfTheCategory) {
     EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "layouts/main.lua"), 0) << mp_state->GetLastError();
     EXPECT_STREQ(global("ui_windows_ini")["name"].GetString(), "desktop");
     EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_FONTS, "layouts/main.lua", true), LUA_ERRFILE);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
 }
 
 TEST_F(LuaFileTest, DoFileOfMissingFileFailsAndReportsUnlessQuiet) {
     EXPECT_NE(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "absent.lua", true), 0);
-    EXPECT_TRUE(m_reports.empty());
+    EXPECT_TRUE(m_capture.reports().empty());
     EXPECT_NE(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "absent.lua"), 0);
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_NE(m_reports[0].m_text.find("absent.lua"), std::string::npos);
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_NE(m_capture.reports()[0].m_text.find("absent.lua"), std::string::npos);
 }
 
 TEST_F(LuaFileTest, DoFileErrorNamesTheFileAndLine) {
@@ -281,8 +263,8 @@ TEST_F(LuaFileTest, DoFileErrorNamesTheFileAndLine) {
     EXPECT_EQ(mp_state->DoFile(qorbase::FILE_CATEGORY_UI, "broken.lua"), LUA_ERRRUN);
     EXPECT_EQ(std::string(mp_state->GetLastError()).rfind("broken.lua:2:", 0), 0u)
         << mp_state->GetLastError();
-    ASSERT_EQ(m_reports.size(), 1u);
-    EXPECT_EQ(m_reports[0].m_kind, qordebug::REPORT_WARNING);
+    ASSERT_EQ(m_capture.reports().size(), 1u);
+    EXPECT_EQ(m_capture.reports()[0].m_kind, qordebug::REPORT_WARNING);
 }
 
 // ---------------------------------------------------------------------------------------------

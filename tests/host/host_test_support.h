@@ -1,13 +1,10 @@
-// What the host's tests share: captured reports, a temporary folder for the files a test makes,
-// little-endian byte writers for those files, WAV files, and a readable print of colours.
+// What the host's tests share: a temporary folder for the files a test makes, little-endian
+// byte writers for those files, WAV files, and a readable print of colours.
 #pragma once
 #include "qor_math.h"
-#include "qordebug.h"
+#include "test_common.h"
 
 #include <cstdint>
-#include <cstdio>
-#include <cstdlib>
-#include <filesystem>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -19,84 +16,27 @@ inline void PrintTo(rgba_t const &_c, std::ostream *_p_out) {
 
 namespace hosttest {
 
-// Captures every report of qordebug while it lives; reports don't reach stderr.
-class CReportCapture {
-public:
-    struct SReport {
-        qordebug::EReportKind m_kind;
-        std::string m_text;
-    };
-
-    CReportCapture() {
-        qordebug::set_report_handler(on_report, this, false, &mp_previous, &mp_previous_user);
-    }
-    ~CReportCapture() { qordebug::set_report_handler(mp_previous, mp_previous_user, mp_previous == nullptr); }
-    CReportCapture(CReportCapture const &) = delete;
-    CReportCapture &operator=(CReportCapture const &) = delete;
-
-    std::vector<SReport> const &reports() const { return m_reports; }
-    std::vector<std::string> texts(qordebug::EReportKind _kind) const {
-        std::vector<std::string> result;
-        for (SReport const &report : m_reports)
-            if (report.m_kind == _kind) result.push_back(report.m_text);
-        return result;
-    }
-    std::vector<std::string> warnings() const { return texts(qordebug::REPORT_WARNING); }
-    void clear() { m_reports.clear(); }
-
-private:
-    static void on_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
-        static_cast<CReportCapture *>(_user)->m_reports.push_back(SReport{_kind, _text});
-    }
-
-    std::vector<SReport> m_reports;
-    qordebug::report_handler_t mp_previous = nullptr;
-    void *mp_previous_user = nullptr;
-};
+using qortest::CReportCapture;
 
 typedef std::vector<uint8_t> bytes_t;
 
-// A new empty folder under /tmp, removed with everything in it when the object goes.
+// A temporary folder of the test (removed at process end) with writers of its files.
 class CTempDir {
 public:
-    CTempDir() {
-        char name[] = "/tmp/qorhost_test_XXXXXX";
-        if (mkdtemp(name)) m_path = name;
-    }
-    ~CTempDir() {
-        std::error_code ignored;
-        if (!m_path.empty()) std::filesystem::remove_all(m_path, ignored);
-    }
-    CTempDir(CTempDir const &) = delete;
-    CTempDir &operator=(CTempDir const &) = delete;
-
     std::string const &path() const { return m_path; }
     std::string file(std::string const &_name) const { return m_path + "/" + _name; }
-
     // Writes a file of the folder (sub folders are made); result its full path.
     std::string write(std::string const &_name, bytes_t const &_content) const {
-        std::string const full = file(_name);
-        std::filesystem::create_directories(std::filesystem::path(full).parent_path());
-        if (FILE *p_file = fopen(full.c_str(), "wb")) {
-            if (!_content.empty()) fwrite(_content.data(), 1, _content.size(), p_file);
-            fclose(p_file);
-        }
-        return full;
+        return qortest::write_file(file(_name), std::string(_content.begin(), _content.end()));
     }
 
 private:
-    std::string m_path;
+    std::string m_path = qortest::make_temp_dir();
 };
 
 inline bytes_t read_bytes(std::string const &_path) {
-    bytes_t content;
-    if (FILE *p_file = fopen(_path.c_str(), "rb")) {
-        int c;
-        while ((c = fgetc(p_file)) != EOF)
-            content.push_back(static_cast<uint8_t>(c));
-        fclose(p_file);
-    }
-    return content;
+    std::string const content = qortest::read_file(_path);
+    return bytes_t(content.begin(), content.end());
 }
 
 inline void put_u16(bytes_t &_out, unsigned _value) {

@@ -1,35 +1,12 @@
+// Child processes of the build and the paths of the tree, for the library's tests.
 #include "test_support.h"
-
-#include <gtest/gtest.h>
 
 #include <cstdio>
 #include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <sstream>
 #include <sys/wait.h>
 #include <unistd.h>
 
 namespace qortest {
-
-CReportCapture::CReportCapture() : mp_previous(nullptr), mp_previous_user(nullptr) {
-    qordebug::set_report_handler(on_report, this, false, &mp_previous, &mp_previous_user);
-}
-
-CReportCapture::~CReportCapture() {
-    qordebug::set_report_handler(mp_previous, mp_previous_user);
-}
-
-void CReportCapture::on_report(qordebug::EReportKind _kind, char const *_text, void *_user) {
-    static_cast<CReportCapture *>(_user)->m_reports.push_back({_kind, _text ? _text : ""});
-}
-
-std::vector<std::string> CReportCapture::texts(qordebug::EReportKind _kind) const {
-    std::vector<std::string> result;
-    for (SReport const &report : m_reports)
-        if (report.m_kind == _kind) result.push_back(report.m_text);
-    return result;
-}
 
 std::string bin_dir() {
     char path[4096];
@@ -72,46 +49,6 @@ SChildResult run_child(std::string const &_program, std::vector<std::string> con
     result.m_exit_code = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
     result.m_output = read_file(output_path);
     return result;
-}
-
-namespace {
-
-// The folders of make_temp_dir, removed when the test process ends (a forked child leaves by
-// _exit and removes nothing).
-std::vector<std::string> &temp_dirs() {
-    static std::vector<std::string> *sp_dirs = [] {
-        std::atexit([] {
-            for (std::string const &dir : *sp_dirs)
-                std::filesystem::remove_all(dir);
-        });
-        return new std::vector<std::string>;
-    }();
-    return *sp_dirs;
-}
-
-} // namespace
-
-std::string make_temp_dir() {
-    char pattern[] = "/tmp/qorui_test_XXXXXX";
-    char *dir = mkdtemp(pattern);
-    if (!dir) {
-        ADD_FAILURE() << "mkdtemp failed";
-        return "/tmp";
-    }
-    temp_dirs().push_back(dir);
-    return dir;
-}
-
-void write_file(std::string const &_path, std::string const &_content) {
-    std::ofstream out(_path, std::ios::binary);
-    out << _content;
-}
-
-std::string read_file(std::string const &_path) {
-    std::ifstream in(_path, std::ios::binary);
-    std::stringstream content;
-    content << in.rdbuf();
-    return content.str();
 }
 
 } // namespace qortest

@@ -1,36 +1,11 @@
-// What the library's tests share: captured reports, child processes, paths.
+// What the library's tests share beyond the common helpers: child processes and paths.
 #pragma once
-#include "qordebug.h"
+#include "test_common.h"
 
 #include <string>
 #include <vector>
 
 namespace qortest {
-
-// Captures every report of qordebug while it lives; reports don't reach stderr.
-class CReportCapture {
-public:
-    struct SReport {
-        qordebug::EReportKind m_kind;
-        std::string m_text;
-    };
-
-    CReportCapture();
-    ~CReportCapture();
-    CReportCapture(CReportCapture const &) = delete;
-    CReportCapture &operator=(CReportCapture const &) = delete;
-
-    std::vector<SReport> const &reports() const { return m_reports; }
-    // The texts of the reports of one kind, in order.
-    std::vector<std::string> texts(qordebug::EReportKind _kind) const;
-    void clear() { m_reports.clear(); }
-
-private:
-    static void on_report(qordebug::EReportKind _kind, char const *_text, void *_user);
-    std::vector<SReport> m_reports;
-    qordebug::report_handler_t mp_previous;
-    void *mp_previous_user;
-};
 
 struct SChildResult {
     int m_exit_code;      // -1 if it didn't exit normally
@@ -46,10 +21,5 @@ SChildResult run_child(std::string const &_program, std::vector<std::string> con
 std::string bin_dir();
 // The source tree (data/, tests/golden/).
 std::string source_dir();
-// A new empty folder under the system's temporary folder, removed with all it holds when the
-// test process ends.
-std::string make_temp_dir();
-void write_file(std::string const &_path, std::string const &_content);
-std::string read_file(std::string const &_path);
 
 } // namespace qortest

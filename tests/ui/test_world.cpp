@@ -1,7 +1,10 @@
+// The test world, its golden pictures, the names of events and tables from text.
 #include "test_world.h"
 
+#include "engine_interfaces.h"
 #include "image_io.h"
 #include "qorbase.h"
+#include "test_host.h"
 #include "test_support.h"
 #include "ui_font.h"
 #include "ui_event.h"
@@ -17,6 +20,9 @@ using namespace qorui;
 namespace qortest {
 
 CWorld::CWorld(int _w, int _h) : m_renderer(_w, _h), m_x(_w / 2.0f), m_y(_h / 2.0f) {
+    // The host first: its servers, made before the library's cache of interfaces, outlive it.
+    IInterfaceServer &server = host().server();
+    engine_interfaces().set_server(&server);
     qorplatform::set_clock(&m_clock);
     std::string const data = source_dir() + "/data";
     m_renderer.set_texture_folders({data + "/textures", data});
@@ -34,9 +40,14 @@ CWorld::CWorld(int _w, int _h) : m_renderer(_w, _h), m_x(_w / 2.0f), m_y(_h / 2.
     mp_desktop->add_font(FNT_NAME_FIXED, get_fonts_factory().create("courier", mp_desktop));
 }
 
+// The clock goes back to the host's, which holds it between tests.
 CWorld::~CWorld() {
     delete mp_desktop;
-    qorplatform::set_clock(nullptr);
+    qorplatform::set_clock(&host().clock());
+}
+
+qorhost::CHost &CWorld::host() {
+    return shared_host();
 }
 
 CMaterial *CWorld::colour(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a) {
@@ -173,6 +184,42 @@ void expect_golden(qorhost::SImage const &_actual, std::string const &_name) {
     qorhost::write_png(actual_path, _actual);
     EXPECT_EQ(0, qorhost::compare_images(_actual, golden, 2, diff_path))
         << _name << ": actual " << actual_path << ", difference " << diff_path;
+}
+
+void CEventLog::watch(CWindow *_p_wnd, std::vector<EEventType> const &_ids) {
+    std::string const name = _p_wnd->get_name();
+    for (EEventType id : _ids)
+        _p_wnd->register_callback(id, CEventCallback([this, name](CWndEvent const *p_event) {
+                                      m_lines.push_back(name + ":" + event_name(p_event->get_id()));
+                                  }));
+}
+
+std::vector<std::string> CEventLog::take() {
+    std::vector<std::string> lines;
+    lines.swap(m_lines);
+    return lines;
+}
+
+LuaPlus::LuaObject lua_table(std::string const &_chunk) {
+    lua_machine().DoString(("qortest_table = " + _chunk).c_str());
+    return lua_machine().GetGlobals().GetByName("qortest_table");
+}
+
+LuaPlus::LuaObject new_table() {
+    LuaPlus::LuaObject table;
+    table.AssignNewTable(&lua_machine());
+    return table;
+}
+
+void load_state(CWindow *_p_wnd, std::string const &_chunk) {
+    LuaPlus::LuaObject table = lua_table(_chunk);
+    _p_wnd->load_state(table);
+}
+
+LuaPlus::LuaObject saved_state(CWindow *_p_wnd) {
+    LuaPlus::LuaObject table = new_table();
+    _p_wnd->save_state(table);
+    return table;
 }
 
 } // namespace qortest

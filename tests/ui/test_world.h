@@ -1,16 +1,19 @@
-// One world for the library's tests: a desktop of its own on the host's software renderer, with
-// the default fonts of the data folder and a clock that the test holds. Input goes through the
-// desktop as the engine's would (pointer moves, presses, keys, characters), frames are update and
-// draw, the calls of the last frame are recorded on their way to the renderer, and a frame is
-// compared with a checked-in golden picture.
+// One world for the library's tests: a desktop of its own on the host's software renderer, with a
+// recorder of the calls in front of it, the default fonts of the data folder, a clock that the test
+// holds, and the test host's engine interfaces (log, sound, variables, commands) behind the
+// library. Input goes through the desktop as the engine's would (pointer moves, presses, keys,
+// characters), frames are update and draw, and a frame is compared with a checked-in golden
+// picture. Beside it: readable records of events and Lua tables from text.
 #pragma once
+#include "host.h"
 #include "qor_platform.h"
+#include "qorscriptsystem.h"
 #include "recording_renderer.h"
 #include "software_renderer.h"
+#include "test_support.h"
 #include "ui_desktop.h"
 #include "ui_render.h"
 
-#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -28,6 +31,10 @@ public:
     qorui::CDesktop &desktop() { return *mp_desktop; }
     qorplatform::CManualClock &clock() { return m_clock; }
     qorhost::CSoftwareRenderer &renderer() { return m_renderer; }
+    // Every call of the desktop's bridge, in order; clear it before the calls a test looks at.
+    qorhost::CRecordingRenderer &recorder() { return m_recorder; }
+    // The engine's side: the test host whose server the library's engine interfaces use.
+    qorhost::CHost &host();
 
     // A "ui_color" material of the desktop, owned by the caller.
     qorui::CMaterial *colour(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a = 255);
@@ -70,23 +77,42 @@ public:
 private:
     qorplatform::CManualClock m_clock{10000};
     qorhost::CSoftwareRenderer m_renderer;
-    qorhost::CRecordingRenderer m_recorder{&m_renderer}; // the calls of the last frame
+    qorhost::CRecordingRenderer m_recorder{&m_renderer};
     qorui::CRender m_render;
     qorui::CDesktop *mp_desktop = nullptr;
     float m_x, m_y; // where the desktop has the pointer, fractions included
 };
-
-// The enumerator's name of an event, "EVENT_CLICK"; the number for a gap.
-std::string event_name(qorui::EEventType _id);
-// From now on, the name of each of the events that reaches _p_wnd goes to _log, behind the window's
-// own handlers; _log must outlive the window.
-void log_events(qorui::CWindow *_p_wnd, std::initializer_list<qorui::EEventType> _ids,
-                std::vector<std::string> &_log);
 
 // _actual against tests/golden/<_name>.png with a tolerance of 2 per channel; a difference image
 // and the actual picture are kept in a temporary folder named in the failure. With
 // QOR_UPDATE_GOLDEN=1 in the environment the golden is written instead (look at it before checking
 // it in).
 void expect_golden(qorhost::SImage const &_actual, std::string const &_name);
+
+// The name of an event type as the source writes it ("EVENT_CLICK"), so that failures read.
+std::string event_name(qorui::EEventType _id);
+// From now on, the name of each of the events that reaches _p_wnd goes to _log, behind the window's
+// own handlers; _log must outlive the window.
+void log_events(qorui::CWindow *_p_wnd, std::initializer_list<qorui::EEventType> _ids,
+                std::vector<std::string> &_log);
+
+// Records "window:EVENT_NAME" for each of the watched events that a window takes, in order.
+class CEventLog {
+public:
+    void watch(qorui::CWindow *_p_wnd, std::vector<qorui::EEventType> const &_ids);
+    // What was recorded since the last take.
+    std::vector<std::string> take();
+
+private:
+    std::vector<std::string> m_lines;
+};
+
+// A Lua table written in Lua ("{ name = 'w', size = { 10, 20 } }") in the library's Lua state.
+LuaPlus::LuaObject lua_table(std::string const &_chunk);
+// A new empty table of the library's Lua state.
+LuaPlus::LuaObject new_table();
+// A window's layout: loaded from a table written in Lua, and saved to a new table.
+void load_state(qorui::CWindow *_p_wnd, std::string const &_chunk);
+LuaPlus::LuaObject saved_state(qorui::CWindow *_p_wnd);
 
 } // namespace qortest

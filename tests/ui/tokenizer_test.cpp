@@ -4,21 +4,19 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <string>
-#include <vector>
 
 using namespace qorui;
 
 namespace {
 
-int const all_flags = 7;
+typedef std::vector<std::string> tokens_t;
+int const k_all_flags = 7;
 
-// Every token until the scan throws; `*_p_thrown_at_start` says whether the constructor threw.
-std::vector<std::string> tokens_of(char const *_p_text, int _flags = all_flags,
-                                   bool *_p_thrown_at_start = nullptr) {
-    std::vector<std::string> tokens;
+// Every token until the scan throws; "!" first when the constructor itself threw.
+tokens_t tokens_of(char const *_p_text, int _flags = k_all_flags, CTokenSet const *_p_terminators = nullptr) {
+    tokens_t tokens;
     CTokenizerRules rules(_p_text, static_cast<unsigned>(std::strlen(_p_text)), default_separators());
-    if (_p_thrown_at_start) *_p_thrown_at_start = false;
+    if (_p_terminators) rules.m_terminators = *_p_terminators;
     try {
         CTokenizer tokenizer(rules, _flags, 0);
         for (;;) {
@@ -27,121 +25,68 @@ std::vector<std::string> tokens_of(char const *_p_text, int _flags = all_flags,
         }
     } catch (char const *p_failure) {
         EXPECT_STREQ("", p_failure);
-        if (_p_thrown_at_start && tokens.empty()) *_p_thrown_at_start = true;
+        if (tokens.empty()) tokens.push_back("!");
     }
     return tokens;
 }
 
-typedef std::vector<std::string> tokens_t;
-
 } // namespace
 
-TEST(Tokenizer, DefaultSeparatorsAreTheBlanksControlBytesAndTheEmptyString) {
-    CTokenSet const separators = default_separators();
-    EXPECT_EQ(12u, separators.size());
-    for (char const *p : {"", " ", ",", ";", "\r", "\a", "\n", "\b", "\f", "\t", "\v", "\x1a"})
-        EXPECT_EQ(1u, separators.count(p)) << int(p[0]);
-    EXPECT_EQ(0u, separators.count("="));
+TEST(Tokenizer, SeparatorsCommentsQuotesAndTerminatorsCutTokens) {
+    struct {
+        char const *mp_text;
+        tokens_t m_tokens;
+        int m_flags;
+    } const rows[] = {
+        {"a,b; c\t\x1a"
+         "d",
+         {"a", "b", "c", "d"},
+         k_all_flags},
+        {"\"a b\" c", {"a b", "c"}, k_all_flags},
+        {"ab\"cd\"", {"ab", "cd"}, k_all_flags},
+        {"a // b\nc /* d */ e", {"a", "c", "e"}, k_all_flags},
+        {"x=1", {"x=1"}, k_all_flags},
+        {"\"\"\" b", {"\"", "b"}, k_all_flags},   // the byte behind the opening quote belongs to the token
+        {"  \"a b\"", {"\"a", "b"}, k_all_flags}, // a first quote behind separators is plain
+        {"\"a b\"", {"\"a", "b\""}, 3},           // without the quote flag quotes are ordinary bytes
+        {"a // b", {"a", "//", "b"}, 4},          // without the comment flags comments are tokens
+        // No token at all: the constructor throws.
+        {"", {"!"}, k_all_flags},
+        {" , ;\n\t", {"!"}, k_all_flags},
+        {"/* nothing */ ", {"!"}, k_all_flags},
+        {"\"\"", {"!"}, k_all_flags},
+        {"\"abc", {"!"}, k_all_flags},
+        // Behind a token separators and comments are passed at once, so an open block comment
+        // throws while the token is read; an open quote throws at the next call.
+        {"a /* open", {"!"}, k_all_flags},
+        {"a \"open", {"a"}, k_all_flags},
+    };
+    for (auto const &row : rows)
+        EXPECT_EQ(row.m_tokens, tokens_of(row.mp_text, row.m_flags)) << row.mp_text;
+    CTokenSet const equals = {"="};
+    EXPECT_EQ((tokens_t{"key", "=", "value"}), tokens_of("key=value", k_all_flags, &equals));
 }
 
-TEST(Tokenizer, SeparatorsCommentsAndQuotesCutTokens) {
-    EXPECT_EQ((tokens_t{"a", "b", "c"}), tokens_of("a,b; c"));
-    EXPECT_EQ((tokens_t{"a b", "c"}), tokens_of("\"a b\" c"));
-    EXPECT_EQ((tokens_t{"ab", "cd"}), tokens_of("ab\"cd\""));
-    EXPECT_EQ((tokens_t{"a", "c"}), tokens_of("a // b\nc"));
-    EXPECT_EQ((tokens_t{"a", "c"}), tokens_of("a /* b */ c"));
-    EXPECT_EQ((tokens_t{"x=1"}), tokens_of("x=1"));
-    EXPECT_EQ((tokens_t{"x", "=", "1"}), tokens_of("x = 1"));
-    EXPECT_EQ((tokens_t{"a"}), tokens_of("a // only a comment behind"));
-}
-
-TEST(Tokenizer, QuotesFollowTheirOddRules) {
-    // The byte behind the opening quote always belongs to the token.
-    EXPECT_EQ((tokens_t{"\"", "b"}), tokens_of("\"\"\" b"));
-    // A first token in quotes behind leading separators is read as a plain token.
-    EXPECT_EQ((tokens_t{"\"a", "b"}), tokens_of("  \"a b\""));
-    // Without the quote flag quotes are ordinary bytes.
-    EXPECT_EQ((tokens_t{"\"a", "b\""}), tokens_of("\"a b\"", 3));
-    // Without the comment flags comments are tokens.
-    EXPECT_EQ((tokens_t{"a", "//", "b"}), tokens_of("a // b", 4));
-}
-
-TEST(Tokenizer, TheEndThrowsOnlyAtTheNextCall) {
-    CTokenizerRules rules("one two", 7, default_separators());
-    CTokenizer tokenizer(rules, all_flags, 0);
-    EXPECT_EQ("one", tokenizer.get_token());
-    EXPECT_FALSE(tokenizer.is_eof());
-    tokenizer.next();
-    EXPECT_EQ("two", tokenizer.get_token());
-    EXPECT_TRUE(tokenizer.is_eof());
-    EXPECT_THROW(tokenizer.next(), char const *);
-}
-
-TEST(Tokenizer, TextsWithoutATokenThrowFromTheConstructor) {
-    for (char const *p_text : {"", " , ;\n\t", "// nothing", "/* nothing */ ", "\"\"", "\"abc"}) {
-        bool thrown_at_start = false;
-        EXPECT_TRUE(tokens_of(p_text, all_flags, &thrown_at_start).empty()) << p_text;
-        EXPECT_TRUE(thrown_at_start) << p_text;
-    }
-    // Behind a token the separators and comments are passed at once, so an open block comment
-    // throws while the token is read; an open quote throws at the next call.
-    bool thrown_at_start = false;
-    EXPECT_TRUE(tokens_of("a /* open", all_flags, &thrown_at_start).empty());
-    EXPECT_TRUE(thrown_at_start);
-    EXPECT_EQ((tokens_t{"a"}), tokens_of("a \"open"));
-}
-
-TEST(Tokenizer, TextNeedNotBeTerminated) {
-    char const text[] = {'a', ' ', 'b', 'X', 'Y'};
-    CTokenizerRules rules(text, 3, default_separators());
-    CTokenizer tokenizer(rules, all_flags, 0);
-    tokenizer.next();
-    EXPECT_EQ("b", tokenizer.get_token());
-    EXPECT_THROW(tokenizer.next(), char const *);
-}
-
-TEST(Tokenizer, LinesAndColumnsCountWhatWasPassed) {
-    char const text[] = "a\n// comment\n/* two\nlines */ b\n  c";
-    CTokenizerRules rules(text, sizeof text - 1, default_separators());
-    CTokenizer tokenizer(rules, all_flags, 0);
+TEST(Tokenizer, TheEndThrowsAtTheNextCallAndLinesCountWhatWasPassed) {
+    char const text[] = "a\n// comment\n/* two\nlines */ b\n  c 12.5 word XY";
+    CTokenizerRules rules(text, sizeof text - 3, default_separators()); // the text needn't end with a zero
+    CTokenizer tokenizer(rules, k_all_flags, 0);
     EXPECT_EQ(3u, tokenizer.get_line()); // already standing at "b", behind three line feeds
     tokenizer.next();
     EXPECT_EQ("b", tokenizer.get_token());
     EXPECT_EQ(4u, tokenizer.get_line());
     EXPECT_EQ(3u, tokenizer.get_column()); // the line feed itself stands at column 0
     tokenizer.next();
-    EXPECT_EQ("c", tokenizer.get_token());
-}
-
-TEST(Tokenizer, SkipPassesLeadingBytes) {
-    CTokenizerRules rules("abc def", 7, default_separators());
-    CTokenizer tokenizer(rules, all_flags, 2);
-    EXPECT_EQ("c", tokenizer.get_token());
-}
-
-TEST(Tokenizer, ConversionsAndExpectThrowOnWhatTheyCannotTake) {
-    CTokenizerRules rules("12.5 -7 word \"x\"", 16, default_separators());
-    CTokenizer tokenizer(rules, all_flags, 0);
+    tokenizer.next();
     EXPECT_DOUBLE_EQ(12.5, tokenizer.as_float());
     EXPECT_EQ(12, tokenizer.as_int());
-    tokenizer.next();
-    EXPECT_EQ(-7, tokenizer.as_int());
     tokenizer.next();
     EXPECT_EQ(0, tokenizer.as_int()); // as atoi
     EXPECT_NO_THROW(tokenizer.expect("word"));
     EXPECT_THROW(tokenizer.expect("Word"), char const *);
-    tokenizer.next();
-    EXPECT_EQ("x", tokenizer.get_token());
-}
+    EXPECT_TRUE(tokenizer.is_eof());
+    EXPECT_THROW(tokenizer.next(), char const *);
 
-TEST(Tokenizer, TerminatorsEndATokenWithoutSeparators) {
-    CTokenSet separators = default_separators();
-    CTokenizerRules rules("key=value", 9, separators);
-    rules.m_terminators.insert("=");
-    CTokenizer tokenizer(rules, all_flags, 0);
-    EXPECT_EQ("key", tokenizer.get_token());
-    tokenizer.next();
-    EXPECT_EQ("=", tokenizer.get_token());
-    tokenizer.next();
-    EXPECT_EQ("value", tokenizer.get_token());
+    CTokenizerRules skipped("abc def", 7, default_separators());
+    EXPECT_EQ("c", CTokenizer(skipped, k_all_flags, 2).get_token());
 }

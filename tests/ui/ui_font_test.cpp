@@ -1,20 +1,15 @@
-// Fonts: the "nehe" reader and its quiet stops, the factory's tables and messages, shared
-// charsets, and the two fonts of the data folder.
+// Fonts on the test world: the "nehe" reader and its quiet stops, the factory's tables and
+// messages, shared charsets, and the two fonts of the data folder.
 #include "ui_font.h"
 
 #include "engine_interfaces.h"
 #include "qorbase.h"
-#include "qorscriptsystem.h"
-#include "recording_renderer.h"
-#include "test_desktop.h"
-#include "test_support.h"
+#include "test_world.h"
 #include "ui_material.h"
-#include "ui_render.h"
 
 #include <gtest/gtest.h>
 
 #include <memory>
-#include <string>
 
 using namespace qorui;
 
@@ -22,28 +17,19 @@ namespace {
 
 class FontTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        qortest::CReportCapture quiet; // the bridge asks for the screen size, which may be absent here
-        m_render.init(&m_recorder);
-        m_desktop.mp_render = &m_render;
-        m_dir = qortest::make_temp_dir();
-        qorbase::set_category_root(8, m_dir.c_str());
-        qorbase::set_category_root(16, m_dir.c_str());
-    }
+    void SetUp() override { qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, m_dir.c_str()); }
 
     // A charset "name" over the file "name.fnt" with that content, and a font "name" on it.
     std::unique_ptr<CFont> font_from(std::string const &_name, std::string const &_content,
-                                     char const *_p_extra = "") {
+                                     std::string const &_extra = "") {
         qortest::write_file(m_dir + "/" + _name + ".fnt", _content);
-        lua_machine().DoString(("charsets = charsets or {}; fonts = fonts or {};"
-                                "charsets['" +
-                                _name + "'] = { file_type = 'nehe', file_name = '" + _name +
+        lua_machine().DoString(("charsets['" + _name + "'] = { file_type = 'nehe', file_name = '" + _name +
                                 ".fnt' }; fonts['" + _name + "'] = { charset_name = '" + _name +
-                                "', material = { material_template = 'ui_image' } " + _p_extra + " }")
+                                "', material = { material_template = 'ui_color' } " + _extra + " }")
                                    .c_str());
-        return std::unique_ptr<CFont>(get_fonts_factory().create(_name.c_str(), &m_desktop));
+        return std::unique_ptr<CFont>(get_fonts_factory().create(_name.c_str(), &m_world.desktop()));
     }
-
+    // _count entries of width 0.5 from _first_code.
     static std::string entries(int _count, int _first_code = 32) {
         std::string text;
         for (int i = 0; i < _count; ++i)
@@ -51,10 +37,8 @@ protected:
         return text;
     }
 
-    qorhost::CRecordingRenderer m_recorder;
-    CRender m_render;
-    qortest::CTestDesktop m_desktop;
-    std::string m_dir;
+    qortest::CWorld m_world;
+    std::string m_dir = qortest::make_temp_dir();
 };
 
 } // namespace
@@ -64,14 +48,12 @@ TEST_F(FontTest, CellsRunRowByRowAndMissingCodesGetTheLowestCodesCell) {
         font_from("grid", "[common]\nfont1 = x\ndimension = 4\nfont_h = 1\n[chars]\n" + entries(16, 40));
     ASSERT_TRUE(font);
     CCharset::SChar const *p_char = font->get_char_description(46); // the 7th entry: row 1, column 2
-    ASSERT_NE(nullptr, p_char);
     EXPECT_FLOAT_EQ(0.5f, p_char->x);
     EXPECT_FLOAT_EQ(0.25f, p_char->y);
     EXPECT_FLOAT_EQ(0.125f, p_char->w);
     EXPECT_FLOAT_EQ(0.25f, font->get_height());
     EXPECT_EQ(font->get_char_description(40), font->get_char_description('z'));
     EXPECT_FLOAT_EQ(320.0f, font->get_size()); // no "size" in the table
-    ASSERT_NE(nullptr, font->get_char_material('a'));
     EXPECT_NE(-1, font->get_char_material('a')->get_material_handle());
 }
 
@@ -85,8 +67,7 @@ TEST_F(FontTest, ReadingStopsQuietlyWhereTheFileEndsOrBreaks) {
     EXPECT_EQ(nullptr, unknown->get_char_description(32));
     EXPECT_FLOAT_EQ(0.0625f / 8, unknown->get_height());
     // "dimension=16" is one token, and so an unknown key.
-    std::unique_ptr<CFont> glued = font_from("glued", "[common] dimension=16 [chars] 32 = 1");
-    EXPECT_EQ(nullptr, glued->get_char_description(32));
+    EXPECT_EQ(nullptr, font_from("glued", "[common] dimension=16 [chars] 32 = 1")->get_char_description(32));
     // Text behind the last entry isn't read; a code given twice keeps its last place.
     std::unique_ptr<CFont> tail =
         font_from("tail", "[common] dimension = 2 [chars] 65 = 1 65 = 1 66 = 1 67 = 1 68 = 1 garbage");
@@ -102,55 +83,49 @@ TEST_F(FontTest, TheFactoryExplainsWhatItCannotLoad) {
         " nameless = { file_type = 'nehe' }, other = { file_type = 'bmfont', file_name = 'o.fnt' },"
         " absent = { file_type = 'NeHe', file_name = 'absent.fnt' } }"
         "fonts = { no_charset = { material = {} }, no_material = { charset_name = 'absent' },"
-        " lost = { charset_name = 'missing', material = {} },"
-        " broken = { charset_name = 'broken', material = {} },"
+        " lost = { charset_name = 'missing', material = {} }, broken = { charset_name = 'broken', material = "
+        "{} },"
         " typeless = { charset_name = 'typeless', material = {} },"
-        " nameless = { charset_name = 'nameless', material = {} },"
-        " other = { charset_name = 'other', material = {} } }");
+        " nameless = { charset_name = 'nameless', material = {} }, other = { charset_name = 'other', "
+        "material = {} } }");
     for (char const *p_name : {"nothing", "no_charset", "no_material", "lost", "broken"})
-        EXPECT_EQ(nullptr, get_fonts_factory().create(p_name, &m_desktop)) << p_name;
+        EXPECT_EQ(nullptr, get_fonts_factory().create(p_name, &m_world.desktop())) << p_name;
     EXPECT_EQ(
         (std::vector<std::string>{
             "Cannot load the font 'nothing'", "Cannot load the font 'no_charset'\n'charset' record not found",
             "Cannot open 'absent.fnt'", "Cannot load the font 'no_material'\n'material' record not found",
             "Cannot load the charset 'missing'", "Cannot load the charset 'broken'"}),
-        capture.texts(qordebug::REPORT_WARNING));
-
+        capture.warnings());
     // Bad charsets are errors, and the fonts on them still come, without characters.
     for (char const *p_name : {"typeless", "nameless", "other"})
-        delete get_fonts_factory().create(p_name, &m_desktop);
+        delete get_fonts_factory().create(p_name, &m_world.desktop());
     EXPECT_EQ((std::vector<std::string>{"Cannot load the charset 'typeless'\nunknown 'file_type' record",
                                         "Cannot load the charset 'nameless'\nunknown 'file_name' record",
                                         "Cannot load the charset 'other'\nunknown 'file_type' "
                                         "record\nfile_type 'bmfont'\nfile_name 'o.fnt'"}),
-              capture.texts(qordebug::REPORT_ERROR));
+              capture.errors());
 }
 
 TEST_F(FontTest, FontsShareTheirCharsetAndScaleItBySize) {
     std::string const file = "[common] dimension = 2 font_h = 1 [chars] 65 = 1 66 = 0.5 67 = 1 68 = 1";
     std::unique_ptr<CFont> small = font_from("shared", file, ", size = 64");
     qortest::write_file(m_dir + "/shared.fnt", "[common] [chars]"); // read once per process: ignored
-    std::unique_ptr<CFont> large(get_fonts_factory().create("shared", &m_desktop));
+    std::unique_ptr<CFont> large(get_fonts_factory().create("shared", &m_world.desktop()));
     large->set_size(128);
     EXPECT_EQ(small->get_char_description('B'), large->get_char_description('B'));
     EXPECT_NE(small->get_char_material('B'), large->get_char_material('B'));
-    EXPECT_EQ(16, static_cast<int>(small->get_char_description('B')->w * small->get_size()));
-    EXPECT_EQ(32, static_cast<int>(large->get_char_description('B')->w * large->get_size()));
+    EXPECT_EQ(16, m_world.desktop().get_canvas().get_char_width('B', small.get()));
+    EXPECT_EQ(32, m_world.desktop().get_canvas().get_char_width('B', large.get()));
 }
 
-TEST_F(FontTest, TheDefaultFontsOfTheDataFolderLoad) {
-    qorbase::set_category_root(8, (qortest::source_dir() + "/data/fonts").c_str());
-    qorbase::set_category_root(16, (qortest::source_dir() + "/data/ui").c_str());
-    qortest::CReportCapture capture;
-    get_fonts_factory().init();
-    for (char const *p_name : {"arial_white", "courier"}) {
-        std::unique_ptr<CFont> font(get_fonts_factory().create(p_name, &m_desktop));
-        ASSERT_TRUE(font) << p_name;
-        EXPECT_GT(font->get_char_description('A')->w, 0.0f);
-        EXPECT_NE(font->get_char_description(0x416), font->get_char_description(0x20)); // Cyrillic
-        int const line_h = static_cast<int>(font->get_height() * font->get_size());
-        EXPECT_GE(line_h, 14) << p_name;
-        EXPECT_LE(line_h, 24) << p_name;
+TEST_F(FontTest, TheDefaultFontsOfTheDataFolderHaveLatinAndCyrillic) {
+    for (HUID const *p_id : {&FNT_NAME_DEFAULT, &FNT_NAME_FIXED}) {
+        CFont *p_font = m_world.desktop().get_font(*p_id);
+        ASSERT_NE(nullptr, p_font) << p_id->GetName();
+        EXPECT_GT(p_font->get_char_description('A')->w, 0.0f);
+        EXPECT_NE(p_font->get_char_description(0x416), p_font->get_char_description(0x20));
+        int const line_h = m_world.desktop().get_canvas().get_text_height(p_font);
+        EXPECT_GE(line_h, 14) << p_id->GetName();
+        EXPECT_LE(line_h, 24) << p_id->GetName();
     }
-    EXPECT_TRUE(capture.reports().empty());
 }

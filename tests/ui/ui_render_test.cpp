@@ -1,12 +1,8 @@
-// The render bridge against the host's recording renderer: device coordinates, clip areas, the
-// nesting of 2D and 3D, and the contracts.
+// The render bridge of the test world's desktop (320 by 240 on the host's screen of 1024 by 768)
+// against its recorder: device coordinates, clip areas, the nesting of 2D and 3D, the contracts.
 #include "ui_render.h"
 
-#include "commands.h"
-#include "engine_interfaces.h"
-#include "interface_server.h"
-#include "recording_renderer.h"
-#include "test_support.h"
+#include "test_world.h"
 
 #include <gtest/gtest.h>
 
@@ -16,27 +12,8 @@ namespace {
 
 class CViewportCamera : public IRenderCamera {
 public:
-    void set_viewport(int _x, int _y, int _w, int _h) override { m_x = _x, m_y = _y, m_w = _w, m_h = _h; }
-    int m_x = -1, m_y = -1, m_w = -1, m_h = -1;
-};
-
-// A desktop of 1024 by 768 on a screen of 1600 by 1200.
-class RenderTest : public ::testing::Test {
-protected:
-    void SetUp() override {
-        m_vars.set_var("scr_resx", "1600");
-        m_vars.set_var("scr_resy", "1200");
-        m_server.register_interface(&m_vars);
-        engine_interfaces().set_server(&m_server);
-        m_render.init(&m_recorder);
-        m_render.set_resolution(1024, 768);
-    }
-    void TearDown() override { engine_interfaces().set_server(nullptr); }
-
-    qorhost::CInterfaceServer m_server;
-    qorhost::CVarManager m_vars;
-    qorhost::CRecordingRenderer m_recorder;
-    CRender m_render;
+    void set_viewport(int _x, int _y, int _w, int _h) override { m_viewport = {_x, _y, _w, _h}; }
+    std::vector<int> m_viewport;
 };
 
 void expect_point(float _x, float _y, vec2_t const &_p) {
@@ -46,70 +23,50 @@ void expect_point(float _x, float _y, vec2_t const &_p) {
 
 } // namespace
 
-TEST_F(RenderTest, QuadsReachTheEngineInDeviceCoordinatesInTheirOrder) {
-    vec2_t const t0{0, 0}, t1{1, 0}, t2{1, 1}, t3{0, 1};
-    rgba_t const c0(1, 2, 3, 4), c1(5, 6, 7, 8), c2(9, 10, 11, 12), c3(13, 14, 15, 16);
-    m_render.draw_quad(point_t{0, 0}, point_t{1024, 0}, point_t{1024, 768}, point_t{256, 192}, t0, t1, t2, t3,
-                       c0, c1, c2, c3);
-    ASSERT_EQ(1u, m_recorder.calls().size());
-    qorhost::SRenderCall const &quad = m_recorder.calls()[0];
-    ASSERT_EQ(4u, quad.m_points.size());
-    expect_point(-1, 1, quad.m_points[0]);
-    expect_point(1, 1, quad.m_points[1]);
-    expect_point(1, -1, quad.m_points[2]);
-    expect_point(-0.5f, 0.5f, quad.m_points[3]);
-    expect_point(1, 0, quad.m_uvs[1]);
-    EXPECT_EQ(c2, quad.m_colours[2]);
+TEST(Render, QuadsLinesAndClipsReachTheEngineInDeviceCoordinates) {
+    qortest::CWorld world;
+    IRender &render = *world.desktop().get_render();
+    world.recorder().clear();
+    rgba_t const c2(9, 10, 11, 12);
+    render.draw_quad(point_t{0, 0}, point_t{320, 0}, point_t{320, 240}, point_t{80, 60}, vec2_t{0, 0},
+                     vec2_t{1, 0}, vec2_t{1, 1}, vec2_t{0, 1}, rgba_t(), rgba_t(), c2, rgba_t());
+    render.draw_line(point_t{160, 120}, point_t{0, 240}, rgba_t(), rgba_t());
+    render.set_clip_area(80, 60, 160, 60); // the engine takes the lower left corner and the size
+    ASSERT_EQ("draw_quad draw_line set_clip_rect", world.recorder().sequence());
+    std::vector<qorhost::SRenderCall> const &calls = world.recorder().calls();
+    expect_point(-1, 1, calls[0].m_points[0]);
+    expect_point(1, -1, calls[0].m_points[2]);
+    expect_point(-0.5f, 0.5f, calls[0].m_points[3]);
+    expect_point(1, 0, calls[0].m_uvs[1]);
+    EXPECT_EQ(c2, calls[0].m_colours[2]);
+    expect_point(0, 0, calls[1].m_points[0]);
+    expect_point(-1, -1, calls[1].m_points[1]);
+    expect_point(-0.5f, 0, calls[2].m_points[0]);
+    expect_point(1, 0.5f, calls[2].m_points[1]);
 }
 
-TEST_F(RenderTest, LinesHaveWidthOne) {
-    m_render.draw_line(point_t{512, 384}, point_t{0, 768}, rgba_t(255, 0, 0, 255), rgba_t(0, 0, 255, 255));
-    ASSERT_EQ("draw_line", m_recorder.sequence());
-    expect_point(0, 0, m_recorder.calls()[0].m_points[0]);
-    expect_point(-1, -1, m_recorder.calls()[0].m_points[1]);
-}
-
-TEST_F(RenderTest, AClipAreaGoesAsItsLowerLeftCornerAndSize) {
-    m_render.set_clip_area(0, 0, 1024, 768);
-    m_render.set_clip_area(256, 192, 512, 192);
-    ASSERT_EQ(2u, m_recorder.calls().size());
-    expect_point(-1, -1, m_recorder.calls()[0].m_points[0]);
-    expect_point(2, 2, m_recorder.calls()[0].m_points[1]);
-    expect_point(-0.5f, 0, m_recorder.calls()[1].m_points[0]);
-    expect_point(1, 0.5f, m_recorder.calls()[1].m_points[1]);
-}
-
-TEST_F(RenderTest, NestedFramesReachTheEngineAtEveryLevel) {
-    m_render.begin_draw();
-    m_render.begin_draw();
-    m_render.end_draw();
-    m_render.end_draw();
-    EXPECT_EQ("begin_2d begin_2d end_2d end_2d", m_recorder.sequence());
-    qortest::CReportCapture capture;
-    m_render.end_draw();
-    ASSERT_EQ(1u, capture.texts(qordebug::REPORT_ASSERT).size());
-    EXPECT_NE(std::string::npos,
-              capture.texts(qordebug::REPORT_ASSERT)[0].find("mp_render && m_in_draw_2d > 0"));
-    EXPECT_EQ("begin_2d begin_2d end_2d end_2d", m_recorder.sequence());
-}
-
-TEST_F(RenderTest, AViewSuspendsTheTwoDimensionalBatchAndScalesItsViewport) {
+TEST(Render, FramesNestAndAViewSuspendsTheBatchAndScalesItsViewportToTheScreen) {
+    qortest::CWorld world(320, 200); // another shape than the screen's
+    IRender &render = *world.desktop().get_render();
+    world.recorder().clear();
     CViewportCamera camera;
-    m_render.begin_draw();
-    m_render.render_view(256, 192, 512, 384, &camera);
-    m_render.end_draw();
-    EXPECT_EQ("begin_2d end_2d render_view finish_view begin_2d end_2d", m_recorder.sequence());
-    EXPECT_EQ(400, camera.m_x);
-    EXPECT_EQ(300, camera.m_y);
-    EXPECT_EQ(800, camera.m_w);
-    EXPECT_EQ(600, camera.m_h);
+    render.begin_draw();
+    render.begin_draw();
+    render.render_view(10, 25, 100, 50, &camera);
+    render.end_draw();
+    render.end_draw();
+    EXPECT_EQ("begin_2d begin_2d end_2d render_view finish_view begin_2d end_2d end_2d",
+              world.recorder().sequence());
+    EXPECT_EQ((std::vector<int>{32, 96, 320, 192}), camera.m_viewport);
 
-    m_recorder.clear();
-    m_render.render_view(0, 0, 10, 10, nullptr); // outside a frame, with no camera
-    EXPECT_EQ("render_view finish_view", m_recorder.sequence());
+    qortest::CReportCapture capture;
+    render.end_draw(); // one end too many
+    EXPECT_EQ(8u, world.recorder().calls().size());
+    ASSERT_EQ(1u, capture.asserts().size());
+    EXPECT_NE(std::string::npos, capture.asserts()[0].find("mp_render && m_in_draw_2d > 0"));
 }
 
-TEST(RenderBridge, WithoutARendererEveryCallIsAReportedNoOp) {
+TEST(Render, WithoutARendererEveryCallIsAReportedNoOp) {
     qortest::CReportCapture capture;
     CRender render;
     render.init(nullptr);
@@ -119,7 +76,7 @@ TEST(RenderBridge, WithoutARendererEveryCallIsAReportedNoOp) {
               render.create_material("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false));
     render.draw_line(point_t{0, 0}, point_t{1, 1}, rgba_t(), rgba_t());
     EXPECT_EQ(nullptr, render.get_avi_texture(0));
-    std::vector<std::string> const asserts = capture.texts(qordebug::REPORT_ASSERT);
+    std::vector<std::string> const asserts = capture.asserts();
     ASSERT_EQ(4u, asserts.size());
     EXPECT_NE(std::string::npos, asserts[0].find("_p_render"));
     EXPECT_NE(std::string::npos, asserts[1].find("mp_render"));

@@ -1,99 +1,72 @@
-// The window tree: routing and filtering of events, the tree's order, geometry and alignment,
-// flags, and the layout tables of windows.
+// The window tree on the test world's desktop: routing and filtering of events, the tree's order,
+// geometry and alignment, flags, deletion, and the layout tables of windows.
 #include "ui_window.h"
 
-#include "engine_interfaces.h"
 #include "qorbase.h"
-#include "qorscriptsystem.h"
-#include "test_desktop.h"
-#include "test_support.h"
+#include "test_world.h"
 
 #include <gtest/gtest.h>
 
-#include <functional>
-#include <string>
-#include <vector>
+#include <sstream>
 
 using namespace qorui;
+using qortest::lua_table;
 
 namespace {
 
-typedef std::vector<std::string> calls_t;
+typedef std::vector<std::string> lines_t;
 
-// A callback that writes "window:event" for every event it sees.
-struct SRecorder {
-    calls_t *mp_calls;
-    std::string m_name;
-    void operator()(CWndEvent const *_p_event) const {
-        mp_calls->push_back(m_name + ":" + std::to_string(_p_event->get_id()));
-    }
-};
-
+// root [a [a1, a2], b] on the desktop; _watched events of each are logged.
 class WindowTest : public ::testing::Test {
 protected:
-    // A window that records the given events behind its own handlers.
-    CWindow *make(char const *_name, std::vector<EEventType> const &_recorded = {}) {
-        CWindow *p_wnd = new CWindow(&m_desktop, _name);
-        for (EEventType id : _recorded)
-            p_wnd->register_callback(id, CEventCallback(SRecorder{&m_calls, _name}));
+    void make_tree(std::vector<EEventType> const &_watched) {
+        mp_root = make(&m_world.desktop(), "root", _watched);
+        mp_a = make(mp_root, "a", _watched);
+        mp_a1 = make(mp_a, "a1", _watched);
+        mp_a2 = make(mp_a, "a2", _watched);
+        mp_b = make(mp_root, "b", _watched);
+        m_log.take();
+    }
+    CWindow *make(CWindow *_p_parent, char const *_name, std::vector<EEventType> const &_watched = {}) {
+        CWindow *p_wnd = new CWindow(&m_world.desktop(), _name);
+        m_log.watch(p_wnd, _watched);
+        _p_parent->attach_child(p_wnd);
         return p_wnd;
     }
-
-    // root [a [a1, a2], b]
-    void make_tree(std::vector<EEventType> const &_recorded) {
-        mp_root = make("root", _recorded);
-        mp_a = make("a", _recorded);
-        mp_a1 = make("a1", _recorded);
-        mp_a2 = make("a2", _recorded);
-        mp_b = make("b", _recorded);
-        mp_root->attach_child(mp_a);
-        mp_root->attach_child(mp_b);
-        mp_a->attach_child(mp_a1);
-        mp_a->attach_child(mp_a2);
-        m_calls.clear();
-        m_desktop.m_calls.clear();
-    }
-
     void send(CWindow *_p_to, EEventType _id, CWndEvent::EDispatchType _type) {
         _p_to->send_event(_p_to, _id, _type);
     }
+    // Each window of the tree with the event, in the order given.
+    static lines_t each(std::vector<char const *> const &_names, EEventType _id) {
+        lines_t lines;
+        for (char const *p_name : _names)
+            lines.push_back(std::string(p_name) + ":" + qortest::event_name(_id));
+        return lines;
+    }
 
-    void TearDown() override { delete mp_root; }
-
-    qortest::CTestDesktop m_desktop;
-    calls_t m_calls;
-    CWindow *mp_root = nullptr;
-    CWindow *mp_a = nullptr;
-    CWindow *mp_a1 = nullptr;
-    CWindow *mp_a2 = nullptr;
-    CWindow *mp_b = nullptr;
+    qortest::CWorld m_world;
+    qortest::CEventLog m_log;
+    CWindow *mp_root = nullptr, *mp_a = nullptr, *mp_a1 = nullptr, *mp_a2 = nullptr, *mp_b = nullptr;
 };
 
-std::vector<EEventType> all_event_types() {
-    std::vector<EEventType> types;
-    for (int id = 0; id <= EVENT_RESOURCE_INVALIDATE; ++id)
-        if (id != 29 && id != 30) types.push_back(static_cast<EEventType>(id));
-    return types;
-}
-
 // The events that pass a window with the given flags, found by sending each one.
-std::vector<int> passing_events(bool _hidden, bool _disabled) {
-    qortest::CTestDesktop desktop;
+std::vector<int> passing_events(IWindowDesktop *_p_desktop, bool _hidden, bool _disabled) {
     std::vector<int> passed;
-    for (EEventType id : all_event_types()) {
-        CWindow window(&desktop, "probe");
+    for (int id = EVENT_UPDATE; id <= EVENT_RESOURCE_INVALIDATE; ++id) {
+        if (id == 29 || id == 30) continue; // no events of these values
+        CWindow window(_p_desktop, "probe");
         window.set_hidden(_hidden);
         window.set_disabled(_disabled);
-        calls_t calls;
-        window.register_callback(id, CEventCallback(SRecorder{&calls, "probe"}));
-        CWndEvent event(id);
-        event << 0 << 0; // enough for the handlers that read
-        if (id == EVENT_DRAG || id == EVENT_REPORT_POINT_INSIDE) {
-            event.release();
-            event << point_t{0, 0};
-        }
+        bool taken = false;
+        window.register_callback(static_cast<EEventType>(id),
+                                 CEventCallback([&](CWndEvent const *) { taken = true; }));
+        CWndEvent event(static_cast<EEventType>(id));
+        if (id == EVENT_DRAG || id == EVENT_REPORT_POINT_INSIDE)
+            event << point_t{-1, -1};
+        else
+            event << 0 << 0; // enough for the handlers that read
         window.send_event(&window, &event, CWndEvent::DISPATCH_NONE);
-        if (!calls.empty()) passed.push_back(id);
+        if (taken) passed.push_back(id);
     }
     return passed;
 }
@@ -104,79 +77,63 @@ std::vector<int> passing_events(bool _hidden, bool _disabled) {
 // Routing and filtering
 // ---------------------------------------------------------------------------------------------
 
-TEST_F(WindowTest, DispatchTypesDecideWhereAnEventGoes) {
-    make_tree({EVENT_CLICK});
-    send(mp_root, EVENT_CLICK, CWndEvent::DISPATCH_NONE);
-    EXPECT_EQ((calls_t{"root:24"}), m_calls);
-
-    m_calls.clear();
-    send(mp_root, EVENT_CLICK, CWndEvent::DISPATCH_CHILDREN); // back to front, depth first
-    EXPECT_EQ((calls_t{"root:24", "a:24", "a1:24", "a2:24", "b:24"}), m_calls);
-
-    m_calls.clear();
-    send(mp_a2, EVENT_CLICK, CWndEvent::DISPATCH_PARENT);
-    EXPECT_EQ((calls_t{"a2:24", "a:24", "root:24"}), m_calls);
-}
-
-TEST_F(WindowTest, DefaultHandlersSpreadTheirEventsThroughTheSubtree) {
+TEST_F(WindowTest, DispatchTypesAndDefaultHandlersDecideWhereAnEventGoes) {
     make_tree(
-        {EVENT_UPDATE, EVENT_DRAW, EVENT_LOST_FOCUS, EVENT_RESOURCE_INVALIDATE, EVENT_RESIZED, EVENT_CLICK});
+        {EVENT_CLICK, EVENT_UPDATE, EVENT_DRAW, EVENT_LOST_FOCUS, EVENT_RESOURCE_INVALIDATE, EVENT_RESIZED});
+    send(mp_root, EVENT_CLICK, CWndEvent::DISPATCH_NONE);
+    EXPECT_EQ(each({"root"}, EVENT_CLICK), m_log.take());
+    send(mp_root, EVENT_CLICK, CWndEvent::DISPATCH_CHILDREN); // back to front, depth first
+    EXPECT_EQ(each({"root", "a", "a1", "a2", "b"}, EVENT_CLICK), m_log.take());
+    send(mp_a2, EVENT_CLICK, CWndEvent::DISPATCH_PARENT);
+    EXPECT_EQ(each({"a2", "a", "root"}, EVENT_CLICK), m_log.take());
     for (EEventType id :
          {EVENT_UPDATE, EVENT_DRAW, EVENT_LOST_FOCUS, EVENT_RESOURCE_INVALIDATE, EVENT_RESIZED}) {
-        m_calls.clear();
         send(mp_root, id, CWndEvent::DISPATCH_NONE);
-        std::string const n = std::to_string(id);
-        EXPECT_EQ((calls_t{"root:" + n, "a:" + n, "a1:" + n, "a2:" + n, "b:" + n}), m_calls) << id;
+        EXPECT_EQ(each({"root", "a", "a1", "a2", "b"}, id), m_log.take());
     }
-}
-
-TEST_F(WindowTest, AHandlerThatStoresTypeZeroStopsOnlyItsOwnSubtree) {
-    make_tree({EVENT_UPDATE});
+    // A handler that stores type 0 stops its own subtree only.
     mp_a->register_callback(EVENT_UPDATE, CEventCallback([](CWndEvent const *p_event) {
                                 p_event->set_dispatch_type(CWndEvent::DISPATCH_NONE);
                             }));
     send(mp_root, EVENT_UPDATE, CWndEvent::DISPATCH_NONE);
-    EXPECT_EQ((calls_t{"root:0", "a:0", "b:0"}), m_calls); // b's parent loop goes on
+    EXPECT_EQ(each({"root", "a", "b"}, EVENT_UPDATE), m_log.take());
 }
 
 TEST_F(WindowTest, AnEventRisingToTheRootNamesEachParentAsActivator) {
     make_tree({});
-    std::vector<std::string> activators;
+    lines_t activators;
     for (CWindow *p_wnd : {mp_a1, mp_a, mp_root})
         p_wnd->register_callback(EVENT_CLICK, CEventCallback([&activators](CWndEvent const *p_event) {
                                      activators.push_back(p_event->get_activator()->get_name());
                                  }));
     mp_b->send_event(mp_a1, EVENT_CLICK, CWndEvent::DISPATCH_PARENT);
-    EXPECT_EQ((std::vector<std::string>{"b", "a", "root"}), activators);
+    EXPECT_EQ((lines_t{"b", "a", "root"}), activators);
 }
 
-TEST(WindowFilter, HiddenAndDisabledWindowsTakeOnlyTheirListedEvents) {
-    EXPECT_EQ((std::vector<int>{0, 3, 9, 10, 12, 27, 43}), passing_events(true, false));
-    EXPECT_EQ((std::vector<int>{1, 2, 3, 6, 9, 12, 16, 26, 43}), passing_events(false, true));
-    EXPECT_EQ((std::vector<int>{3, 9, 12, 43}), passing_events(true, true));
-    EXPECT_EQ(all_event_types().size(), passing_events(false, false).size());
+TEST_F(WindowTest, HiddenAndDisabledWindowsTakeOnlyTheirListedEvents) {
+    IWindowDesktop *p_desktop = &m_world.desktop();
+    EXPECT_EQ((std::vector<int>{EVENT_UPDATE, EVENT_SHOW, EVENT_ENABLE, EVENT_DISABLE, EVENT_RESIZED,
+                                EVENT_SET_TEXT, EVENT_RESOURCE_INVALIDATE}),
+              passing_events(p_desktop, true, false));
+    EXPECT_EQ(
+        (std::vector<int>{EVENT_DRAW, EVENT_HIDE, EVENT_SHOW, EVENT_ACTIVATE, EVENT_ENABLE, EVENT_RESIZED,
+                          EVENT_REPORT_POINT_INSIDE, EVENT_CHANGED, EVENT_RESOURCE_INVALIDATE}),
+        passing_events(p_desktop, false, true));
+    EXPECT_EQ((std::vector<int>{EVENT_SHOW, EVENT_ENABLE, EVENT_RESIZED, EVENT_RESOURCE_INVALIDATE}),
+              passing_events(p_desktop, true, true));
+    EXPECT_EQ(42u, passing_events(p_desktop, false, false).size());
 }
 
-TEST_F(WindowTest, AHiddenWindowStopsItsSubtreeButNotItsSiblings) {
-    make_tree({EVENT_DRAW, EVENT_RESIZED});
-    mp_a->set_hidden(true);
-    send(mp_root, EVENT_DRAW, CWndEvent::DISPATCH_CHILDREN);
-    EXPECT_EQ((calls_t{"root:1", "b:1"}), m_calls);
-    m_calls.clear();
-    send(mp_root, EVENT_RESIZED, CWndEvent::DISPATCH_NONE); // resized passes: hidden windows follow
-    EXPECT_EQ((calls_t{"root:12", "a:12", "a1:12", "a2:12", "b:12"}), m_calls);
-    EXPECT_EQ((calls_t{"on_hide a"}), m_desktop.m_calls);
-}
-
-TEST_F(WindowTest, GlobalPositionsAreRefreshedByEvents) {
-    make_tree({});
+// Resized passes hidden windows, so their subtree's global positions follow.
+TEST_F(WindowTest, AHiddenWindowStopsItsSubtreeButResizedReachesIt) {
+    make_tree({EVENT_DRAW});
     mp_a->set_pos(10, 20);
     mp_a1->set_pos(1, 2);
     EXPECT_EQ(11, mp_a1->get_global_pos().x);
-    EXPECT_EQ(22, mp_a1->get_global_pos().y);
     mp_a->set_hidden(true);
-    mp_root->set_pos(100, 100); // the root has no parent: its global position stays (0, 0)
-    mp_a->set_pos(30, 30);      // resized passes hidden windows
+    send(mp_root, EVENT_DRAW, CWndEvent::DISPATCH_CHILDREN);
+    EXPECT_EQ(each({"root", "b"}, EVENT_DRAW), m_log.take());
+    mp_a->set_pos(30, 30);
     EXPECT_EQ(31, mp_a1->get_global_pos().x);
     point_t const local = mp_a1->convert_to_local(point_t{40, 40});
     EXPECT_EQ(9, local.x);
@@ -187,80 +144,69 @@ TEST_F(WindowTest, GlobalPositionsAreRefreshedByEvents) {
 // The tree
 // ---------------------------------------------------------------------------------------------
 
-TEST_F(WindowTest, AttachingTwiceMovesToTheFrontOnce) {
+TEST_F(WindowTest, AttachingMovesToTheFrontBehindAlwaysOnTopWindows) {
     make_tree({EVENT_RESOURCE_INVALIDATE});
+    CWindow *p_top = make(mp_root, "top");
+    p_top->set_is_modal(true); // modal is always on top
     mp_root->attach_child(mp_a);
-    EXPECT_EQ(2u, mp_root->get_children_count());
-    EXPECT_EQ(mp_b, mp_root->get_child(0u));
-    EXPECT_EQ(mp_a, mp_root->get_child(1u));
-    EXPECT_EQ((calls_t{"a:43", "a1:43", "a2:43"}), m_calls); // the subtree looks its resources up
-}
-
-TEST_F(WindowTest, AlwaysOnTopWindowsStayInFront) {
-    make_tree({});
-    CWindow *p_top = make("top");
-    p_top->set_always_on_top(true);
-    mp_root->attach_child(p_top);
-    mp_root->bring_to_front(mp_a);
+    EXPECT_EQ(3u, mp_root->get_children_count());
     EXPECT_EQ(mp_b, mp_root->get_child(0u));
     EXPECT_EQ(mp_a, mp_root->get_child(1u));
     EXPECT_EQ(p_top, mp_root->get_child(2u));
+    EXPECT_EQ(each({"a", "a1", "a2"}, EVENT_RESOURCE_INVALIDATE), m_log.take()); // resources looked up
 
     qortest::CReportCapture capture;
     mp_root->bring_to_front(mp_a1); // not a child of root
-    EXPECT_EQ(1u, capture.texts(qordebug::REPORT_ASSERT).size());
     EXPECT_EQ(nullptr, mp_root->get_child(3u));
-    EXPECT_EQ(2u, capture.texts(qordebug::REPORT_ASSERT).size());
+    EXPECT_EQ(2u, capture.asserts().size());
 }
 
-TEST_F(WindowTest, PassiveStateFlowsDownward) {
+TEST_F(WindowTest, PassiveStateFlowsDownOnlyWhenItChanges) {
     make_tree({});
-    CWindow *p_passive_parent = make("passive");
-    p_passive_parent->set_passive(true);
+    CWindow *p_passive = make(mp_root, "passive");
+    p_passive->set_passive(true);
     mp_root->detach_child(mp_a);
-    p_passive_parent->attach_child(mp_a);
-    EXPECT_TRUE(mp_a->is_passive());
+    p_passive->attach_child(mp_a);
     EXPECT_TRUE(mp_a1->is_passive());
-    mp_root->attach_child(p_passive_parent);
-
-    // Attaching to a non-passive parent doesn't clear a passive child.
-    p_passive_parent->detach_child(mp_a);
-    mp_root->attach_child(mp_a);
+    p_passive->detach_child(mp_a);
+    mp_root->attach_child(mp_a); // a non-passive parent doesn't clear it
     EXPECT_TRUE(mp_a->is_passive());
-
-    // An unchanged value visits nobody, even a child with another value.
     mp_a1->set_passive(false);
-    mp_a->set_passive(true);
+    mp_a->set_passive(true); // unchanged: visits nobody
     EXPECT_FALSE(mp_a1->is_passive());
-    mp_a->set_passive(false);
-    EXPECT_FALSE(mp_a2->is_passive());
 }
 
 TEST_F(WindowTest, LookupPrefersDirectChildrenThenGoesDepthFirst) {
     make_tree({});
-    CWindow *p_deep_b = make("b");
-    mp_a1->attach_child(p_deep_b);
-    EXPECT_EQ(mp_b, mp_root->get_child("b", nullptr, false));
+    CWindow *p_deep_b = make(mp_a1, "b");
     EXPECT_EQ(mp_b, mp_root->get_child("b", "Window", true));
     EXPECT_EQ(nullptr, mp_root->get_child("b", "WindowVisual", false));
     EXPECT_EQ(nullptr, mp_root->get_child("a2", nullptr, true));
     EXPECT_EQ(mp_a2, mp_root->get_child("a2", nullptr, false));
     EXPECT_EQ(p_deep_b, mp_a->get_child("b", nullptr, false));
     EXPECT_EQ(nullptr, mp_root->get_child("B", nullptr, false)); // exact names
-
     qor_vector<CWindow *> all;
     mp_root->get_children(all);
     EXPECT_EQ((qor_vector<CWindow *>{mp_a, mp_a1, p_deep_b, mp_a2, mp_b}), all);
 }
 
-TEST_F(WindowTest, DeletingAWindowDeletesItsSubtreeAndTellsTheDesktop) {
+// The desktop forgets a deleted window: activation goes back, and keys find no stale receiver.
+TEST_F(WindowTest, DeletingAWindowDeletesItsSubtreeAndTheDesktopForgetsIt) {
     make_tree({});
-    mp_a->input_subscribe(true);
+    m_world.desktop().set_active_window(mp_b);
+    m_world.desktop().set_active_window(mp_a1);
+    mp_a1->input_subscribe(true);
     delete mp_a;
-    EXPECT_EQ((calls_t{"subscribe a", "unsubscribe a", "unsubscribe a1", "on_delete a1", "unsubscribe a2",
-                       "on_delete a2", "on_delete a"}),
-              m_desktop.m_calls);
     EXPECT_EQ(1u, mp_root->get_children_count());
+    EXPECT_EQ(mp_b, m_world.desktop().get_active_window());
+    m_world.key(0x41);
+
+    // Hidden with auto delete, a window is queued and goes at the next update.
+    mp_b->set_auto_delete(true);
+    send(mp_b, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
+    EXPECT_EQ(1u, mp_root->get_children_count());
+    m_world.desktop().update(0);
+    EXPECT_EQ(0u, mp_root->get_children_count());
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -271,34 +217,28 @@ TEST_F(WindowTest, ResizeGoesThroughTheHandlerAndTheConstraints) {
     make_tree({EVENT_RESIZE, EVENT_RESIZED});
     mp_a->set_size(-5, 30);
     EXPECT_EQ(0, mp_a->get_w());
-    EXPECT_EQ(30, mp_a->get_h());
-    // Resize reaches only the window; resized spreads.
-    EXPECT_EQ((calls_t{"a:11", "a:12", "a1:12", "a2:12"}), m_calls);
-
+    lines_t expected = {"a:EVENT_RESIZE"}; // only the window; resized spreads
+    for (std::string const &line : each({"a", "a1", "a2"}, EVENT_RESIZED))
+        expected.push_back(line);
+    EXPECT_EQ(expected, m_log.take());
     mp_a->set_constraints(SConstraints{0, 40, 0, 0});
     mp_a->set_size(100, 30);
     EXPECT_EQ(40, mp_a->get_w());
-
+    m_log.take();
     mp_a->set_can_resize(false);
-    m_calls.clear();
     mp_a->set_size(10, 10);
     EXPECT_EQ(40, mp_a->get_w());
-    EXPECT_EQ((calls_t{"a:11", "a:12", "a1:12", "a2:12"}), m_calls); // resized is sent all the same
-
-    mp_a->set_hidden(true); // the filter keeps resize from the handler: the size goes through
+    EXPECT_EQ(expected, m_log.take()); // sent all the same
+    mp_a->set_hidden(true);            // the filter keeps resize from the handler: the size goes through
     mp_a->set_size(10, 10);
     EXPECT_EQ(10, mp_a->get_w());
-}
 
-TEST_F(WindowTest, AHandlerCorrectsTheSizeInPlace) {
-    make_tree({});
     mp_b->register_callback(EVENT_RESIZE, CEventCallback([](CWndEvent const *p_event) {
                                 int &w = p_event->get<int>();
-                                w = w * 2;
+                                w *= 2; // corrected in place
                             }));
     mp_b->set_size(21, 7);
     EXPECT_EQ(42, mp_b->get_w());
-    EXPECT_EQ(7, mp_b->get_h());
 }
 
 TEST_F(WindowTest, EachAlignmentPlacesAndSizesInTheParentsClientArea) {
@@ -307,40 +247,37 @@ TEST_F(WindowTest, EachAlignmentPlacesAndSizesInTheParentsClientArea) {
     struct {
         EAlignment m_alignment;
         int m_x, m_y, m_w, m_h;
-    } const cases[] = {
+    } const rows[] = {
         {ALIGNMENT_NONE, 7, 9, 50, 21},     {ALIGNMENT_TOP, 0, 0, 101, 21},
         {ALIGNMENT_LEFT, 0, 0, 50, 81},     {ALIGNMENT_RIGHT, 51, 0, 50, 81},
         {ALIGNMENT_BOTTOM, 0, 60, 101, 21}, {ALIGNMENT_CENTER, 25, 30, 50, 21},
         {ALIGNMENT_CLIENT, 0, 0, 101, 81},
     };
-    for (auto const &c : cases) {
+    for (auto const &row : rows) {
+        SCOPED_TRACE(g_alignment_names[row.m_alignment]);
         mp_b->set_alignment(ALIGNMENT_NONE);
         mp_b->set_pos(7, 9);
         mp_b->set_size(50, 21);
-        mp_b->set_alignment(c.m_alignment);
-        EXPECT_EQ(c.m_x, mp_b->get_pos().x) << g_alignment_names[c.m_alignment];
-        EXPECT_EQ(c.m_y, mp_b->get_pos().y) << g_alignment_names[c.m_alignment];
-        EXPECT_EQ(c.m_w, mp_b->get_w()) << g_alignment_names[c.m_alignment];
-        EXPECT_EQ(c.m_h, mp_b->get_h()) << g_alignment_names[c.m_alignment];
+        mp_b->set_alignment(row.m_alignment);
+        EXPECT_EQ(row.m_x, mp_b->get_pos().x);
+        EXPECT_EQ(row.m_y, mp_b->get_pos().y);
+        EXPECT_EQ(row.m_w, mp_b->get_w());
+        EXPECT_EQ(row.m_h, mp_b->get_h());
     }
-    // Children follow their parent's new size.
-    mp_b->set_alignment(ALIGNMENT_CLIENT);
-    mp_root->set_size(200, 100);
+    mp_root->set_size(200, 100); // children follow their parent's size
     EXPECT_EQ(200, mp_b->get_w());
-    // Constraints count: a centred window is placed by its constrained size.
     mp_b->set_alignment(ALIGNMENT_NONE);
     mp_b->set_constraints(SConstraints{0, 30, 0, 0});
-    mp_b->set_alignment(ALIGNMENT_CENTER);
+    mp_b->set_alignment(ALIGNMENT_CENTER); // placed by its constrained size
     EXPECT_EQ(85, mp_b->get_pos().x);
 }
 
-TEST_F(WindowTest, MaximisedWindowsFillTheWholeParentAndComeBack) {
+TEST_F(WindowTest, MaximisedWindowsFillTheParentAndComeBack) {
     make_tree({});
     mp_root->set_size(300, 200);
     mp_b->set_pos(5, 6);
     mp_b->set_size(20, 10);
     mp_b->set_maximaized(true);
-    EXPECT_TRUE(mp_b->is_maximaized());
     EXPECT_EQ(0, mp_b->get_pos().x);
     EXPECT_EQ(300, mp_b->get_w());
     mp_root->set_size(400, 250);
@@ -349,7 +286,6 @@ TEST_F(WindowTest, MaximisedWindowsFillTheWholeParentAndComeBack) {
     EXPECT_EQ(5, mp_b->get_pos().x);
     EXPECT_EQ(6, mp_b->get_pos().y);
     EXPECT_EQ(20, mp_b->get_w());
-    EXPECT_EQ(10, mp_b->get_h());
 }
 
 TEST_F(WindowTest, DraggingMovesOnlyWindowsThatAllowIt) {
@@ -365,36 +301,138 @@ TEST_F(WindowTest, DraggingMovesOnlyWindowsThatAllowIt) {
     EXPECT_EQ(-8, mp_b->get_pos().y);
 }
 
-TEST_F(WindowTest, ThePointTestExcludesRightAndBottomEdges) {
+// A click activates the window the hit test found: disabled windows are found too, and the right
+// and bottom edges lie outside.
+TEST_F(WindowTest, TheHitTestFindsTheDeepestWindowInsideItsEdges) {
     make_tree({});
     mp_a->set_pos(10, 10);
     mp_a->set_size(5, 5);
     mp_a1->set_size(2, 2);
-    mp_a->set_disabled(true); // disabled windows still report points
-    for (point_t const point : {point_t{10, 10}, point_t{14, 14}, point_t{15, 10}}) {
-        CWndEvent report(EVENT_REPORT_POINT_INSIDE);
-        report << point;
-        mp_root->send_event(mp_root, &report, CWndEvent::DISPATCH_CHILDREN);
+    mp_a->set_disabled(true);
+    struct {
+        int m_x, m_y;
+        CWindow *mp_expected;
+    } const rows[] = {
+        {10, 10, mp_a1}, {14, 14, mp_a}, {15, 10, &m_world.desktop()}, {10, 15, &m_world.desktop()}};
+    for (auto const &row : rows) {
+        SCOPED_TRACE(std::to_string(row.m_x) + ", " + std::to_string(row.m_y));
+        m_world.click_at(row.m_x, row.m_y);
+        EXPECT_EQ(row.mp_expected, m_world.desktop().get_active_window());
     }
-    EXPECT_EQ((calls_t{"report a", "report a1", "report a"}), m_desktop.m_calls);
 }
 
-TEST_F(WindowTest, HidingAnAutoDeleteWindowQueuesItAtTheDesktop) {
-    make_tree({});
-    mp_b->set_auto_delete(true);
-    send(mp_b, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
-    EXPECT_TRUE(mp_b->is_hidden());
-    EXPECT_EQ((calls_t{"on_hide b", "delete_window b"}), m_desktop.m_calls);
-    m_desktop.m_calls.clear();
-    mp_a->set_auto_delete(true);
-    mp_a->set_hidden(true); // the quiet way looks at nothing
-    EXPECT_EQ((calls_t{"on_hide a"}), m_desktop.m_calls);
+// ---------------------------------------------------------------------------------------------
+// Layouts
+// ---------------------------------------------------------------------------------------------
+
+namespace {
+
+// root [panel [ok]] with values that differ from a window's defaults.
+class LayoutTest : public WindowTest {
+protected:
+    void SetUp() override {
+        mp_root = make(&m_world.desktop(), "root");
+        CWindow *p_panel = make(mp_root, "panel");
+        p_panel->set_pos(10, 20);
+        p_panel->set_size(300, 200);
+        p_panel->set_can_drag(true);
+        p_panel->set_alignment(ALIGNMENT_CENTER);
+        CWindow *p_ok = make(p_panel, "ok");
+        p_ok->set_size(80, 24);
+        p_ok->set_is_modal(true);
+        p_ok->set_auto_delete(true);
+    }
+    static std::string dumped(LuaPlus::LuaObject const &_table) {
+        std::ostringstream out;
+        _table.dump("ui_windows_ini", out);
+        return out.str();
+    }
+};
+
+} // namespace
+
+TEST_F(LayoutTest, ATreeSavedAndLoadedIntoAFreshRootComesBackTheSame) {
+    LuaPlus::LuaObject table = qortest::saved_state(mp_root);
+    // A child goes behind the ten keys of a window, at 11.
+    EXPECT_EQ(11, table.GetTableCount());
+    LuaPlus::LuaObject const panel = table.GetByIndex(11);
+    EXPECT_STREQ("ALIGNMENT_CENTER", panel.GetByName("alignment").GetString());
+    EXPECT_EQ(300, panel.GetByName("size").GetByIndex(1).GetInteger());
+    EXPECT_TRUE(panel.GetByIndex(11).GetByName("is_modal").GetBoolean());
+
+    CWindow *p_fresh = make(&m_world.desktop(), "root");
+    p_fresh->load_state(table);
+    p_fresh->load_state(table); // the second load finds every window and makes none
+    ASSERT_EQ(1u, p_fresh->get_children_count());
+    CWindow *p_ok = p_fresh->get_child("ok", "Window", false);
+    ASSERT_NE(nullptr, p_ok);
+    EXPECT_EQ(1u, p_fresh->get_child(0u)->get_children_count());
+    EXPECT_TRUE(p_ok->is_always_on_top());
+    EXPECT_EQ(dumped(table), dumped(qortest::saved_state(p_fresh)));
 }
 
-TEST_F(WindowTest, ModalWindowsAreAlwaysOnTopUntilCleared) {
-    make_tree({});
-    mp_a->set_is_modal(true);
-    EXPECT_TRUE(mp_a->is_always_on_top());
-    mp_a->set_is_modal(false);
-    EXPECT_TRUE(mp_a->is_always_on_top());
+TEST_F(LayoutTest, AbsentAndWronglyTypedKeysLeaveValuesAlone) {
+    LuaPlus::LuaObject table =
+        lua_table("{ name = 'root', class_name = 'Window', pos = 5, size = { 7.9, -3.7 },"
+                  " can_drag = 'yes', alignment = 'alignment_client', is_modal = 1 }");
+    mp_root->set_pos(3, 4);
+    mp_root->load_state(table);
+    EXPECT_EQ(3, mp_root->get_pos().x);
+    EXPECT_EQ(7, mp_root->get_w()); // truncated toward zero
+    EXPECT_EQ(0, mp_root->get_h());
+    EXPECT_FALSE(mp_root->is_can_drag());
+    EXPECT_EQ(ALIGNMENT_NONE, mp_root->get_alignment());
+    EXPECT_FALSE(mp_root->is_modal());
+
+    qortest::CReportCapture capture; // a table for another window
+    make(&m_world.desktop(), "other")->load_state(table);
+    ASSERT_EQ(1u, capture.asserts().size());
+    EXPECT_NE(std::string::npos, capture.asserts()[0].find(
+                                     "strcmp(_lo_table.GetByName(\"name\").GetString(), get_name()) == 0"));
+}
+
+TEST_F(LayoutTest, UnknownClassesAreSkippedAndTheFactoryMakesTheRest) {
+    LuaPlus::LuaObject table = lua_table(
+        "{ name = 'root', class_name = 'Window',"
+        " { name = 'ghost', class_name = 'NoSuchClass', { name = 'inner', class_name = 'Window' } },"
+        " { name = 'panel', class_name = 'WINDOW' } }"); // hashes fold case
+    qortest::CReportCapture capture;
+    mp_root->load_state(table);
+    EXPECT_EQ(nullptr, mp_root->get_child("ghost", nullptr, false));
+    EXPECT_EQ(nullptr, mp_root->get_child("inner", nullptr, false));
+    // "WINDOW" isn't the class name "Window": a second panel is made by the same hash, whose own
+    // load then finds the class name differing.
+    EXPECT_EQ(2u, mp_root->get_children_count());
+    EXPECT_EQ(1u, capture.asserts().size());
+
+    static int s_made = 0;
+    get_windows_factory().Register(HUID("TestCounted"), nullptr);
+    get_windows_factory().Register(HUID("testcounted"), [](IWindowDesktop *p_desktop, char const *p_name) {
+        ++s_made;
+        return new CWindow(p_desktop, p_name);
+    });
+    delete get_windows_factory().Create(HUID("TESTCOUNTED"), &m_world.desktop(), "y"); // the last wins
+    EXPECT_EQ(1, s_made);
+    EXPECT_EQ(nullptr, get_windows_factory().Create(HUID("NeverRegistered"), &m_world.desktop(), "x"));
+}
+
+TEST_F(LayoutTest, ImportRunsThePresetsAndTheLayoutFromTheUiFolder) {
+    std::string const dir = qortest::make_temp_dir();
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, dir.c_str());
+    qortest::write_file(dir + "/layout.lua",
+                        "ui_windows_ini = { name = 'root', class_name = 'Window', size = { 640, 480 },"
+                        " { name = 'panel', class_name = 'Window', alignment = 'ALIGNMENT_CLIENT' } }");
+    qortest::CReportCapture capture;
+    mp_root->import(0, "layout.lua");
+    EXPECT_EQ((lines_t{"UI: File 'ui_material_presets.lua' not found"}), capture.errors()); // and goes on
+    EXPECT_EQ(640, mp_root->get_child("panel", nullptr, true)->get_w());
+
+    // A layout that fails or sets nothing changes nothing.
+    qortest::write_file(dir + "/ui_material_presets.lua", "ui_material_presets = {}");
+    qortest::write_file(dir + "/broken.lua", "ui_windows_ini = { name = ");
+    capture.clear();
+    mp_root->import(0, "broken.lua");
+    mp_root->import(0, "missing.lua");
+    EXPECT_TRUE(capture.errors().empty());
+    EXPECT_EQ(640, mp_root->get_w());
 }
