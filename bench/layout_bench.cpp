@@ -37,8 +37,8 @@ struct SSetup {
         qordebug::set_report_handler([](qordebug::EReportKind, char const *, void *) {}, nullptr);
         char dir[] = "/tmp/qorui_bench_XXXXXX";
         m_dir = mkdtemp(dir);
-        qorbase::set_category_root(16, m_dir.c_str());
-        qorbase::set_category_root(2, m_dir.c_str());
+        qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
+        qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_dir.c_str());
     }
     std::string m_dir;
 };
@@ -54,7 +54,7 @@ void BM_ExportLayoutOf1000Windows(benchmark::State &_state) {
     CDesktop desktop(&render, 1024, 768, "desktop");
     build_tree(desktop);
     for (auto _ : _state)
-        desktop.export_layout(16, "bench_layout.lua");
+        desktop.export_layout(qorbase::FILE_CATEGORY_UI, "bench_layout.lua");
 }
 BENCHMARK(BM_ExportLayoutOf1000Windows)->Unit(benchmark::kMillisecond);
 
@@ -63,9 +63,9 @@ void BM_ImportLayoutOf1000WindowsOverExistingOnes(benchmark::State &_state) {
     CRender render;
     CDesktop desktop(&render, 1024, 768, "desktop");
     build_tree(desktop);
-    desktop.export_layout(16, "bench_layout.lua");
+    desktop.export_layout(qorbase::FILE_CATEGORY_UI, "bench_layout.lua");
     for (auto _ : _state)
-        desktop.import(16, "bench_layout.lua");
+        desktop.import(qorbase::FILE_CATEGORY_UI, "bench_layout.lua");
 }
 BENCHMARK(BM_ImportLayoutOf1000WindowsOverExistingOnes)->Unit(benchmark::kMillisecond);
 
@@ -75,11 +75,11 @@ void BM_ImportLayoutOf1000WindowsIntoAnEmptyDesktop(benchmark::State &_state) {
     {
         CDesktop desktop(&render, 1024, 768, "desktop");
         build_tree(desktop);
-        desktop.export_layout(16, "bench_layout.lua");
+        desktop.export_layout(qorbase::FILE_CATEGORY_UI, "bench_layout.lua");
     }
     for (auto _ : _state) {
         CDesktop desktop(&render, 1024, 768, "desktop");
-        desktop.import(16, "bench_layout.lua");
+        desktop.import(qorbase::FILE_CATEGORY_UI, "bench_layout.lua");
         benchmark::DoNotOptimize(desktop.get_children_count());
     }
 }

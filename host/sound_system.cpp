@@ -41,8 +41,9 @@ bool is_pcm_wave(unsigned char const *_p_data, unsigned _size) {
 
 CSoundSource::CSoundSource(CSoundSystem *_p_system, std::string const &_file, int _group,
                            std::shared_ptr<ISoundOutput> const &_p_output, unsigned _voice)
-    : mp_system(_p_system), m_file(_file), m_group(_group), m_state(0), m_state_time(0.0f), m_option(0),
-      m_volume(1.0f), m_looping(false), mp_output(_voice ? _p_output : nullptr), m_voice(_voice) {
+    : mp_system(_p_system), m_file(_file), m_group(_group), m_state(SOUND_STATE_RESET), m_state_time(0.0f),
+      m_option(0), m_volume(1.0f), m_looping(false), mp_output(_voice ? _p_output : nullptr),
+      m_voice(_voice) {
     ++mp_system->m_live_sources;
 }
 
@@ -54,13 +55,13 @@ CSoundSource::~CSoundSource() {
 void CSoundSource::set_state(int _state, float _time) {
     m_state = _state;
     m_state_time = _time;
-    if (_state == 1) ++mp_system->m_started;
+    if (_state == SOUND_STATE_START) ++mp_system->m_started;
     if (!m_voice) return;
-    if (_state == 1)
+    if (_state == SOUND_STATE_START)
         mp_output->start(m_voice, _time);
-    else if (_state == 3)
+    else if (_state == SOUND_STATE_STOP)
         mp_output->stop(m_voice, _time);
-    else if (_state == 0)
+    else if (_state == SOUND_STATE_RESET)
         mp_output->reset(m_voice);
 }
 

@@ -395,13 +395,13 @@ IStatsPage *CUserInterface::get_current_stats_page() {
 // ---------------------------------------------------------------------------------------------
 
 void CUserInterface::export_layout(char const *_file) {
-    if (mp_desktop) mp_desktop->export_layout(16, _file);
+    if (mp_desktop) mp_desktop->export_layout(qorbase::FILE_CATEGORY_UI, _file);
 }
 
 // The layout, then the desktop's picture and the console's geometry from the configuration.
 void CUserInterface::import_layout(char const *_file) {
     if (!mp_desktop) return;
-    mp_desktop->import(16, _file);
+    mp_desktop->import(qorbase::FILE_CATEGORY_UI, _file);
     char const *background = config_string("ui", "background", k_default_background, "p_background");
     CMaterial *p_material = mp_desktop->create_material();
     if (p_material) p_material->init("ui_image", background, nullptr, nullptr, nullptr, nullptr, true, false);
@@ -435,7 +435,7 @@ string dump_file_name(char const *_page) {
         char buffer[260];
         std::snprintf(buffer, sizeof buffer, "stats_%s_%s_%04u.txt", _page,
                       description.mp_name ? description.mp_name : "", i);
-        if (p_files->load_file(2, buffer, nullptr, true) == 0) {
+        if (p_files->load_file(qorbase::FILE_CATEGORY_STATS, buffer, nullptr, true) == 0) {
             name = buffer;
             break;
         }
@@ -474,7 +474,8 @@ void CUserInterface::print_stats_page() {
     }
     ui_logger().log_message("%s", dashes);
     if (IFileSystem *p_files = GetFileSystem())
-        p_files->save_file(2, file.c_str(), dump.data(), static_cast<unsigned>(dump.size()), 0);
+        p_files->save_file(qorbase::FILE_CATEGORY_STATS, file.c_str(), dump.data(),
+                           static_cast<unsigned>(dump.size()), 0);
     qor_check_memory_corrupt();
 }
 

@@ -391,7 +391,7 @@ void CDesktop::export_layout(int _category, char const *_file) {
     lua.DoString("ui_material_presets = nil");
     presets.dump("ui_material_presets", presets_stream);
     std::string const presets_text = presets_stream.str();
-    p_files->save_file(16, "ui_material_presets.lua", presets_text.data(),
+    p_files->save_file(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua", presets_text.data(),
                        static_cast<unsigned>(presets_text.size()), 0);
 }
 

@@ -50,7 +50,8 @@ void CCharset::init(char const *_p_name, LuaPlus::LuaObject _lo) {
 void CCharset::load_from_nehe(char const *_file_name) {
     void *p_content = nullptr;
     IFileSystem *p_files = GetFileSystem();
-    unsigned const length = p_files ? p_files->load_file(8, _file_name, &p_content, true) : 0;
+    unsigned const length =
+        p_files ? p_files->load_file(qorbase::FILE_CATEGORY_FONTS, _file_name, &p_content, true) : 0;
     if (!p_content) {
         qordebug::warning("Cannot open '%s'", _file_name);
         return;

@@ -1,4 +1,6 @@
+// The factory of fonts: charsets and fonts from the tables of "fonts.lua".
 #include "engine_interfaces.h"
+#include "qorbase.h"
 #include "qordebug.h"
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
@@ -19,7 +21,7 @@ void CFontsFactory::init() {
     LuaPlus::LuaState &lua = lua_machine();
     lua.DoString("charsets={}");
     lua.DoString("fonts={}");
-    lua.DoFile(16, "fonts.lua");
+    lua.DoFile(qorbase::FILE_CATEGORY_UI, "fonts.lua");
 }
 
 CCharset *CFontsFactory::find_charset(char const *_name) {

@@ -492,10 +492,10 @@ void CWindow::load_child(LuaPlus::LuaObject &_lo_child) {
 void CWindow::import(int, char const *_file) {
     LuaPlus::LuaState &lua = lua_machine();
     lua.DoString("ui_material_presets = nil");
-    if (lua.DoFile(16, "ui_material_presets.lua") != 0)
+    if (lua.DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua") != 0)
         qordebug::error("UI: File '%s' not found", "ui_material_presets.lua");
     lua.DoString("ui_windows_ini = nil");
-    if (_file) lua.DoFile(16, _file);
+    if (_file) lua.DoFile(qorbase::FILE_CATEGORY_UI, _file);
     LuaPlus::LuaObject layout = lua.GetGlobals().GetByName("ui_windows_ini");
     if (!layout.IsTable()) return;
     load_state(layout);

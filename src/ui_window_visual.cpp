@@ -24,8 +24,6 @@ namespace {
 CWindowRegistrar<CWindowVisual> const s_registrar("WindowVisual");
 
 unsigned const k_no_movement = 0xFFFFFFFFu;
-int const k_ui_group = 2;
-int const k_ui_music_group = 3;
 
 uint32_t now() {
     return qorplatform::get_tick_count();
@@ -340,8 +338,8 @@ void CWindowVisual::play_sounds(CWndEvent const *_p_event) {
     if (found == m_sounds.end() || found->second.m_sources.empty()) return;
     SSound const &sound = found->second;
     auto start = [&sound](ISoundSource *p_source) {
-        p_source->set_state(0, 0.0f);
-        p_source->set_state(1, sound.m_fade_in);
+        p_source->set_state(SOUND_STATE_RESET, 0.0f);
+        p_source->set_state(SOUND_STATE_START, sound.m_fade_in);
     };
     if (sound.m_simultaneously)
         for (auto const &source : sound.m_sources)
@@ -353,7 +351,7 @@ void CWindowVisual::play_sounds(CWndEvent const *_p_event) {
 void CWindowVisual::stop_all_sounds() {
     for (auto const &sound : m_sounds)
         for (auto const &source : sound.second.m_sources)
-            source.second->set_state(3, sound.second.m_fade_out);
+            source.second->set_state(SOUND_STATE_STOP, sound.second.m_fade_out);
     for (CWindow *p_child : m_children)
         if (CWindowVisual *p_visual = as_visual(p_child)) p_visual->stop_all_sounds();
 }
@@ -410,15 +408,17 @@ void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaOb
         if (!file.IsString()) return;
         remove_sound_file(file.GetString());
         ISoundSource *p_source =
-            p_sound_system ? p_sound_system->create_sound(file.GetString(),
-                                                          sound.m_is_music ? k_ui_music_group : k_ui_group, 2)
-                           : nullptr;
+            p_sound_system
+                ? p_sound_system->create_sound(file.GetString(),
+                                               sound.m_is_music ? SOUND_GROUP_UI_MUSIC : SOUND_GROUP_UI,
+                                               SOUND_FLAGS_INTERFACE)
+                : nullptr;
         if (!p_source) {
             ui_logger().log_message("Cannot create sound source from file '%s'", file.GetString());
             return;
         }
         p_source->set_volume(volume.GetFloat() + 1.0f);
-        p_source->set_option(1);
+        p_source->set_option(SOUND_OPTION_INTERFACE);
         p_source->set_looping(looping);
         sound.m_sources.emplace_back(file.GetString(), p_source);
     });
@@ -447,7 +447,7 @@ void CWindowVisual::save_sounds(LuaPlus::LuaObject &_lo_table) {
         saved.AssignNewTable(p_state);
         saved.SetObject("file_names", files);
         ISoundSource *p_first = sound.m_sources.front().second;
-        saved.SetNumber("volume", p_first->get_volume(1) - 1.0f);
+        saved.SetNumber("volume", p_first->get_volume(SOUND_VOLUME_OWN) - 1.0f);
         if (p_first->is_looping()) saved.SetBoolean("looping", true);
         if (sound.m_simultaneously) saved.SetBoolean("simultaneously", true);
         if (sound.m_is_music) saved.SetBoolean("is_music", true);

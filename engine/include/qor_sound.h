@@ -1,13 +1,35 @@
-// The engine's sound system. Groups: 0 "music", 1 "world", 2 "ui", 3 "ui_music",
-// 4 "effect_interaction", 5 "effect_shoot", 6 "effect_hit", 7 "effect_ai".
+// The engine's sound system: sources made from files, in groups, with their states and options.
 #pragma once
 #include "qor_interfaces.h"
+
+// The groups of sounds: "music", "world", "ui", "ui_music", "effect_interaction",
+// "effect_shoot", "effect_hit", "effect_ai".
+enum ESoundGroup : int {
+    SOUND_GROUP_MUSIC = 0,
+    SOUND_GROUP_WORLD = 1,
+    SOUND_GROUP_UI = 2,
+    SOUND_GROUP_UI_MUSIC = 3,
+    SOUND_GROUP_EFFECT_INTERACTION = 4,
+    SOUND_GROUP_EFFECT_SHOOT = 5,
+    SOUND_GROUP_EFFECT_HIT = 6,
+    SOUND_GROUP_EFFECT_AI = 7
+};
+
+// The states of ISoundSource::set_state: reset (with time 0, before each start), start fading in
+// over the time, stop fading out over the time.
+enum ESoundState : int { SOUND_STATE_RESET = 0, SOUND_STATE_START = 1, SOUND_STATE_STOP = 3 };
+
+// What the interface passes: the flags of create_sound, the option each source is given once
+// right after creation, and the argument of get_volume.
+int const SOUND_FLAGS_INTERFACE = 2;
+int const SOUND_OPTION_INTERFACE = 1;
+int const SOUND_VOLUME_OWN = 1;
 
 class ISoundSource {
 public:
     // Releases the source.
     virtual ~ISoundSource() {}
-    // 0 with time 0: reset; 1: start, fading in over _time ms; 3: stop, fading out over _time ms.
+    // One of ESoundState; _time in ms.
     virtual void set_state(int _state, float _time) = 0;
     virtual void set_option(int _option) = 0;
     virtual void set_volume(float _volume) = 0;
