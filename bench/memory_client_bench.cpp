@@ -39,9 +39,11 @@ BENCHMARK(BM_GlobalNewAndDelete);
 void BM_PooledBatchOf64(benchmark::State &_state) {
     SPooledNode *nodes[64];
     for (auto _ : _state) {
-        for (SPooledNode *&p : nodes) p = new SPooledNode;
+        for (SPooledNode *&p : nodes)
+            p = new SPooledNode;
         benchmark::DoNotOptimize(nodes);
-        for (SPooledNode *p : nodes) delete p;
+        for (SPooledNode *p : nodes)
+            delete p;
     }
 }
 BENCHMARK(BM_PooledBatchOf64);
@@ -49,9 +51,11 @@ BENCHMARK(BM_PooledBatchOf64);
 void BM_GlobalBatchOf64(benchmark::State &_state) {
     SPlainNode *nodes[64];
     for (auto _ : _state) {
-        for (SPlainNode *&p : nodes) p = new SPlainNode;
+        for (SPlainNode *&p : nodes)
+            p = new SPlainNode;
         benchmark::DoNotOptimize(nodes);
-        for (SPlainNode *p : nodes) delete p;
+        for (SPlainNode *p : nodes)
+            delete p;
     }
 }
 BENCHMARK(BM_GlobalBatchOf64);

@@ -3,6 +3,7 @@
 #pragma once
 #include "qor_memory.h"
 #include "qorscriptsystem.h"
+#include "ui_geometry.h"
 
 namespace qorui {
 
@@ -14,11 +15,16 @@ void for_each_entry(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
         _visit(static_cast<LuaPlus::LuaObject const &>(key), static_cast<LuaPlus::LuaObject const &>(value));
 }
 
-void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
+// Each reader tells whether it took the value.
+bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
 // A number, truncated toward zero.
-void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
-void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value);
-void read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value);
+bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
+// Only a number with no fraction: any other number leaves the value as well.
+bool read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
+bool read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value);
+bool read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value);
+// A string that is one of the names of g_alignment_names.
+bool read_alignment(LuaPlus::LuaObject const &_lo_table, char const *_key, EAlignment &_value);
 // Numbers 1 and 2 of the table under _key, each only when it is a number (to an integer by
 // truncation toward zero); false when there is no table under the key.
 template <class T>

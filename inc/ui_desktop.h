@@ -53,6 +53,8 @@ public:
     CPointer &get_pointer() { return m_pointer; }
     IRender *get_render() override { return mp_render; }
     CMaterial *create_material() override;
+    // One function for both bases: the desktop's own materials.
+    CMaterial *get_material(HUID const &_id) override { return CWindowVisual::get_material(_id); }
     // The whole layout to _file of _category, and the presets to "ui_material_presets.lua".
     void export_layout(int _category, char const *_file);
 

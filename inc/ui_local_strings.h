@@ -14,4 +14,8 @@ typedef qor_map<string, CString> local_strings_t;
 // reported with the file's name and passed over. Takes the stream and closes it.
 void read_local_strings(IFileReader *_p_stream, char const *_file_name, local_strings_t &_table);
 
+// The service's local string of a key, else the key's own text. With _critical, a missing service
+// is the engine binding's critical error.
+CString local_string_or_key(char const *_p_key, bool _critical);
+
 } // namespace qorui

@@ -16,6 +16,7 @@ class LuaObject;
 namespace qorui {
 
 class IRender;
+class IWindowDesktop;
 class CDesktop;
 
 class CMaterialBase {
@@ -89,5 +90,9 @@ private:
     bool m_defered_init;
     IRender *mp_render; // not owned
 };
+
+// A new "ui_color" material of the desktop in one colour: the built-in look of a control. The caller
+// owns it; null without a desktop.
+CMaterial *create_color_material(IWindowDesktop *_p_desktop, rgba_t const &_color);
 
 } // namespace qorui

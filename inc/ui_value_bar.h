@@ -16,7 +16,7 @@ class CButton;
 class CValueBar : public CWindowVisual {
 public:
     CValueBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CValueBar() {}
+    virtual ~CValueBar();
 
     QOR_CLASS_ID(CValueBar, CWindowVisual, "ValueBar")
 
@@ -58,7 +58,7 @@ protected:
 class CProgressBar : public CValueBar {
 public:
     CProgressBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CProgressBar() {}
+    virtual ~CProgressBar();
 
     QOR_CLASS_ID(CProgressBar, CValueBar, "ProgressBar")
 
@@ -69,7 +69,7 @@ protected:
 class CScrollBar : public CValueBar {
 public:
     CScrollBar(IWindowDesktop *_p_desktop, char const *_name);
-    virtual ~CScrollBar() {}
+    virtual ~CScrollBar();
 
     QOR_CLASS_ID(CScrollBar, CValueBar, "ScrollBar")
 
@@ -106,6 +106,26 @@ protected:
     virtual void on_event_scroll_small_step(CWndEvent const *_p_event);
     virtual void on_event_scroll_large_step(CWndEvent const *_p_event);
 
+private:
+    // A button over the whole bar size, with the look of three desktop materials where it has them.
+    CButton *add_button(char const *_name, HUID const &_normal, HUID const &_highlighted,
+                        HUID const &_pushed);
+    // A step event with its direction, to the bar itself.
+    void send_step(EEventType _id, int _direction);
+    // Moves the position by the event's direction times _step.
+    void step(CWndEvent const *_p_event, float _step);
+    // Not negative; cut to the range.
+    void store_step(float &_step, float _val);
+    // The room the scroller moves in: the bar's length less the scroller and every shown end
+    // button. Negative when the bar is too short.
+    int get_track_length() const;
+    // The pointer's hot spot in _p_wnd's own coordinates.
+    point_t get_pointer_pos_in(CWindow const *_p_wnd) const;
+    // Along the bar: x and widths when horizontal, y and heights when vertical.
+    int along(point_t const &_point) const { return m_horizontal ? _point.x : _point.y; }
+    int length_of(CWindow const *_p_wnd) const { return m_horizontal ? _p_wnd->get_w() : _p_wnd->get_h(); }
+
+protected:
     float m_small_step;
     float m_large_step;
     CButton *mp_button_min;      // child "button min", towards m_min

@@ -43,6 +43,9 @@ public:
     virtual IRender *get_render() = 0;
     // The pointer's hot spot in desktop pixels.
     virtual point_t get_pointer_pos() = 0;
+    // The desktop's own material of that name, which controls copy for the look of their parts;
+    // null if it has none.
+    virtual CMaterial *get_material(HUID const &_id) = 0;
 
 protected:
     ~IWindowDesktop() {}

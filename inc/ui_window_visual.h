@@ -11,6 +11,7 @@ namespace qorui {
 
 class CFont;
 class CMaterial;
+class CStaticText;
 class CString;
 class CText;
 
@@ -65,6 +66,9 @@ public:
     void set_right_margin(int _margin);
     void set_uniform_margins(int _margin);
 
+    // A new static text child named _name, placed on _area, showing _text.
+    CStaticText *make_static_text(CString const &_text, CRectArea const &_area, char const *_name);
+
     // Effects
     float get_transparency() const override { return m_transparency; }
     void set_fade_in(float _ms) { m_fade_in = static_cast<int>(_ms); }
@@ -101,6 +105,9 @@ protected:
 
     // The opacity of this frame: the parent's, times the running fade.
     void calculate_transparency();
+    // The narrow string of an EVENT_SET_STR, as the local string of that key or as it stands when
+    // there is none, sent to the window itself as EVENT_SET_TEXT.
+    void forward_set_str(CWndEvent const *_p_event);
 
 public:
     // An entry of the material and font maps.

@@ -3,24 +3,44 @@
 
 namespace qorui {
 
-void read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value) {
+bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsBoolean()) _value = value.GetBoolean();
+    if (!value.IsBoolean()) return false;
+    _value = value.GetBoolean();
+    return true;
 }
 
-void read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
+bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsNumber()) _value = static_cast<int>(value.GetNumber());
+    if (!value.IsNumber()) return false;
+    _value = static_cast<int>(value.GetNumber());
+    return true;
 }
 
-void read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
+bool read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsNumber()) _value = value.GetFloat();
+    if (!value.IsInteger()) return false;
+    _value = value.GetInteger();
+    return true;
 }
 
-void read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value) {
+bool read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsString()) _value = value.GetString();
+    if (!value.IsNumber()) return false;
+    _value = value.GetFloat();
+    return true;
+}
+
+bool read_string(LuaPlus::LuaObject const &_lo_table, char const *_key, string &_value) {
+    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
+    if (!value.IsString()) return false;
+    _value = value.GetString();
+    return true;
+}
+
+bool read_alignment(LuaPlus::LuaObject const &_lo_table, char const *_key, EAlignment &_value) {
+    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
+    return value.IsString() && find_alignment(value.GetString(), _value);
 }
 
 void write_pair(LuaPlus::LuaObject &_lo_table, char const *_key, double _first, double _second) {

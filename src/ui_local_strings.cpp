@@ -7,6 +7,7 @@
 #include "ui.h"
 #include "ui_local_strings.h"
 
+#include "engine_interfaces.h"
 #include "qorbase.h"
 #include "qordebug.h"
 #include "ui_debug.h"
@@ -146,6 +147,12 @@ unsigned short const *CUserInterface::get_local_string(char const *_key) {
     if (!_key) return nullptr;
     auto const found = m_local_strings.find(string(_key));
     return found == m_local_strings.end() ? nullptr : found->second.c_str();
+}
+
+CString local_string_or_key(char const *_p_key, bool _critical) {
+    IUserInterface *p_ui = engine_interfaces().get_user_interface(_critical);
+    unsigned short const *p_local = p_ui ? p_ui->get_local_string(_p_key) : nullptr;
+    return p_local ? CString(p_local, -1) : CString(_p_key, -1);
 }
 
 // A linear search in key order: of two keys with the same text, the earlier one.

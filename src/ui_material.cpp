@@ -7,6 +7,7 @@
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
 #include "ui_render.h"
+#include "ui_window.h"
 
 namespace qorui {
 
@@ -81,6 +82,14 @@ CMaterial *CMaterial::clone() const {
     p_clone->m_load_textures_from_game_save = m_load_textures_from_game_save;
     if (m_material_handle != -1) p_clone->init();
     return p_clone;
+}
+
+CMaterial *create_color_material(IWindowDesktop *_p_desktop, rgba_t const &_color) {
+    CMaterial *p_material = _p_desktop ? _p_desktop->create_material() : nullptr;
+    if (!p_material) return nullptr;
+    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
+    p_material->set_color(_color);
+    return p_material;
 }
 
 // ---------------------------------------------------------------------------------------------

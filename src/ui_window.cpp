@@ -447,8 +447,7 @@ void CWindow::load_state(LuaPlus::LuaObject &_lo_table) {
     if (read_pair(_lo_table, "size", w, h)) set_size(w, h);
     read_bool(_lo_table, "can_resize", m_can_resize);
     read_bool(_lo_table, "can_drag", m_can_drag);
-    LuaPlus::LuaObject const alignment = _lo_table.GetByName("alignment");
-    if (alignment.IsString() && find_alignment(alignment.GetString(), m_alignment))
+    if (read_alignment(_lo_table, "alignment", m_alignment))
         send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_CHILDREN);
     LuaPlus::LuaObject const modal = _lo_table.GetByName("is_modal");
     if (modal.IsBoolean()) set_is_modal(modal.GetBoolean());

@@ -16,8 +16,10 @@
 #include "ui_debug.h"
 #include "ui_font.h"
 #include "ui_interfaces.h"
+#include "ui_local_strings.h"
 #include "ui_logger.h"
 #include "ui_material.h"
+#include "ui_static_text.h"
 #include "ui_string.h"
 #include "ui_text.h"
 
@@ -116,8 +118,11 @@ CFont *CWindowVisual::get_font(HUID const &_id) {
         p_ancestor = as_visual(p_wnd);
     if (!p_ancestor) return nullptr;
     CFont *p_font = p_ancestor->get_font(_id);
-    auto &entry = m_fonts.emplace(_id, SResource<CFont>{_id, nullptr, false}).first->second;
-    if (!entry.m_owned) entry.mp_resource = p_font;
+    // A font looked up before has its entry already: no new node in a steady frame.
+    if (found == m_fonts.end())
+        m_fonts.emplace(_id, SResource<CFont>{_id, p_font, false});
+    else if (!found->second.m_owned)
+        found->second.mp_resource = p_font;
     return p_font;
 }
 
@@ -187,6 +192,16 @@ void CWindowVisual::on_child_attached() {
         CWindowVisual const *p_va = as_visual(p_a), *p_vb = as_visual(p_b);
         return p_va && p_vb && p_va->m_z_order > p_vb->m_z_order;
     });
+}
+
+CStaticText *CWindowVisual::make_static_text(CString const &_text, CRectArea const &_area,
+                                             char const *_name) {
+    CStaticText *p_text = new CStaticText(mp_desktop, _name);
+    attach_child(p_text);
+    p_text->set_pos(_area.x, _area.y);
+    p_text->set_size(_area.w, _area.h);
+    p_text->set_text(_text);
+    return p_text;
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -562,20 +577,9 @@ void CWindowVisual::load_movement(LuaPlus::LuaObject const &_lo_movement) {
 // Texts in layouts
 // ---------------------------------------------------------------------------------------------
 
-namespace {
-
-// The local string of a key, else the key's own text.
-CString local_or_own(char const *_p_key) {
-    IUserInterface *p_ui = engine_interfaces().get_user_interface(false);
-    unsigned short const *p_local = p_ui ? p_ui->get_local_string(_p_key) : nullptr;
-    return p_local ? CString(p_local, -1) : CString(_p_key, -1);
-}
-
-} // namespace
-
 void CWindowVisual::load_string(LuaPlus::LuaObject &_lo_table, char const *_key, CString &_string) {
     LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (value.IsString()) _string = local_or_own(value.GetString());
+    if (value.IsString()) _string = local_string_or_key(value.GetString(), false);
 }
 
 void CWindowVisual::save_string(LuaPlus::LuaObject &_lo_table, char const *_key, CString const &_string) {
@@ -590,7 +594,7 @@ void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, C
     for_each_entry(lines, [&](LuaPlus::LuaObject const &, LuaPlus::LuaObject const &entry) {
         if (!entry.IsTable() || !entry.GetByName("string").IsString()) return;
         int const before = static_cast<int>(_text.get_num_strings());
-        _text.insert_str(local_or_own(entry.GetByName("string").GetString()).c_str(), false);
+        _text.insert_str(local_string_or_key(entry.GetByName("string").GetString(), false).c_str(), false);
         LuaPlus::LuaObject const font = entry.GetByName("font");
         if (!font.IsString()) return;
         static HUID const string_font("STRING_FONT");
@@ -604,6 +608,20 @@ void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, C
         for (int line = std::max(before - 1, 0); line <= after - 2; ++line)
             _text.set_string_font(static_cast<unsigned>(line), p_font);
     });
+}
+
+// ---------------------------------------------------------------------------------------------
+// Text events
+// ---------------------------------------------------------------------------------------------
+
+// EVENT_SET_TEXT does the work, also a derived class's.
+void CWindowVisual::forward_set_str(CWndEvent const *_p_event) {
+    _p_event->rewind();
+    string key;
+    *_p_event >> key;
+    CWndEvent set_text(EVENT_SET_TEXT);
+    set_text << static_cast<wstring const &>(local_string_or_key(key.c_str(), true));
+    send_event(this, &set_text, CWndEvent::DISPATCH_NONE);
 }
 
 } // namespace qorui

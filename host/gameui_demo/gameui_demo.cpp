@@ -6,11 +6,21 @@
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
+#include "engine_interfaces.h"
+#include "ui_button.h"
 #include "ui_desktop.h"
+#include "ui_drop_down_list.h"
+#include "ui_edit_box.h"
+#include "ui_items.h"
+#include "ui_list_box.h"
+#include "ui_page_control.h"
+#include "ui_selector_box.h"
 #include "ui_font.h"
 #include "ui_interfaces.h"
 #include "ui_material.h"
+#include "ui_static_text.h"
 #include "ui_string.h"
+#include "ui_value_bar.h"
 #include "qorscriptsystem.h"
 
 #include <string>
@@ -76,6 +86,25 @@ CMaterial *colour(CDesktop *_p_desktop, unsigned char _r, unsigned char _g, unsi
     return p_material;
 }
 
+// A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
+// by name.
+CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
+    CMaterial *p_material = _p_desktop->create_material();
+    if (!p_material) return nullptr;
+    LuaPlus::LuaObject table;
+    table.AssignNewTable(&lua_machine());
+    table.SetString("material_preset", _name);
+    p_material->load_state(table);
+    return p_material;
+}
+
+// Materials of a window by state, from presets; null names are skipped.
+void dress(CDesktop *_p_desktop, CWindowVisual *_p_wnd,
+           std::initializer_list<std::pair<HUID, char const *>> _looks) {
+    for (auto const &look : _looks)
+        if (look.second) _p_wnd->add_material(look.first, preset(_p_desktop, look.second));
+}
+
 template <class TWindow>
 TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int _h) {
     _p_parent->attach_child(_p_wnd);
@@ -84,25 +113,75 @@ TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int 
     return _p_wnd;
 }
 
-// A button: normal, highlighted and pushed colours, and its caption.
-void make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption, int _x,
-                 int _y) {
-    CWindowVisual *p_button = place(_p_parent, new CWindowVisual(_p_desktop, _name), _x, _y, 110, 30);
-    p_button->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 58, 74, 104));
-    p_button->add_material(MAT_NAME_HIGHLIGHTED, colour(_p_desktop, 78, 100, 140));
-    p_button->add_material(MAT_NAME_PUSHED, colour(_p_desktop, 40, 52, 76));
-    place(p_button, new CDemoText(_p_desktop, "caption", _caption), 12, 6, 96, 20);
+CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
+                     int _x, int _y) {
+    CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
+    dress(_p_desktop, p_button,
+          {{MAT_NAME_NORMAL, "button_normal"},
+           {MAT_NAME_HIGHLIGHTED, "button_highlighted"},
+           {MAT_NAME_PUSHED, "button_pushed"},
+           {MAT_NAME_DISABLED, "button_disabled"}});
+    p_button->m_text = CString(_caption);
+    return p_button;
 }
 
-// A dialog-like window: a title bar to drag it by, a body with text and two buttons.
-void make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, int _x, int _y) {
-    CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, 360, 200);
+// A check box or a radio button of the given picture set ("checker" or "radio") with its label
+// beside it as a static text, so that a layout keeps the label.
+template <class TChecker>
+TChecker *make_checker(CDesktop *_p_desktop, CWindowVisual *_p_parent, char const *_name, char const *_label,
+                       char const *_pictures, int _x, int _y) {
+    TChecker *p_checker = place(_p_parent, new TChecker(_p_desktop, _name), _x, _y, 18, 20);
+    std::string const set = _pictures;
+    std::string const on = set + "_on", off = set + "_off", on_disabled = set + "_on_disabled",
+                      off_disabled = set + "_off_disabled", highlighted = set + "_highlighted";
+    dress(_p_desktop, p_checker,
+          {{MAT_NAME_CHECKER_ON, on.c_str()},
+           {MAT_NAME_CHECKER_OFF, off.c_str()},
+           {MAT_NAME_CHECKER_ON_DISABLED, on_disabled.c_str()},
+           {MAT_NAME_CHECKER_OFF_DISABLED, off_disabled.c_str()},
+           {MAT_NAME_HIGHLIGHTED, highlighted.c_str()}});
+    _p_parent->make_static_text(CString(_label), CRectArea(_x + 22, _y + 1, 100, 20),
+                                (std::string(_name) + " label").c_str());
+    return p_checker;
+}
+
+// The desktop's pictures for the step buttons and scrollers of the scroll bars and selectors made
+// by code.
+void dress_desktop_for_step_buttons(CDesktop *_p_desktop) {
+    dress(_p_desktop, _p_desktop,
+          {{MAT_NAME_BUTTON_UP, "arrow_up"},
+           {MAT_NAME_BUTTON_UP_HIGHLIGHTED, "arrow_up_highlighted"},
+           {MAT_NAME_BUTTON_UP_PUSHED, "arrow_up_pushed"},
+           {MAT_NAME_BUTTON_DOWN, "arrow_down"},
+           {MAT_NAME_BUTTON_DOWN_HIGHLIGHTED, "arrow_down_highlighted"},
+           {MAT_NAME_BUTTON_DOWN_PUSHED, "arrow_down_pushed"},
+           {MAT_NAME_BUTTON_LEFT, "arrow_left"},
+           {MAT_NAME_BUTTON_LEFT_HIGHLIGHTED, "arrow_left_highlighted"},
+           {MAT_NAME_BUTTON_LEFT_PUSHED, "arrow_left_pushed"},
+           {MAT_NAME_BUTTON_RIGHT, "arrow_right"},
+           {MAT_NAME_BUTTON_RIGHT_HIGHLIGHTED, "arrow_right_highlighted"},
+           {MAT_NAME_BUTTON_RIGHT_PUSHED, "arrow_right_pushed"},
+           {MAT_NAME_BUTTON_SCROLLER, "scroller"},
+           {MAT_NAME_BUTTON_SCROLLER_HIGHLIGHTED, "scroller_highlighted"},
+           {MAT_NAME_BUTTON_SCROLLER_PUSHED, "scroller_pushed"}});
+}
+
+// A dialog-like window: a title bar to drag it by, over a body of the given size.
+CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, int _x, int _y,
+                           int _w, int _h) {
+    CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, _w, _h);
     p_dialog->set_can_drag(true);
     p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
-    CWindowVisual *p_title = place(p_dialog, new CWindowVisual(_p_desktop, "title bar"), 0, 0, 360, 26);
+    CWindowVisual *p_title = place(p_dialog, new CWindowVisual(_p_desktop, "title bar"), 0, 0, _w, 26);
     p_title->set_passive(true);
     p_title->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
-    place(p_title, new CDemoText(_p_desktop, "title", _title), 10, 4, 340, 20);
+    place(p_title, new CDemoText(_p_desktop, "title", _title), 10, 4, _w - 20, 20);
+    return p_dialog;
+}
+
+// Text and two buttons.
+void make_message_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, int _x, int _y) {
+    CWindowVisual *p_dialog = make_dialog(_p_desktop, _name, _title, _x, _y, 360, 200);
     place(p_dialog,
           new CDemoText(_p_desktop, "line 1",
                         "<color 255 210 90 255>qorui</color> demo: drag me by my background."),
@@ -113,6 +192,144 @@ void make_dialog(CDesktop *_p_desktop, char const *_name, char const *_title, in
           16, 70, 330, 20);
     make_button(_p_desktop, p_dialog, "ok", "OK", 110, 150);
     make_button(_p_desktop, p_dialog, "cancel", "Cancel", 234, 150);
+}
+
+// A scroll bar made by code has parts of no size: square step buttons as thick as the bar and a
+// scroller _length long.
+void size_parts(CScrollBar *_p_bar, int _length) {
+    for (CButton *p_button : {_p_bar->get_button_min(), _p_bar->get_button_max()})
+        p_button->set_size(16, 16);
+    if (_p_bar->get_horizontal())
+        _p_bar->get_button_scroller()->set_size(_length, 16);
+    else
+        _p_bar->get_button_scroller()->set_size(16, _length);
+    _p_bar->set_scroller_for_position();
+}
+
+// The everyday controls: a check box, a radio group, a scroll bar with its value, a progress bar
+// and an edit box. (An edit box saves neither its text nor whether it has a scroll bar, so the
+// scene keeps to what its layout brings back.)
+void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
+    CWindowVisual *p_dialog = make_dialog(_p_desktop, "controls", "Controls", _x, _y, 420, 330);
+    make_checker<CCheckBox>(_p_desktop, p_dialog, "subtitles", "Subtitles", "checker", 16, 40);
+
+    CWindowVisual *p_group = place(p_dialog, new CWindowVisual(_p_desktop, "difficulty"), 16, 70, 390, 22);
+    p_group->set_passive(true);
+    char const *const levels[][2] = {{"easy", "Easy"}, {"normal", "Normal"}, {"hard", "Hard"}};
+    for (int i = 0; i < 3; ++i) {
+        CRadioButton *p_radio =
+            make_checker<CRadioButton>(_p_desktop, p_group, levels[i][0], levels[i][1], "radio", i * 120, 0);
+        p_radio->set_checked(i == 1);
+    }
+
+    p_dialog->make_static_text(CString("Volume"), CRectArea(16, 104, 70, 20), "volume label");
+    CScrollBar *p_volume = place(p_dialog, new CScrollBar(_p_desktop, "volume"), 90, 106, 310, 16);
+    p_volume->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "bar_track"));
+    dress(_p_desktop, p_volume->get_button_min(),
+          {{MAT_NAME_NORMAL, "arrow_left"},
+           {MAT_NAME_HIGHLIGHTED, "arrow_left_highlighted"},
+           {MAT_NAME_PUSHED, "arrow_left_pushed"}});
+    dress(_p_desktop, p_volume->get_button_max(),
+          {{MAT_NAME_NORMAL, "arrow_right"},
+           {MAT_NAME_HIGHLIGHTED, "arrow_right_highlighted"},
+           {MAT_NAME_PUSHED, "arrow_right_pushed"}});
+    size_parts(p_volume, 40);
+    p_volume->set_max(100);
+    p_volume->set_position(70);
+
+    p_dialog->make_static_text(CString("Loading"), CRectArea(16, 134, 70, 20), "loading label");
+    CProgressBar *p_loading = place(p_dialog, new CProgressBar(_p_desktop, "loading"), 90, 138, 310, 12);
+    p_loading->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "bar_track"));
+    p_loading->add_material(MAT_NAME_PROGRESS, preset(_p_desktop, "progress"));
+    p_loading->set_position(60);
+
+    CEditBox *p_notes = place(p_dialog, new CEditBox(_p_desktop, "notes"), 16, 166, 388, 110);
+    p_notes->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    p_notes->set_uniform_margins(4);
+
+    make_button(_p_desktop, p_dialog, "apply", "Apply", 294, 288);
+}
+
+// A row of one text per column, with an icon when given.
+CItem *row(std::initializer_list<char const *> _texts, CMaterial *_p_icon) {
+    qor_vector<CText> texts;
+    for (char const *p_text : _texts)
+        texts.emplace_back(CString(p_text));
+    return new CItem(std::move(texts), _p_icon);
+}
+
+// The look of a list: its body, the row under the pointer and the chosen row.
+void dress_list(CDesktop *_p_desktop, CListBox *_p_list) {
+    _p_list->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    _p_list->add_material(MAT_NAME_SELECTION, preset(_p_desktop, "row_under_pointer"));
+    _p_list->add_material(MAT_NAME_CHECKED, preset(_p_desktop, "row_chosen"));
+    _p_list->add_material(MAT_NAME_LISTBOX_HEADER, preset(_p_desktop, "bar_track"));
+}
+
+// A tabbed options screen: "Video" holds a list of display modes in three columns with icons,
+// "Game" a selector of the language and a drop-down of the difficulty.
+void make_options_dialog(CDesktop *_p_desktop, int _x, int _y) {
+    CWindowVisual *p_dialog = make_dialog(_p_desktop, "options", "Options", _x, _y, 440, 300);
+    CPageControl *p_pages = place(p_dialog, new CPageControl(_p_desktop, "pages"), 10, 34, 420, 256);
+    p_pages->set_tab_size(90, 26);
+    CWindowVisual *p_video = p_pages->add_page("Video");
+    CWindowVisual *p_game = p_pages->add_page("Game");
+    for (char const *p_tab : {"Video", "Game"})
+        if (CButton *p_button = class_cast<CButton>(p_pages->get_child(p_tab, "Button", true)))
+            dress(_p_desktop, p_button,
+                  {{MAT_NAME_NORMAL, "button_normal"},
+                   {MAT_NAME_HIGHLIGHTED, "button_highlighted"},
+                   {MAT_NAME_PUSHED, "button_pushed"},
+                   {MAT_NAME_CHECKED, "button_checked"}});
+
+    CListBox *p_modes = place(p_video, new CListBox(_p_desktop, "modes"), 0, 0, 420, 222);
+    dress_list(_p_desktop, p_modes);
+    char const *const titles[] = {"Resolution", "Rate", "Aspect"};
+    int const widths[] = {170, 100, 100};
+    for (unsigned i = 0; i < 3; ++i) {
+        p_modes->add_column();
+        p_modes->set_column_w(i, widths[i]);
+        p_modes->set_column_title(i, CString(titles[i]));
+    }
+    p_modes->set_columns_h(22);
+    p_modes->set_item_height(24);
+    p_modes->show_columns(true);
+    int const sizes[][2] = {{640, 480},   {800, 600},  {1024, 768},  {1280, 720},
+                            {1280, 1024}, {1600, 900}, {1920, 1080}, {2560, 1440}};
+    for (auto const &size : sizes) {
+        for (char const *p_rate : {"60 Hz", "75 Hz", "120 Hz"}) {
+            bool const wide = size[0] * 9 == size[1] * 16;
+            char const *p_aspect = wide ? "16:9" : size[0] * 4 == size[1] * 5 ? "5:4" : "4:3";
+            std::string const resolution = std::to_string(size[0]) + " x " + std::to_string(size[1]);
+            p_modes->get_items().add(row({resolution.c_str(), p_rate, p_aspect},
+                                         preset(_p_desktop, wide ? "radio_on" : "checker_on")));
+        }
+    }
+    if (CScrollBar *p_bar = p_modes->get_scroll_bar_vert()) {
+        p_bar->set_w(16);
+        p_bar->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "bar_track"));
+        size_parts(p_bar, 30);
+    }
+    p_modes->send_event(p_modes, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+
+    p_game->make_static_text(CString("Language"), CRectArea(0, 8, 110, 20), "language label");
+    CSelectorBox *p_language = place(p_game, new CSelectorBox(_p_desktop, "language"), 120, 6, 220, 24);
+    p_language->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    for (char const *p_language_name : {"English", "Deutsch",
+                                        "Fran\xC3\xA7"
+                                        "ais",
+                                        "\xD0\xA0\xD1\x83\xD1\x81\xD1\x81\xD0\xBA\xD0\xB8\xD0\xB9"})
+        p_language->get_items().add(row({p_language_name}, nullptr));
+    p_language->get_items().select(0);
+
+    p_game->make_static_text(CString("Difficulty"), CRectArea(0, 48, 110, 20), "difficulty label");
+    CDropDownList *p_level = place(p_game, new CDropDownList(_p_desktop, "level"), 120, 46, 220, 24);
+    p_level->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
+    dress_list(_p_desktop, p_level->get_list_box());
+    p_level->get_list_box()->set_item_height(22);
+    for (char const *p_level_name : {"Story", "Easy", "Normal", "Hard", "Nightmare"})
+        p_level->get_items().add(row({p_level_name}, nullptr));
+    p_level->check(2);
 }
 
 IUserInterface *user_interface() {
@@ -142,10 +359,14 @@ void cmd_gameui_demo_scene(char const *, void *) {
     p_bar->set_alignment(ALIGNMENT_TOP);
     p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
     place(p_bar, new CDemoText(p_desktop, "heading", "qorui - demo scene"), 16, 8, 400, 20);
-    make_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
-    make_dialog(p_desktop, "second dialog",
-                "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE", 540,
-                300);
+    lua_machine().DoFile(16, "ui_material_presets.lua");
+    dress_desktop_for_step_buttons(p_desktop);
+    make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
+    make_message_dialog(p_desktop, "second dialog",
+                        "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
+                        120, 420);
+    make_controls_dialog(p_desktop, 540, 80);
+    make_options_dialog(p_desktop, 540, 430);
     if (ILogger *p_logger = demo_logger()) p_logger->write("Demo scene built", 0);
 }
 

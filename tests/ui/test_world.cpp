@@ -7,10 +7,12 @@
 #include "test_host.h"
 #include "test_support.h"
 #include "ui_font.h"
+#include "ui_event.h"
 #include "ui_material.h"
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <cstdlib>
 
 using namespace qorui;
@@ -88,11 +90,84 @@ void CWorld::type(char const *_ascii) {
 void CWorld::frame() {
     mp_desktop->update(0);
     m_renderer.begin_frame(rgba_t(24, 28, 36, 255));
+    m_recorder.clear();
     mp_desktop->draw();
+}
+
+// Device coordinates back to pixels: x from -1 at the left, y from 1 at the top.
+std::vector<CWorld::SDrawn> CWorld::drawn() const {
+    float const half_w = m_renderer.get_frame().m_w / 2.0f, half_h = m_renderer.get_frame().m_h / 2.0f;
+    auto x_of = [half_w](float _x) { return static_cast<int>(std::lround((_x + 1.0f) * half_w)); };
+    auto y_of = [half_h](float _y) { return static_cast<int>(std::lround((1.0f - _y) * half_h)); };
+    std::vector<SDrawn> drawn;
+    int handle = -1;
+    for (qorhost::SRenderCall const &call : m_recorder.calls()) {
+        if (call.m_op == "set_material") handle = call.m_handle;
+        if (call.m_op == "draw_quad") {
+            int const x = x_of(call.m_points[0].x), y = y_of(call.m_points[0].y);
+            drawn.push_back(
+                SDrawn{"quad", CRectArea(x, y, x_of(call.m_points[2].x) - x, y_of(call.m_points[2].y) - y),
+                       handle, call.m_colours[0]});
+        }
+        if (call.m_op == "set_clip_rect") {
+            // The clip's position is its lower left corner.
+            int const w = static_cast<int>(std::lround(call.m_points[1].x * half_w));
+            int const h = static_cast<int>(std::lround(call.m_points[1].y * half_h));
+            drawn.push_back(SDrawn{"clip",
+                                   CRectArea(x_of(call.m_points[0].x), y_of(call.m_points[0].y) - h, w, h),
+                                   -1, rgba_t()});
+        }
+    }
+    return drawn;
 }
 
 void CWorld::expect_golden(char const *_name) {
     qortest::expect_golden(m_renderer.get_frame(), _name);
+}
+
+std::string CWorld::clips() const {
+    std::string text;
+    for (SDrawn const &drawn_call : drawn())
+        if (drawn_call.m_op == "clip") {
+            CRectArea const &r = drawn_call.m_rect;
+            text += (text.empty() ? "" : "; ") + std::to_string(r.x) + "," + std::to_string(r.y) + " " +
+                    std::to_string(r.w) + "x" + std::to_string(r.h);
+        }
+    return text;
+}
+
+std::vector<CRectArea> CWorld::glyphs(CFont *_p_font) const {
+    std::vector<CRectArea> found;
+    CMaterial *p_material = _p_font ? _p_font->get_char_material('A') : nullptr;
+    if (!p_material) return found;
+    for (SDrawn const &drawn_call : drawn())
+        if (drawn_call.m_op == "quad" && drawn_call.m_handle == p_material->get_material_handle())
+            found.push_back(drawn_call.m_rect);
+    return found;
+}
+
+std::string event_name(EEventType _id) {
+    // clang-format off
+    static char const *const names[] = {
+        "EVENT_UPDATE", "EVENT_DRAW", "EVENT_HIDE", "EVENT_SHOW", "EVENT_SHOW_MAXIMIZED", "EVENT_SHOW_NORMAL",
+        "EVENT_ACTIVATE", "EVENT_DEACTIVATE", "EVENT_LOST_FOCUS", "EVENT_ENABLE", "EVENT_DISABLE",
+        "EVENT_RESIZE", "EVENT_RESIZED", "EVENT_DRAG_BEGIN", "EVENT_DRAG", "EVENT_DRAG_END",
+        "EVENT_REPORT_POINT_INSIDE", "EVENT_POINTER_ENTER", "EVENT_POINTER_EXIT", "EVENT_POINTER_MOVE",
+        "EVENT_POINTER_POS", "EVENT_POINTER_DOWN", "EVENT_POINTER_UP", "EVENT_WHEEL_ROTATED", "EVENT_CLICK",
+        "EVENT_DOUBLE_CLICK", "EVENT_CHANGED", "EVENT_SET_TEXT", "EVENT_SET_STR", nullptr, nullptr,
+        "EVENT_KEY_DOWN", "EVENT_KEY_UP", "EVENT_CHAR", "EVENT_LINE_UP", "EVENT_LINE_DOWN", "EVENT_PAGE_UP",
+        "EVENT_PAGE_DOWN", "EVENT_SCROLL_SMALL_STEP", "EVENT_SCROLL_LARGE_STEP", "EVENT_CHECKED",
+        "EVENT_UNCHECKED", "EVENT_HIGHLIGHTED", "EVENT_RESOURCE_INVALIDATE"};
+    // clang-format on
+    size_t const index = static_cast<size_t>(_id);
+    if (index < sizeof(names) / sizeof(names[0]) && names[index]) return names[index];
+    return std::to_string(index);
+}
+
+void log_events(CWindow *_p_wnd, std::initializer_list<EEventType> _ids, std::vector<std::string> &_log) {
+    for (EEventType const id : _ids)
+        _p_wnd->register_callback(
+            id, CEventCallback([&_log, id](CWndEvent const *) { _log.push_back(event_name(id)); }));
 }
 
 void expect_golden(qorhost::SImage const &_actual, std::string const &_name) {
@@ -109,55 +184,6 @@ void expect_golden(qorhost::SImage const &_actual, std::string const &_name) {
     qorhost::write_png(actual_path, _actual);
     EXPECT_EQ(0, qorhost::compare_images(_actual, golden, 2, diff_path))
         << _name << ": actual " << actual_path << ", difference " << diff_path;
-}
-
-std::string event_name(EEventType _id) {
-    static char const *const names[] = {"EVENT_UPDATE",
-                                        "EVENT_DRAW",
-                                        "EVENT_HIDE",
-                                        "EVENT_SHOW",
-                                        "EVENT_SHOW_MAXIMIZED",
-                                        "EVENT_SHOW_NORMAL",
-                                        "EVENT_ACTIVATE",
-                                        "EVENT_DEACTIVATE",
-                                        "EVENT_LOST_FOCUS",
-                                        "EVENT_ENABLE",
-                                        "EVENT_DISABLE",
-                                        "EVENT_RESIZE",
-                                        "EVENT_RESIZED",
-                                        "EVENT_DRAG_BEGIN",
-                                        "EVENT_DRAG",
-                                        "EVENT_DRAG_END",
-                                        "EVENT_REPORT_POINT_INSIDE",
-                                        "EVENT_POINTER_ENTER",
-                                        "EVENT_POINTER_EXIT",
-                                        "EVENT_POINTER_MOVE",
-                                        "EVENT_POINTER_POS",
-                                        "EVENT_POINTER_DOWN",
-                                        "EVENT_POINTER_UP",
-                                        "EVENT_WHEEL_ROTATED",
-                                        "EVENT_CLICK",
-                                        "EVENT_DOUBLE_CLICK",
-                                        "EVENT_CHANGED",
-                                        "EVENT_SET_TEXT",
-                                        "EVENT_SET_STR",
-                                        "29",
-                                        "30",
-                                        "EVENT_KEY_DOWN",
-                                        "EVENT_KEY_UP",
-                                        "EVENT_CHAR",
-                                        "EVENT_LINE_UP",
-                                        "EVENT_LINE_DOWN",
-                                        "EVENT_PAGE_UP",
-                                        "EVENT_PAGE_DOWN",
-                                        "EVENT_SCROLL_SMALL_STEP",
-                                        "EVENT_SCROLL_LARGE_STEP",
-                                        "EVENT_CHECKED",
-                                        "EVENT_UNCHECKED",
-                                        "EVENT_HIGHLIGHTED",
-                                        "EVENT_RESOURCE_INVALIDATE"};
-    bool const known = _id >= 0 && static_cast<size_t>(_id) < sizeof(names) / sizeof(names[0]);
-    return known ? names[_id] : std::to_string(_id);
 }
 
 void CEventLog::watch(CWindow *_p_wnd, std::vector<EEventType> const &_ids) {

@@ -57,6 +57,20 @@ public:
 
     // One frame: update, then draw into a frame cleared to a dark grey.
     void frame();
+
+    // What the last frame drew, in desktop pixels and in order: clip areas ("clip") and quads
+    // ("quad"), each quad with the handle of the material set for it and its first corner's colour.
+    struct SDrawn {
+        std::string m_op;
+        qorui::CRectArea m_rect;
+        int m_handle;
+        rgba_t m_colour;
+    };
+    std::vector<SDrawn> drawn() const;
+    // The clip areas of the last frame as "x,y wxh", in order, joined by "; ".
+    std::string clips() const;
+    // The quads of the last frame in the font's material: the characters it drew, in order.
+    std::vector<qorui::CRectArea> glyphs(qorui::CFont *_p_font) const;
     // The last frame against tests/golden/<_name>.png.
     void expect_golden(char const *_name);
 
@@ -77,6 +91,10 @@ void expect_golden(qorhost::SImage const &_actual, std::string const &_name);
 
 // The name of an event type as the source writes it ("EVENT_CLICK"), so that failures read.
 std::string event_name(qorui::EEventType _id);
+// From now on, the name of each of the events that reaches _p_wnd goes to _log, behind the window's
+// own handlers; _log must outlive the window.
+void log_events(qorui::CWindow *_p_wnd, std::initializer_list<qorui::EEventType> _ids,
+                std::vector<std::string> &_log);
 
 // Records "window:EVENT_NAME" for each of the watched events that a window takes, in order.
 class CEventLog {

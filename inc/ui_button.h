@@ -1,0 +1,87 @@
+// Buttons: windows that a click acts on, each with one string.
+//
+//   CButton        a push button; its caption stands centred over the material of its state and
+//                  sinks by one pixel while it is pressed under the pointer or checked
+//   CCheckBox      a checker picture with a label beside it; a click toggles the checked state
+//   CRadioButton   a check box whose group is every radio button among its parent's children
+//
+// The pointer states (highlighted, pushed) and the checked state are those of the visual window;
+// a click is EVENT_CLICK from the desktop, on which owners register their callbacks.
+#pragma once
+#include "ui_string.h"
+#include "ui_window_visual.h"
+
+namespace qorui {
+
+class CButton : public CWindowVisual {
+public:
+    // Passive: a press on the button activates the window that holds it.
+    CButton(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CButton();
+
+    QOR_CLASS_ID(CButton, CWindowVisual, "Button")
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    // The part of a control that wears the desktop's look for it: a clone of each of the desktop's
+    // materials _normal, _highlighted and _pushed becomes the button's own normal, highlighted and
+    // pushed material, so the desktop's can change or go. One the desktop lacks is left out.
+    void dress_from_desktop(HUID const &_normal, HUID const &_highlighted, HUID const &_pushed);
+
+    // The caption; owners assign it directly.
+    CString m_text;
+
+protected:
+    virtual void on_event_draw(CWndEvent const *_p_event) override;
+
+private:
+    CFont *choose_font();
+};
+
+class CCheckBox : public CWindowVisual {
+public:
+    // A 16 by 16 checker; not passive, so a check box can be the active window.
+    CCheckBox(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CCheckBox();
+
+    QOR_CLASS_ID(CCheckBox, CWindowVisual, "CheckBox")
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    void set_checker_size(int _w, int _h);
+    int get_checker_w() const { return m_checker_w; }
+    int get_checker_h() const { return m_checker_h; }
+
+    // The label, drawn right of the checker; owners assign it directly, and layouts don't keep it.
+    CString m_text;
+
+protected:
+    virtual void on_event_draw(CWndEvent const *_p_event) override;
+    virtual void on_event_pointer_enter(CWndEvent const *_p_event) override;
+    virtual void on_event_click(CWndEvent const *_p_event) override;
+
+    int m_checker_w;
+    int m_checker_h;
+    // Set by a click, cleared when the pointer comes in again: while set, the highlight picture
+    // stays off, so the new state shows at once under the pointer.
+    bool m_just_clicked;
+
+private:
+    CMaterial *choose_checker_material();
+};
+
+class CRadioButton : public CCheckBox {
+public:
+    CRadioButton(IWindowDesktop *_p_desktop, char const *_name);
+    virtual ~CRadioButton();
+
+    QOR_CLASS_ID(CRadioButton, CCheckBox, "RadioButton")
+
+protected:
+    // Turns this button on and every other radio button of the same parent off; sends nothing.
+    virtual void on_event_click(CWndEvent const *_p_event) override;
+};
+
+} // namespace qorui

@@ -1,0 +1,371 @@
+// Value, progress and scroll bars in the test world: the range and position invariant, the
+// normalised position, orientation, the progress fill, and the scroll bar's layout, steps, track
+// presses and scroller drags through the pointer, for both orientations; layouts and the factory.
+#include "ui_value_bar.h"
+
+#include "engine_interfaces.h"
+#include "qorscriptsystem.h"
+#include "test_support.h"
+#include "test_world.h"
+#include "ui_button.h"
+#include "ui_material.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+using namespace qorui;
+
+namespace {
+
+typedef std::vector<std::string> events_t;
+
+std::vector<int> xy(point_t const &_p) {
+    return {_p.x, _p.y};
+}
+
+LuaPlus::LuaObject layout(char const *_table) {
+    lua_machine().DoString((std::string("probe = ") + _table).c_str());
+    return lua_machine().GetGlobals().GetByName("probe");
+}
+
+// Only a class of the family can break the range: the setters never do.
+class CBrokenRange : public CValueBar {
+public:
+    CBrokenRange(IWindowDesktop *_p_desktop) : CValueBar(_p_desktop, "broken") {
+        m_min = 10.0f, m_max = 0.0f;
+    }
+};
+
+} // namespace
+
+TEST(ValueBar, EverySetterKeepsThePositionInsideTheRangeAndOnlyAChangeOfTheArgumentIsSent) {
+    enum EOp { MIN, MAX, POSITION };
+    float const nan = std::numeric_limits<float>::quiet_NaN();
+    struct {
+        char const *m_case;
+        float m_start; // the position before, in the range 0 to 100
+        EOp m_op;
+        float m_value, m_min, m_max, m_position;
+        size_t m_changed, m_changed_again; // events after the call, and after the same call once more
+    } const rows[] = {
+        {"inside", 0, POSITION, 50, 0, 100, 50, 1, 1},
+        {"the stored value", 50, POSITION, 50, 0, 100, 50, 0, 0},
+        {"above the range", 100, POSITION, 150, 0, 100, 100, 1, 2}, // compared before clamping
+        {"below the range", 0, POSITION, -5, 0, 100, 0, 1, 2},
+        {"not a number", 40, POSITION, nan, 0, 100, 0, 1, 2},
+        {"minimum above the maximum", 30, MIN, 120, 100, 100, 100, 0, 0},
+        {"minimum above the position", 30, MIN, 40, 40, 100, 40, 0, 0},
+        {"maximum below the minimum", 30, MAX, -10, 0, 0, 0, 0, 0},
+        {"maximum below the position", 80, MAX, 60, 0, 60, 60, 0, 0},
+        {"minimum not a number", 30, MIN, nan, 100, 100, 100, 0, 0},
+    };
+    qortest::CWorld world;
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_case);
+        CValueBar bar(&world.desktop(), "bar");
+        bar.set_position(row.m_start);
+        events_t events;
+        qortest::log_events(&bar, {EVENT_CHANGED}, events);
+        auto call = [&] {
+            if (row.m_op == MIN) bar.set_min(row.m_value);
+            if (row.m_op == MAX) bar.set_max(row.m_value);
+            if (row.m_op == POSITION) bar.set_position(row.m_value);
+        };
+        call();
+        EXPECT_EQ((std::vector<float>{row.m_min, row.m_max, row.m_position}),
+                  (std::vector<float>{bar.get_min(), bar.get_max(), bar.get_position()}));
+        EXPECT_EQ(row.m_changed, events.size());
+        call();
+        EXPECT_EQ(row.m_changed_again, events.size());
+    }
+    qortest::CReportCapture capture;
+    EXPECT_EQ(0.0f, CBrokenRange(&world.desktop()).get_position_normalized());
+    ASSERT_EQ(1u, capture.texts(qordebug::REPORT_ASSERT).size());
+    EXPECT_EQ(0u, capture.texts(qordebug::REPORT_ASSERT)[0].find("Expression:   range >= 0, \n"));
+}
+
+// The window keeps its size; only the thickness is read anew, from the other side. A layout
+// changes the orientation only with a boolean.
+TEST(ValueBar, OrientationTakesTheBarSizeFromTheOtherSideAndSwapsNothing) {
+    qortest::CWorld world;
+    CValueBar *p_bar = world.place(&world.desktop(), new CValueBar(&world.desktop(), "bar"), 0, 0, 200, 12);
+    EXPECT_EQ(12, p_bar->get_bar_size());
+    events_t events;
+    qortest::log_events(p_bar, {EVENT_RESIZE, EVENT_RESIZED}, events);
+    p_bar->set_horizontal(false);
+    EXPECT_EQ((std::vector<int>{200, 200, 12}),
+              (std::vector<int>{p_bar->get_bar_size(), p_bar->get_w(), p_bar->get_h()}));
+    EXPECT_EQ((events_t{"EVENT_RESIZED", "EVENT_RESIZE", "EVENT_RESIZED"}), events);
+    EXPECT_EQ(0, CValueBar(&world.desktop(), "fresh").get_bar_size()); // no size yet
+    LuaPlus::LuaObject saved;
+    saved.AssignNewTable(&lua_machine());
+    p_bar->save_state(saved);
+    p_bar->set_horizontal(true);
+    p_bar->load_state(saved);
+    EXPECT_FALSE(p_bar->get_horizontal());
+    qortest::CReportCapture capture;
+    LuaPlus::LuaObject bad = layout("{ name = 'bar', class_name = 'ValueBar', is_horizontal = 'true' }");
+    p_bar->load_state(bad);
+    EXPECT_FALSE(p_bar->get_horizontal());
+    EXPECT_TRUE(capture.reports().empty());
+}
+
+// The fill grows from the left whatever the orientation; its height is the bar size less the
+// margins, so a vertical bar fills as high as it is wide.
+TEST(ProgressBar, TheFillIsTheNormalisedShareOfTheClientWidthAndTheBarSizeHigh) {
+    struct {
+        bool m_horizontal;
+        int m_w, m_h;
+        float m_position;
+        int m_fill_w, m_fill_h;
+    } const rows[] = {
+        {true, 200, 12, 100, 198, 10}, {true, 200, 12, 75, 148, 10}, {false, 12, 100, 100, 10, 10}};
+    for (auto const &row : rows) {
+        SCOPED_TRACE(testing::Message() << row.m_w << " by " << row.m_h << " at " << row.m_position);
+        qortest::CWorld world;
+        world.clock().advance_ms(150); // the desktop has faded in
+        CProgressBar *p_bar =
+            world.place(&world.desktop(), new CProgressBar(&world.desktop(), "p"), 10, 20, row.m_w, row.m_h);
+        p_bar->set_horizontal(row.m_horizontal);
+        p_bar->set_uniform_margins(1);
+        p_bar->set_max(150);
+        p_bar->set_min(50);
+        p_bar->set_position(row.m_position); // 75 of the width 100 is 0.75: 148.5 pixels
+        world.frame();
+        std::vector<qortest::CWorld::SDrawn> quads;
+        for (auto const &drawn : world.drawn())
+            if (drawn.m_op == "quad") quads.push_back(drawn);
+        ASSERT_EQ(2u, quads.size());
+        EXPECT_EQ(rgba_t(52, 52, 52, 50), quads[0].m_colour); // the body
+        EXPECT_EQ(rgba_t(252, 252, 252, 200), quads[1].m_colour);
+        CRectArea const &fill = quads[1].m_rect;
+        EXPECT_EQ((std::vector<int>{11, 21, row.m_fill_w, row.m_fill_h}),
+                  (std::vector<int>{fill.x, fill.y, fill.w, fill.h}));
+    }
+}
+
+namespace {
+
+// A bar 16 thick: end buttons of 16 by 16 and a scroller 10 across and 20 along. The horizontal
+// bar stands at (10, 100), the vertical one at (100, 10); the pointer goes to (along, across) from
+// the bar's corner.
+class ScrollBarTest : public ::testing::TestWithParam<bool> {
+protected:
+    void make_bar(int _length, float _position = 0) {
+        bool const horizontal = GetParam();
+        mp_bar = new CScrollBar(&m_world.desktop(), "bar");
+        m_world.place(&m_world.desktop(), mp_bar, horizontal ? 10 : 100, horizontal ? 100 : 10,
+                      horizontal ? _length : 16, horizontal ? 16 : _length);
+        mp_bar->set_horizontal(horizontal);
+        mp_bar->get_button_min()->set_size(16, 16);
+        mp_bar->get_button_max()->set_size(16, 16);
+        mp_bar->get_button_scroller()->set_size(horizontal ? 20 : 10, horizontal ? 10 : 20);
+        mp_bar->set_position(_position);
+        mp_bar->set_scroller_for_position();
+    }
+    void move_to(int _along, int _across = 8) {
+        if (GetParam())
+            m_world.move_to(10 + _along, 100 + _across);
+        else
+            m_world.move_to(100 + _across, 10 + _along);
+    }
+    void click_at(int _along, int _across = 8) {
+        move_to(_along, _across);
+        m_world.press();
+        m_world.release();
+    }
+    // The corner of a button in the bar, as (along, across).
+    point_t place_of(CButton *_p_button) const {
+        point_t const pos = _p_button->get_pos();
+        return GetParam() ? pos : point_t{pos.y, pos.x};
+    }
+    int scroller() const { return place_of(mp_bar->get_button_scroller()).x; }
+
+    qortest::CWorld m_world;
+    CScrollBar *mp_bar = nullptr;
+};
+
+} // namespace
+
+INSTANTIATE_TEST_SUITE_P(BothWays, ScrollBarTest, testing::Bool(),
+                         [](testing::TestParamInfo<bool> const &_info) {
+                             return _info.param ? "Horizontal" : "Vertical";
+                         });
+
+// The track is the bar less the scroller and the shown end buttons, 148 pixels here; the scroller
+// stands the position's share of it behind the min button, centred across the bar. A vertical bar
+// too short for its buttons keeps the scroller behind the min button, a horizontal one lets it run
+// back over it.
+TEST_P(ScrollBarTest, TheScrollerStandsWhereThePositionPutsItOnTheTrack) {
+    enum { NONE, MIN, MAX, SCROLLER };
+    struct {
+        char const *m_case;
+        int m_length, m_hidden;
+        float m_min, m_max, m_position;
+        int m_along, m_vertical_along;
+    } const rows[] = {
+        {"at the minimum", 200, NONE, 0, 100, 0, 16, 16},
+        {"at the maximum", 200, NONE, 0, 100, 100, 16 + 148, 16 + 148},
+        {"a third", 200, NONE, 0, 100, 33, 16 + 48, 16 + 48}, // 48.84 truncated
+        {"halfway of 50 to 150", 200, NONE, 50, 150, 100, 16 + 74, 16 + 74},
+        {"no range", 200, NONE, 20, 20, 20, 16, 16},
+        {"min button hidden", 200, MIN, 0, 100, 50, 82, 82}, // a track of 164
+        {"max button hidden", 200, MAX, 0, 100, 50, 16 + 82, 16 + 82},
+        {"scroller hidden", 200, SCROLLER, 0, 100, 50, 16 + 74, 16 + 74},
+        {"too short, halfway", 40, NONE, 0, 100, 50, 16 - 6, 16}, // a track of -12
+        {"too short, at the maximum", 40, NONE, 0, 100, 100, 16 - 12, 16},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_case);
+        make_bar(row.m_length);
+        CButton *const parts[] = {nullptr, mp_bar->get_button_min(), mp_bar->get_button_max(),
+                                  mp_bar->get_button_scroller()};
+        if (parts[row.m_hidden]) parts[row.m_hidden]->set_hidden(true);
+        mp_bar->set_max(row.m_max);
+        mp_bar->set_min(row.m_min);
+        mp_bar->set_position(row.m_position);
+        mp_bar->set_scroller_for_position();
+        EXPECT_EQ(GetParam() ? row.m_along : row.m_vertical_along, scroller());
+        EXPECT_EQ(3, place_of(mp_bar->get_button_scroller()).y); // (16 - 10) / 2
+        EXPECT_EQ(row.m_length - 16, place_of(mp_bar->get_button_max()).x);
+        delete mp_bar;
+    }
+}
+
+// One click, one step, and the scroller follows the change; a step beyond the range sends
+// EVENT_CHANGED all the same. The steps are 10 and 50 until the range is set, then 1% and 10% of
+// it, and never more than the range.
+TEST_P(ScrollBarTest, TheEndButtonsStepByTheSmallStepAndTheStepsFollowTheRange) {
+    make_bar(200);
+    events_t events;
+    qortest::log_events(mp_bar, {EVENT_SCROLL_SMALL_STEP, EVENT_CHANGED}, events);
+    struct {
+        int m_along;
+        float m_position;
+        int m_scroller;
+    } const rows[] = {{190, 10, 16 + 14}, {190, 20, 16 + 29}, {5, 10, 16 + 14}, {5, 0, 16}, {5, 0, 16}};
+    for (auto const &row : rows) {
+        SCOPED_TRACE(testing::Message() << "click at " << row.m_along << " to " << row.m_position);
+        events.clear();
+        click_at(row.m_along);
+        EXPECT_EQ(row.m_position, mp_bar->get_position());
+        EXPECT_EQ(row.m_scroller, scroller());
+        EXPECT_EQ((events_t{"EVENT_CHANGED", "EVENT_SCROLL_SMALL_STEP"}), events);
+    }
+    mp_bar->set_max(1000);
+    EXPECT_EQ((std::vector<float>{10, 100}),
+              (std::vector<float>{mp_bar->get_small_step(), mp_bar->get_large_step()}));
+    mp_bar->set_min(500);
+    mp_bar->set_small_step(2000);
+    EXPECT_EQ((std::vector<float>{500, 50}),
+              (std::vector<float>{mp_bar->get_small_step(), mp_bar->get_large_step()}));
+    qortest::CReportCapture capture;
+    mp_bar->set_large_step(-1);
+    EXPECT_EQ(50.0f, mp_bar->get_large_step());
+    ASSERT_EQ(1u, capture.texts(qordebug::REPORT_ASSERT).size());
+    EXPECT_EQ(0u, capture.texts(qordebug::REPORT_ASSERT)[0].find("Expression:   _val >= 0, \n"));
+}
+
+// A press on the track is a large step towards the pointer; level with the scroller counts
+// towards the maximum. The bar doesn't stay pushed behind the press.
+TEST_P(ScrollBarTest, APressOnTheTrackStepsByTheLargeStepTowardsThePointer) {
+    struct {
+        char const *m_case;
+        int m_along, m_across;
+        float m_position;
+    } const rows[] = {{"before the scroller", 40, 8, 0},
+                      {"behind it", 150, 8, 100},
+                      {"level with it, beside it", 90, 1, 100}};
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_case);
+        make_bar(200, 50);
+        ASSERT_EQ(90, scroller());
+        events_t events;
+        qortest::log_events(mp_bar, {EVENT_SCROLL_LARGE_STEP, EVENT_CHANGED}, events);
+        click_at(row.m_along, row.m_across);
+        EXPECT_EQ(row.m_position, mp_bar->get_position());
+        EXPECT_EQ((events_t{"EVENT_CHANGED", "EVENT_SCROLL_LARGE_STEP"}), events);
+        EXPECT_FALSE(mp_bar->is_pushed());
+        delete mp_bar;
+    }
+}
+
+// The drag offset is where the pointer took hold; the movement counts only on the side of it that
+// the pointer moves to, so after running past the end the pointer has to come back first.
+TEST_P(ScrollBarTest, DraggingTheScrollerMovesThePositionByTheRangeOverTheTrack) {
+    make_bar(200);
+    events_t events;
+    qortest::log_events(mp_bar, {EVENT_CHANGED}, events);
+    move_to(20);
+    m_world.press();
+    move_to(24); // the drag begins: the pointer holds the scroller 8 behind its corner
+    struct {
+        int m_along;
+        float m_position;
+        int m_scroller;
+    } const rows[] = {
+        {61, 25, 16 + 37}, // 37 pixels of 148 are a quarter
+        {220, 100, 16 + 148}, {200, 100, 16 + 148},
+        {172, 100, 16 + 148}, // past the end, back to the grab point
+        {135, 75, 16 + 111},  {98, 50, 16 + 74},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(testing::Message() << "pointer at " << row.m_along);
+        move_to(row.m_along);
+        EXPECT_EQ(row.m_position, mp_bar->get_position());
+        EXPECT_EQ((std::vector<int>{row.m_scroller, 3}), xy(place_of(mp_bar->get_button_scroller())));
+    }
+    m_world.release();
+    EXPECT_EQ(4u, events.size());
+}
+
+TEST_P(ScrollBarTest, DisablingAndEnablingTheBarReachItsButtons) {
+    make_bar(200);
+    mp_bar->send_event(mp_bar, EVENT_DISABLE, CWndEvent::DISPATCH_NONE);
+    EXPECT_EQ(
+        (std::vector<bool>{true, true, true}),
+        (std::vector<bool>{mp_bar->get_button_min()->is_disabled(), mp_bar->get_button_max()->is_disabled(),
+                           mp_bar->get_button_scroller()->is_disabled()}));
+    click_at(190);
+    EXPECT_EQ(0.0f, mp_bar->get_position());
+    mp_bar->send_event(mp_bar, EVENT_ENABLE, CWndEvent::DISPATCH_NONE);
+    click_at(190);
+    EXPECT_EQ(10.0f, mp_bar->get_position());
+}
+
+// Each button owns a clone of those of the desktop's materials that exist; buttons of a fresh bar
+// have its bar size, 0.
+TEST(ScrollBar, TheButtonsTakeTheDesktopsLookAndALayoutFindsThemByName) {
+    qortest::CWorld world;
+    world.desktop().add_material(MAT_NAME_BUTTON_UP, world.colour(1, 0, 0));
+    world.desktop().add_material(MAT_NAME_BUTTON_SCROLLER_PUSHED, world.colour(3, 0, 0));
+    CWindow *p_wnd = get_windows_factory().Create(HUID("ScrollBar"), &world.desktop(), "bar");
+    world.desktop().attach_child(p_wnd);
+    CScrollBar *p_bar = class_cast<CScrollBar>(p_wnd);
+    ASSERT_NE(nullptr, p_bar);
+    CMaterial *p_up = p_bar->get_button_min()->get_material(MAT_NAME_NORMAL);
+    ASSERT_NE(nullptr, p_up);
+    EXPECT_NE(world.desktop().get_material(MAT_NAME_BUTTON_UP), p_up);
+    EXPECT_EQ(1, p_up->get_color().r);
+    EXPECT_EQ(3, p_bar->get_button_scroller()->get_material(MAT_NAME_PUSHED)->get_color().r);
+    EXPECT_EQ(nullptr, p_bar->get_button_max()->get_material(MAT_NAME_NORMAL));
+    EXPECT_EQ(0, p_bar->get_button_min()->get_w());
+
+    qortest::CReportCapture capture;
+    LuaPlus::LuaObject bare =
+        layout("{ name = 'bar', class_name = 'ScrollBar', size = { 16, 200 }, is_horizontal = false }");
+    p_wnd->load_state(bare);
+    LuaPlus::LuaObject named =
+        layout("{ name = 'bar', class_name = 'ScrollBar',"
+               " { name = 'button scroller', class_name = 'Button', size = { 10, 20 } },"
+               " { name = 'button max', class_name = 'Button', size = { 16, 16 } } }");
+    p_wnd->load_state(named);
+    p_wnd->send_event(p_wnd, EVENT_RESIZED, CWndEvent::DISPATCH_CHILDREN); // as an import ends
+    EXPECT_EQ(3u, p_wnd->get_children_count());
+    EXPECT_EQ(16, p_bar->get_bar_size());
+    EXPECT_EQ((std::vector<int>{3, 0}),
+              xy(p_bar->get_button_scroller()->get_pos())); // the min button has no size
+    EXPECT_EQ((std::vector<int>{0, 184}), xy(p_bar->get_button_max()->get_pos()));
+    EXPECT_TRUE(capture.reports().empty());
+}
