@@ -6,6 +6,7 @@
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
+#include "qorbase.h"
 #include "engine_interfaces.h"
 #include "ui_button.h"
 #include "ui_desktop.h"
@@ -359,7 +360,7 @@ void cmd_gameui_demo_scene(char const *, void *) {
     p_bar->set_alignment(ALIGNMENT_TOP);
     p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
     place(p_bar, new CDemoText(p_desktop, "heading", "qorui - demo scene"), 16, 8, 400, 20);
-    lua_machine().DoFile(16, "ui_material_presets.lua");
+    lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
     dress_desktop_for_step_buttons(p_desktop);
     make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
     make_message_dialog(p_desktop, "second dialog",
