@@ -5,7 +5,7 @@
 //   TDataStreamBase      append, read, rewind, release; copying moves
 //   the two streams      the window stream and the common stream, with their type lists
 #pragma once
-#include "data_variant.h"
+#include "detail/data_variant.h"
 #include "qor_math.h"
 
 #include <cstddef>

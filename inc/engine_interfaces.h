@@ -86,11 +86,4 @@ CEngineInterfaces &engine_interfaces();
 // The library's one Lua state, created at the first call and never destroyed.
 LuaPlus::LuaState &lua_machine();
 
-// An evaluator of expressions that an engine may implement; nothing in the library calls it.
-class IExpressionEvaluator {
-public:
-    virtual ~IExpressionEvaluator() {}
-    virtual float evaluate(char const *_expression) = 0;
-};
-
 } // namespace qorui

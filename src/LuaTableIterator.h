@@ -1,5 +1,6 @@
 // Walking Lua tables and the fields of layout tables. Each reader takes its key only when it has
 // the expected Lua type; otherwise the value stays as it is, with no message.
+// Internal to the library.
 #pragma once
 #include "qor_memory.h"
 #include "qorscriptsystem.h"

@@ -5,6 +5,8 @@
 //
 //   type positions      Type<T>::value, the size and alignment of the largest type
 //   CDataVariantBase    construction with a copy of a value, typed access, destruction
+// Internal to the library: reached through data_stream_base.h only, and may change between
+// versions.
 #pragma once
 #include "qor_memory.h"
 #include "ui_debug.h"

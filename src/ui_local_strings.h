@@ -1,6 +1,7 @@
 // The reader of local strings files: lines of a key, a blank or a tab, and a text in quotes, in
 // 16-bit units behind a byte-order mark or in bytes without one. The service fills its table with
 // it at start-up.
+// Internal to the library.
 #pragma once
 #include "ui_string.h"
 

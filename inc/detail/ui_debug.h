@@ -1,6 +1,8 @@
 // Contract checks of the library. A broken contract is reported through qordebug::assert_func
 // with the expression, file, line and function; the caller then steps aside with its neutral
 // result:  if (!QOR_CHECK(p_child)) return;
+// Internal to the library (its sources and the stream templates of its headers use it); may
+// change between versions.
 #pragma once
 
 namespace qorui {

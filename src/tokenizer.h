@@ -1,6 +1,7 @@
 // A small scanner over a block of text in memory: tokens between separator strings, with `//` and
 // `/*` comments and quoted tokens. Every failure is thrown as a `char const *` pointing at an empty
 // text; the catcher knows its own context (a command prints its usage, a font reader stops).
+// Internal to the library.
 #pragma once
 #include "qor_memory.h"
 #include <set>
