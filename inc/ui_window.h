@@ -63,7 +63,7 @@ public:
 
     QOR_CLASS_ID(CWindow, void, "Window")
 
-    // Tree
+    // Tree and identity: links, order, lookup, the name
     virtual void attach_child(CWindow *_p_child);
     virtual void on_attached() {}
     // From load_state, behind each child entry.
@@ -72,63 +72,6 @@ public:
     virtual void on_detached() {}
     // The child goes last, then behind every always-on-top sibling.
     virtual void bring_to_front(CWindow *_p_child);
-
-    // Geometry
-    virtual bool is_point_inside(point_t const &_global) const;
-    virtual int get_client_w() const { return m_region.get_w(); }
-    virtual int get_client_h() const { return m_region.get_h(); }
-    virtual void set_pos(int _x, int _y);
-    virtual point_t get_pos() const { return m_pos; }
-    virtual point_t get_client_pos() const { return point_t{0, 0}; }
-
-    // Persistence
-    virtual void save_state(LuaPlus::LuaObject &_lo_table);
-    virtual void load_state(LuaPlus::LuaObject &_lo_table);
-    // Runs "ui_material_presets.lua" and the layout file, then loads the global ui_windows_ini.
-    virtual void import(int _unused, char const *_file);
-
-protected:
-    virtual void on_event(CWndEvent const *_p_event) override;
-    virtual bool filter_event(CWndEvent const *_p_event);
-
-    virtual void on_event_update(CWndEvent const *_p_event);
-    virtual void on_event_draw(CWndEvent const *_p_event);
-    virtual void on_event_show(CWndEvent const *_p_event);
-    virtual void on_event_show_maximized(CWndEvent const *_p_event);
-    virtual void on_event_show_normal(CWndEvent const *_p_event);
-    virtual void on_event_hide(CWndEvent const *_p_event);
-    virtual void on_event_enable(CWndEvent const *_p_event);
-    virtual void on_event_disable(CWndEvent const *_p_event);
-    virtual void on_event_activate(CWndEvent const *) {}
-    virtual void on_event_deactivate(CWndEvent const *) {}
-    virtual void on_event_lost_focus(CWndEvent const *_p_event);
-    virtual void on_event_resize(CWndEvent const *_p_event);
-    virtual void on_event_resized(CWndEvent const *_p_event);
-    virtual void on_event_changed(CWndEvent const *) {}
-    virtual void on_event_report_point_inside(CWndEvent const *_p_event);
-    virtual void on_event_pointer_move(CWndEvent const *) {}
-    virtual void on_event_pointer_pos(CWndEvent const *) {}
-    virtual void on_event_pointer_enter(CWndEvent const *) {}
-    virtual void on_event_pointer_exit(CWndEvent const *) {}
-    virtual void on_event_pointer_up(CWndEvent const *) {}
-    virtual void on_event_pointer_down(CWndEvent const *) {}
-    virtual void on_event_wheel_rotated(CWndEvent const *) {}
-    virtual void on_event_click(CWndEvent const *) {}
-    virtual void on_event_double_click(CWndEvent const *) {}
-    virtual void on_event_drag_begin(CWndEvent const *) {}
-    virtual void on_event_drag(CWndEvent const *_p_event);
-    virtual void on_event_drag_end(CWndEvent const *) {}
-    virtual void on_event_set_text(CWndEvent const *) {}
-    virtual void on_event_set_str(CWndEvent const *) {}
-    virtual void on_event_key_down(CWndEvent const *) {}
-    virtual void on_event_key_up(CWndEvent const *) {}
-    virtual void on_event_char(CWndEvent const *) {}
-    virtual void on_event_resource_invalidate(CWndEvent const *_p_event);
-
-    void calc_global_pos();
-
-public:
-    // Tree and lookup
     CWindow *get_parent() { return mp_parent; }
     IWindowDesktop *get_desktop() { return mp_desktop; }
     unsigned int get_children_count() const { return static_cast<unsigned int>(m_children.size()); }
@@ -167,6 +110,12 @@ public:
     void set_auto_delete(bool _auto_delete) { m_auto_delete = _auto_delete; }
 
     // Geometry
+    virtual bool is_point_inside(point_t const &_global) const;
+    virtual int get_client_w() const { return m_region.get_w(); }
+    virtual int get_client_h() const { return m_region.get_h(); }
+    virtual void set_pos(int _x, int _y);
+    virtual point_t get_pos() const { return m_pos; }
+    virtual point_t get_client_pos() const { return point_t{0, 0}; }
     int get_w() const { return m_region.get_w(); }
     int get_h() const { return m_region.get_h(); }
     void set_w(int _w) { set_size(_w, m_region.get_h()); }
@@ -180,13 +129,63 @@ public:
     point_t const &get_global_pos() const { return m_global_pos; }
     point_t convert_to_local(point_t const &_global) const;
 
+    // Input: keyboard and wheel events whether the window is active or not
     void input_subscribe(bool _subscribe);
 
+    // Persistence
+    virtual void save_state(LuaPlus::LuaObject &_lo_table);
+    virtual void load_state(LuaPlus::LuaObject &_lo_table);
+    // Runs "ui_material_presets.lua" and the layout file, then loads the global ui_windows_ini.
+    virtual void import(int _unused, char const *_file);
+
 protected:
+    // Routing and the default handlers, one for each event
+    virtual void on_event(CWndEvent const *_p_event) override;
+    virtual bool filter_event(CWndEvent const *_p_event);
+
+    virtual void on_event_update(CWndEvent const *_p_event);
+    virtual void on_event_draw(CWndEvent const *_p_event);
+    virtual void on_event_show(CWndEvent const *_p_event);
+    virtual void on_event_show_maximized(CWndEvent const *_p_event);
+    virtual void on_event_show_normal(CWndEvent const *_p_event);
+    virtual void on_event_hide(CWndEvent const *_p_event);
+    virtual void on_event_enable(CWndEvent const *_p_event);
+    virtual void on_event_disable(CWndEvent const *_p_event);
+    virtual void on_event_activate(CWndEvent const *) {}
+    virtual void on_event_deactivate(CWndEvent const *) {}
+    virtual void on_event_lost_focus(CWndEvent const *_p_event);
+    virtual void on_event_resize(CWndEvent const *_p_event);
+    virtual void on_event_resized(CWndEvent const *_p_event);
+    virtual void on_event_changed(CWndEvent const *) {}
+    virtual void on_event_report_point_inside(CWndEvent const *_p_event);
+    virtual void on_event_pointer_move(CWndEvent const *) {}
+    virtual void on_event_pointer_pos(CWndEvent const *) {}
+    virtual void on_event_pointer_enter(CWndEvent const *) {}
+    virtual void on_event_pointer_exit(CWndEvent const *) {}
+    virtual void on_event_pointer_up(CWndEvent const *) {}
+    virtual void on_event_pointer_down(CWndEvent const *) {}
+    virtual void on_event_wheel_rotated(CWndEvent const *) {}
+    virtual void on_event_click(CWndEvent const *) {}
+    virtual void on_event_double_click(CWndEvent const *) {}
+    virtual void on_event_drag_begin(CWndEvent const *) {}
+    virtual void on_event_drag(CWndEvent const *_p_event);
+    virtual void on_event_drag_end(CWndEvent const *) {}
+    virtual void on_event_set_text(CWndEvent const *) {}
+    virtual void on_event_set_str(CWndEvent const *) {}
+    virtual void on_event_key_down(CWndEvent const *) {}
+    virtual void on_event_key_up(CWndEvent const *) {}
+    virtual void on_event_char(CWndEvent const *) {}
+    virtual void on_event_resource_invalidate(CWndEvent const *_p_event);
+
+    // The position on the desktop, from the parent's.
+    void calc_global_pos();
+
+    // Identity and tree (m_children, below, is the tree's too)
     bool m_dbg_lock_hide;
     HUID m_id;
     CWindow *mp_parent;
     IWindowDesktop *mp_desktop;
+    // Flags
     bool m_is_hidden;
     bool m_is_disabled;
     bool m_is_passive;
@@ -197,6 +196,7 @@ protected:
     bool m_is_modal;
     bool m_can_drag;
     bool m_can_resize;
+    // Geometry
     EAlignment m_alignment;
     point_t m_pos;
     point_t m_global_pos;
