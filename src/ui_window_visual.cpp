@@ -63,12 +63,12 @@ void for_each_named(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
 // ---------------------------------------------------------------------------------------------
 
 CWindowVisual::CWindowVisual(IWindowDesktop *_p_desktop, char const *_name)
-    : CWindow(_p_desktop, _name), m_z_order(0), m_auto_hide(false), m_auto_hide_time(0), m_auto_hide_start(0),
-      m_top_margin(0), m_bottom_margin(0), m_left_margin(0), m_right_margin(0), m_fade_in(150),
-      m_fade_out(150), m_is_highlighted(false), m_is_pushed(false), m_is_checked(false), m_fade_start(0),
-      m_transparency(1.0f), m_canvas(this), m_visual_delta_left(0), m_visual_delta_top(0),
-      m_visual_delta_right(0),
-      m_visual_delta_bottom(0), m_movement_destination{0, 0, 0, 0}, m_movement_origin{0, 0, 0, 0},
+    : CWindow(_p_desktop, _name), m_is_highlighted(false), m_is_pushed(false), m_is_checked(false),
+      m_top_margin(0), m_bottom_margin(0), m_left_margin(0), m_right_margin(0), m_z_order(0),
+      m_visual_delta_left(0), m_visual_delta_top(0), m_visual_delta_right(0), m_visual_delta_bottom(0),
+      m_canvas(this), m_fade_in(150), m_fade_out(150), m_fade_start(0), m_transparency(1.0f),
+      m_auto_hide(false), m_auto_hide_time(0),
+      m_auto_hide_start(0), m_movement_destination{0, 0, 0, 0}, m_movement_origin{0, 0, 0, 0},
       m_movement_time(0), m_movement_start(k_no_movement), m_enable_events_sounds(true) {}
 
 CWindowVisual::~CWindowVisual() {
