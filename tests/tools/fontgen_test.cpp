@@ -1,7 +1,8 @@
 // The font generator, run as a program on a system font: its description file read back with the
 // interface's own tokenizer by the charset reader's rules, its texture read back as the host reads
-// textures, and its answers to bad input.
+// textures, its answers to bad input, and the default fonts of the data folder.
 #include "font_grid.h"
+#include "test_common.h"
 #include "tokenizer.h"
 
 #include <gtest/gtest.h>
@@ -17,25 +18,12 @@
 #pragma GCC diagnostic pop
 
 #include <cmath>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
 #include <map>
-#include <sstream>
-#include <string>
 #include <sys/wait.h>
-#include <unistd.h>
-#include <vector>
 
 namespace {
 
-namespace fs = std::filesystem;
-
 std::string const SANS = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-
-// ---------------------------------------------------------------------------------------------
-// Running the generator
-// ---------------------------------------------------------------------------------------------
 
 struct SRun {
     int m_exit_code = -1;
@@ -43,37 +31,20 @@ struct SRun {
     std::string m_err; // and on stderr
 };
 
-std::string read_whole(fs::path const &_path) {
-    std::ifstream file(_path, std::ios::binary);
-    std::stringstream text;
-    text << file.rdbuf();
-    return text.str();
-}
-
-fs::path make_temp_dir() {
-    std::string pattern = (fs::temp_directory_path() / "qorfontgen_XXXXXX").string();
-    char *p_dir = mkdtemp(pattern.data());
-    EXPECT_NE(p_dir, nullptr);
-    return p_dir ? fs::path(p_dir) : fs::temp_directory_path();
-}
-
-// Arguments are single-quoted for the shell; none of the tests' arguments holds a quote.
-SRun run_fontgen(fs::path const &_dir, std::vector<std::string> const &_args) {
+// The generator run with output in _dir; arguments are single-quoted for the shell (none of the
+// tests' arguments holds a quote).
+SRun run_fontgen(std::string const &_dir, std::vector<std::string> const &_args) {
     std::string command = QORFONTGEN;
     for (std::string const &arg : _args)
         command += " '" + arg + "'";
-    command += " >'" + (_dir / "stdout.txt").string() + "' 2>'" + (_dir / "stderr.txt").string() + "'";
+    command += " >'" + _dir + "/stdout.txt' 2>'" + _dir + "/stderr.txt'";
     int const status = std::system(command.c_str());
     SRun run;
     run.m_exit_code = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    run.m_out = read_whole(_dir / "stdout.txt");
-    run.m_err = read_whole(_dir / "stderr.txt");
+    run.m_out = qortest::read_file(_dir + "/stdout.txt");
+    run.m_err = qortest::read_file(_dir + "/stderr.txt");
     return run;
 }
-
-// ---------------------------------------------------------------------------------------------
-// Reading back
-// ---------------------------------------------------------------------------------------------
 
 struct SChar {
     float m_x, m_y, m_w;
@@ -140,7 +111,7 @@ struct STexture {
     }
 };
 
-STexture read_texture(fs::path const &_path) {
+STexture read_texture(std::string const &_path) {
     STexture texture;
     int channels = 0;
     unsigned char *p_data = stbi_load(_path.c_str(), &texture.m_w, &texture.m_h, &channels, 4);
@@ -175,262 +146,6 @@ SCellCoverage cell_coverage(STexture const &_texture, SCharset const &_charset, 
     return coverage;
 }
 
-bool is_power_of_two(int _value) {
-    return _value > 0 && (_value & (_value - 1)) == 0;
-}
-
-// ---------------------------------------------------------------------------------------------
-// A small font: space, A, B, I and Ë at 15 pixels
-// ---------------------------------------------------------------------------------------------
-
-class FontgenOutput : public testing::Test {
-protected:
-    static void SetUpTestSuite() {
-        s_dir = make_temp_dir();
-        s_run = run_fontgen(s_dir, {"--font", SANS, "--size", "15", "--chars", "0x401,73,32, 65-66", "--out",
-                                    (s_dir / "small").string()});
-        s_charset = read_charset(read_whole(s_dir / "small.fnt"));
-        s_texture = read_texture(s_dir / "small.tga");
-    }
-    static void TearDownTestSuite() { fs::remove_all(s_dir); }
-
-    static fs::path s_dir;
-    static SRun s_run;
-    static SCharset s_charset;
-    static STexture s_texture;
-};
-
-fs::path FontgenOutput::s_dir;
-SRun FontgenOutput::s_run;
-SCharset FontgenOutput::s_charset;
-STexture FontgenOutput::s_texture;
-
-TEST_F(FontgenOutput, RunSucceedsAndDescribesEveryCodeOnce) {
-    EXPECT_EQ(s_run.m_exit_code, 0) << s_run.m_err;
-    EXPECT_EQ(s_run.m_err, "");
-    // Five characters need a grid of 4 by 4.
-    EXPECT_EQ(s_charset.m_dimension, 4);
-    std::vector<unsigned short> codes;
-    for (auto const &entry : s_charset.m_chars)
-        codes.push_back(entry.first);
-    EXPECT_EQ(codes, (std::vector<unsigned short>{32, 65, 66, 73, 0x401}));
-}
-
-TEST_F(FontgenOutput, CharactersTakeTheLastCellsInCodeOrder) {
-    // 16 cells, 5 characters: the first 11 cells are spare, the characters fill cells 11 to 15.
-    int cell = 11;
-    for (auto const &entry : s_charset.m_chars) {
-        SCOPED_TRACE("code " + std::to_string(entry.first));
-        EXPECT_EQ(entry.second.m_x, (cell % 4) / 4.0f);
-        EXPECT_EQ(entry.second.m_y, (cell / 4) / 4.0f);
-        ++cell;
-    }
-}
-
-TEST_F(FontgenOutput, TextureIsSquarePowerOfTwoAndFontSizeIsItsSide) {
-    ASSERT_GT(s_texture.m_w, 0) << "the texture doesn't load";
-    EXPECT_EQ(s_texture.m_w, s_texture.m_h);
-    EXPECT_TRUE(is_power_of_two(s_texture.m_w)) << s_texture.m_w;
-    EXPECT_TRUE(is_power_of_two(s_texture.m_w / s_charset.m_dimension));
-    std::string const side = std::to_string(s_texture.m_w);
-    EXPECT_NE(s_run.m_out.find("charsets[\"small\"] = { file_type = \"nehe\", file_name = \"small.fnt\" }"),
-              std::string::npos)
-        << s_run.m_out;
-    EXPECT_NE(s_run.m_out.find("size = " + side + ","), std::string::npos) << s_run.m_out;
-    EXPECT_NE(s_run.m_out.find("diffuse_texture = \"small.tga\","), std::string::npos) << s_run.m_out;
-}
-
-TEST_F(FontgenOutput, WidthsAndHeightAreWholeTexelsThatFitTheCell) {
-    ASSERT_GT(s_texture.m_w, 0);
-    float const side = static_cast<float>(s_texture.m_w), cell = 1.0f / s_charset.m_dimension;
-    // At the texture's side as the font's size, the canvas's quads are whole pixels: no rounding.
-    EXPECT_EQ(s_charset.m_height * side, std::trunc(s_charset.m_height * side));
-    EXPECT_GE(s_charset.m_height * side, 15.0f);
-    EXPECT_LT(s_charset.m_height, cell);
-    for (auto const &entry : s_charset.m_chars) {
-        SCOPED_TRACE("code " + std::to_string(entry.first));
-        EXPECT_GT(entry.second.m_w, 0.0f);
-        EXPECT_LT(entry.second.m_w, cell);
-        EXPECT_EQ(entry.second.m_w * side, std::trunc(entry.second.m_w * side));
-    }
-    EXPECT_LT(s_charset.m_chars[73].m_w, s_charset.m_chars[65].m_w) << "I is narrower than A";
-}
-
-TEST_F(FontgenOutput, SpaceIsBlankAndLettersLieInsideTheirDrawnRectangle) {
-    ASSERT_GT(s_texture.m_w, 0);
-    SCellCoverage const space = cell_coverage(s_texture, s_charset, s_charset.m_chars[32]);
-    EXPECT_EQ(space.m_inside + space.m_outside, 0);
-    for (unsigned short code : {65, 66, 73, 0x401}) {
-        SCOPED_TRACE("code " + std::to_string(code));
-        SCellCoverage const letter = cell_coverage(s_texture, s_charset, s_charset.m_chars[code]);
-        EXPECT_GT(letter.m_inside, 10);
-        EXPECT_EQ(letter.m_outside, 0);
-        EXPECT_TRUE(letter.m_all_white);
-    }
-}
-
-TEST_F(FontgenOutput, SpareCellsAreBlank) {
-    ASSERT_GT(s_texture.m_w, 0);
-    int const cell = s_texture.m_w / 4;
-    int covered = 0;
-    for (int y = 0; y < s_texture.m_h; ++y)
-        for (int x = 0; x < s_texture.m_w; ++x)
-            if ((y / cell) * 4 + x / cell < 11 && s_texture.texel(x, y)[3] != 0) ++covered;
-    EXPECT_EQ(covered, 0);
-}
-
-// ---------------------------------------------------------------------------------------------
-// Codes and bad input
-// ---------------------------------------------------------------------------------------------
-
-TEST(FontgenCodeList, RangesAndCodesAreSortedWithoutRepeats) {
-    EXPECT_EQ(qorfontgen::parse_code_list("0x401,32-34, 33,0X3f"),
-              (std::vector<unsigned short>{32, 33, 34, 63, 0x401}));
-    EXPECT_EQ(qorfontgen::parse_code_list("65535"), (std::vector<unsigned short>{65535}));
-}
-
-TEST(FontgenCodeList, BadListsAreRefusedWithTheirItem) {
-    struct SCase {
-        char const *m_list;
-        char const *m_message;
-    } const CASES[] = {
-        {"200-100", "bad range '200-100': its first code is above its last"},
-        {"65536", "character code '65536' is above 65535 (0xFFFF)"},
-        {"32-x", "bad character code 'x' in '32-x'"},
-        {"-5", "bad character code '' in '-5'"},
-        {"32,,33", "empty item in the character list '32,,33'"},
-        {"", "empty item in the character list ''"},
-    };
-    for (SCase const &test_case : CASES) {
-        SCOPED_TRACE(test_case.m_list);
-        try {
-            qorfontgen::parse_code_list(test_case.m_list);
-            ADD_FAILURE() << "accepted";
-        } catch (qorfontgen::CFontgenError const &error) {
-            EXPECT_STREQ(error.what(), test_case.m_message);
-        }
-    }
-}
-
-qorfontgen::SGlyph glyph_box(int _left, int _top, int _width, int _rows, int _advance) {
-    qorfontgen::SGlyph glyph;
-    glyph.m_left = _left, glyph.m_top = _top, glyph.m_width = _width, glyph.m_rows = _rows;
-    glyph.m_advance = _advance;
-    return glyph;
-}
-
-TEST(FontgenGrid, DrawnWidthsCoverGlyphsAndFixedWidthTakesTheWidest) {
-    // A glyph left of the pen moves right into the cell: -1 + 11 columns need 11.
-    std::vector<qorfontgen::SGlyph> glyphs = {glyph_box(-1, 10, 11, 10, 9), glyph_box(1, 5, 3, 5, 6),
-                                              glyph_box(0, 10, 9, 10, 8)};
-    qorfontgen::fit_drawn_widths(glyphs, false);
-    EXPECT_EQ(glyphs[0].m_drawn_width, 11);
-    EXPECT_EQ(glyphs[1].m_drawn_width, 6);
-    EXPECT_EQ(glyphs[2].m_drawn_width, 9);
-    qorfontgen::fit_drawn_widths(glyphs, true);
-    for (qorfontgen::SGlyph const &glyph : glyphs)
-        EXPECT_EQ(glyph.m_drawn_width, 11);
-}
-
-TEST(FontgenGrid, CellHoldsTheTallestLineAndWidestGlyphWithASparePixel) {
-    std::vector<qorfontgen::SGlyph> glyphs(5, glyph_box(0, 15, 4, 18, 5)); // 3 rows below the baseline
-    glyphs[0].m_drawn_width = 15;
-    // Above: max(ascender 14, top 15) = 15; below: max(descender 4, 18 - 15) = 4; line 19, and
-    // one spare pixel makes 20: cells of 32. Five glyphs need a 4 by 4 grid: 128 pixels.
-    qorfontgen::SGrid const grid = qorfontgen::plan_grid(glyphs, 14, -4);
-    EXPECT_EQ(grid.m_baseline, 15);
-    EXPECT_EQ(grid.m_line_height, 19);
-    EXPECT_EQ(grid.m_dimension, 4);
-    EXPECT_EQ(grid.m_cell, 32);
-    EXPECT_EQ(grid.m_texture, 128);
-    // A line of 16 takes cells of 32 for its spare pixel; a line of 15 fits cells of 16.
-    EXPECT_EQ(qorfontgen::plan_grid({glyph_box(0, 12, 4, 16, 5)}, 12, -4).m_cell, 32);
-    EXPECT_EQ(qorfontgen::plan_grid({glyph_box(0, 12, 4, 15, 5)}, 12, -3).m_cell, 16);
-}
-
-TEST(FontgenGrid, TextureAboveTheLimitIsRefused) {
-    // 65536 glyphs need 256 cells per side; cells of 32 make 8192 pixels.
-    std::vector<qorfontgen::SGlyph> glyphs(65536, glyph_box(0, 15, 4, 18, 5));
-    try {
-        qorfontgen::plan_grid(glyphs, 15, -3);
-        ADD_FAILURE() << "accepted";
-    } catch (qorfontgen::CFontgenError const &error) {
-        EXPECT_STREQ(error.what(),
-                     "the texture would be 8192 pixels wide, more than 4096: ask for fewer characters or a "
-                     "smaller size");
-    }
-}
-
-class FontgenCommandLine : public testing::Test {
-protected:
-    void SetUp() override { m_dir = make_temp_dir(); }
-    void TearDown() override { fs::remove_all(m_dir); }
-
-    SRun run(std::string const &_font, std::string const &_size, std::string const &_chars) {
-        return run_fontgen(
-            m_dir, {"--font", _font, "--size", _size, "--chars", _chars, "--out", (m_dir / "bad").string()});
-    }
-    bool wrote_files() const { return fs::exists(m_dir / "bad.fnt") || fs::exists(m_dir / "bad.tga"); }
-
-    fs::path m_dir;
-};
-
-TEST_F(FontgenCommandLine, MissingFontFileEndsWithCodeOneAndWritesNothing) {
-    std::string const missing = (m_dir / "missing.ttf").string();
-    SRun const result = run(missing, "15", "32-126");
-    EXPECT_EQ(result.m_exit_code, 1);
-    EXPECT_EQ(result.m_err, "qorfontgen: cannot open the font file '" + missing + "'\n");
-    EXPECT_FALSE(wrote_files());
-}
-
-TEST_F(FontgenCommandLine, FileThatIsNoFontEndsWithCodeOne) {
-    std::string const text = (m_dir / "text.ttf").string();
-    std::ofstream(text) << "no font\n";
-    SRun const result = run(text, "15", "32-126");
-    EXPECT_EQ(result.m_exit_code, 1);
-    EXPECT_EQ(result.m_err, "qorfontgen: '" + text + "' is no font that FreeType can read\n");
-    EXPECT_FALSE(wrote_files());
-}
-
-TEST_F(FontgenCommandLine, BadRangeEndsWithCodeOneAndWritesNothing) {
-    SRun const result = run(SANS, "15", "126-32");
-    EXPECT_EQ(result.m_exit_code, 1);
-    EXPECT_EQ(result.m_err, "qorfontgen: bad range '126-32': its first code is above its last\n");
-    EXPECT_FALSE(wrote_files());
-}
-
-TEST_F(FontgenCommandLine, BadSizeAndMissingOptionsEndWithCodeOne) {
-    EXPECT_EQ(run(SANS, "0", "32").m_err, "qorfontgen: bad size '0': give 4 to 256 pixels\n");
-    EXPECT_EQ(run(SANS, "15px", "32").m_exit_code, 1);
-    SRun const no_out = run_fontgen(m_dir, {"--font", SANS, "--size", "15", "--chars", "32"});
-    EXPECT_EQ(no_out.m_exit_code, 1);
-    EXPECT_EQ(no_out.m_err, "qorfontgen: option '--out' is missing\n");
-    SRun const no_arguments = run_fontgen(m_dir, {});
-    EXPECT_EQ(no_arguments.m_exit_code, 1);
-    EXPECT_EQ(no_arguments.m_err.rfind("usage: qorfontgen", 0), 0u) << no_arguments.m_err;
-    EXPECT_FALSE(wrote_files());
-}
-
-TEST_F(FontgenCommandLine, CodesWithoutGlyphAreLeftOutWithAWarning) {
-    // U+FFFF is no character: no font has a glyph for it.
-    SRun const some = run(SANS, "15", "65,0xFFFF");
-    EXPECT_EQ(some.m_exit_code, 0);
-    EXPECT_EQ(some.m_err, "qorfontgen: warning: '" + SANS + "' has no glyph for 0xFFFF; left out\n");
-    EXPECT_EQ(read_charset(read_whole(m_dir / "bad.fnt")).m_chars.size(), 1u);
-
-    fs::remove(m_dir / "bad.fnt");
-    fs::remove(m_dir / "bad.tga");
-    SRun const none = run(SANS, "15", "0xFFFF");
-    EXPECT_EQ(none.m_exit_code, 1);
-    EXPECT_NE(none.m_err.find("qorfontgen: '" + SANS + "' has none of the characters asked for"),
-              std::string::npos);
-    EXPECT_FALSE(wrote_files());
-}
-
-// ---------------------------------------------------------------------------------------------
-// The data folder's default fonts
-// ---------------------------------------------------------------------------------------------
-
 // fonts.lua run as the fonts factory runs it: after "charsets={}" and "fonts={}".
 struct SFontEntry {
     std::string m_file_type, m_file_name, m_charset_name, m_template, m_texture;
@@ -444,7 +159,7 @@ std::string string_field(lua_State *_p_lua, int _table, char const *_p_key) {
     return value;
 }
 
-SFontEntry read_font_entry(fs::path const &_fonts_lua, char const *_p_name) {
+SFontEntry read_font_entry(std::string const &_fonts_lua, char const *_p_name) {
     SFontEntry entry;
     lua_State *p_lua = luaL_newstate();
     if (luaL_dostring(p_lua, "charsets={} fonts={}") != 0 || luaL_dofile(p_lua, _fonts_lua.c_str()) != 0) {
@@ -474,33 +189,187 @@ SFontEntry read_font_entry(fs::path const &_fonts_lua, char const *_p_name) {
     return entry;
 }
 
-TEST(FontgenDefaultFonts, BothFontsLoadWithAsciiAndCyrillicAtOneTexelPerPixel) {
-    fs::path const data = fs::path(QOR_SOURCE_DIR) / "data";
-    for (char const *p_name : {"arial_white", "courier"}) {
-        SCOPED_TRACE(p_name);
-        SFontEntry const entry = read_font_entry(data / "ui" / "fonts.lua", p_name);
-        EXPECT_EQ(entry.m_charset_name, p_name);
-        EXPECT_EQ(entry.m_file_type, "nehe");
-        EXPECT_EQ(entry.m_template, "ui_image");
-        SCharset const charset = read_charset(read_whole(data / "fonts" / entry.m_file_name));
-        STexture const texture = read_texture(data / "textures" / entry.m_texture);
-        // 95 of ASCII, 64 of the alphabet, Ë and ë.
-        EXPECT_EQ(charset.m_chars.size(), 161u);
-        EXPECT_EQ(charset.m_chars.count(0x401) + charset.m_chars.count(0x451), 2u);
-        EXPECT_EQ(charset.m_chars.begin()->first, 32) << "a missing character is drawn as a space";
-        EXPECT_EQ(texture.m_w, static_cast<int>(entry.m_size));
-        // A line of 16 to 24 pixels on the screen.
-        EXPECT_GE(static_cast<int>(charset.m_height * entry.m_size), 16);
-        EXPECT_LE(static_cast<int>(charset.m_height * entry.m_size), 24);
+} // namespace
+
+// Space, A, B, I and Ë at 15 pixels: five characters in a grid of 4 by 4, in the last cells in code
+// order, on a square texture whose side is the font's size; whole texels, letters inside their
+// drawn rectangle, white, and the space and the spare cells blank.
+TEST(Fontgen, ASmallFontIsLaidOutInItsGridAndDescribedForTheFactory) {
+    std::string const dir = qortest::make_temp_dir();
+    SRun const run = run_fontgen(
+        dir, {"--font", SANS, "--size", "15", "--chars", "0x401,73,32, 65-66", "--out", dir + "/small"});
+    ASSERT_EQ(0, run.m_exit_code) << run.m_err;
+    EXPECT_EQ("", run.m_err);
+    SCharset charset = read_charset(qortest::read_file(dir + "/small.fnt"));
+    STexture const texture = read_texture(dir + "/small.tga");
+    ASSERT_EQ(4, charset.m_dimension);
+    ASSERT_GT(texture.m_w, 0) << "the texture doesn't load";
+    EXPECT_EQ(texture.m_w, texture.m_h);
+    EXPECT_EQ(0, texture.m_w & (texture.m_w - 1)) << texture.m_w; // a power of two
+    EXPECT_NE(std::string::npos,
+              run.m_out.find("charsets[\"small\"] = { file_type = \"nehe\", file_name = \"small.fnt\" }"))
+        << run.m_out;
+    EXPECT_NE(std::string::npos, run.m_out.find("size = " + std::to_string(texture.m_w) + ","));
+    EXPECT_NE(std::string::npos, run.m_out.find("diffuse_texture = \"small.tga\","));
+
+    float const side = static_cast<float>(texture.m_w), cell = 0.25f;
+    EXPECT_EQ(charset.m_height * side, std::trunc(charset.m_height * side)); // no rounding on the screen
+    EXPECT_GE(charset.m_height * side, 15.0f);
+    EXPECT_LT(charset.m_height, cell);
+    int index = 11; // 16 cells, 5 characters: the first 11 cells are spare
+    for (unsigned short code : {32, 65, 66, 73, 0x401}) {
+        SCOPED_TRACE("code " + std::to_string(code));
+        ASSERT_EQ(1u, charset.m_chars.count(code));
+        SChar const &c = charset.m_chars[code];
+        EXPECT_EQ((index % 4) * cell, c.m_x);
+        EXPECT_EQ((index / 4) * cell, c.m_y);
+        ++index;
+        EXPECT_GT(c.m_w, 0.0f);
+        EXPECT_LT(c.m_w, cell);
+        EXPECT_EQ(c.m_w * side, std::trunc(c.m_w * side));
+        SCellCoverage const coverage = cell_coverage(texture, charset, c);
+        EXPECT_EQ(0, coverage.m_outside);
+        EXPECT_TRUE(coverage.m_all_white);
+        if (code == 32)
+            EXPECT_EQ(0, coverage.m_inside);
+        else
+            EXPECT_GT(coverage.m_inside, 10);
+    }
+    EXPECT_EQ(5u, charset.m_chars.size());
+    EXPECT_LT(charset.m_chars[73].m_w, charset.m_chars[65].m_w) << "I is narrower than A";
+    int const cell_px = texture.m_w / 4;
+    int covered = 0;
+    for (int y = 0; y < texture.m_h; ++y)
+        for (int x = 0; x < texture.m_w; ++x)
+            if ((y / cell_px) * 4 + x / cell_px < 11 && texture.texel(x, y)[3] != 0) ++covered;
+    EXPECT_EQ(0, covered);
+}
+
+TEST(Fontgen, CodeListsAreSortedWithoutRepeatsAndBadOnesAreRefusedWithTheirItem) {
+    EXPECT_EQ((std::vector<unsigned short>{32, 33, 34, 63, 0x401}),
+              qorfontgen::parse_code_list("0x401,32-34, 33,0X3f"));
+    EXPECT_EQ((std::vector<unsigned short>{65535}), qorfontgen::parse_code_list("65535"));
+    struct {
+        char const *mp_list;
+        char const *mp_message;
+    } const rows[] = {
+        {"200-100", "bad range '200-100': its first code is above its last"},
+        {"65536", "character code '65536' is above 65535 (0xFFFF)"},
+        {"32-x", "bad character code 'x' in '32-x'"},
+        {"-5", "bad character code '' in '-5'"},
+        {"32,,33", "empty item in the character list '32,,33'"},
+        {"", "empty item in the character list ''"},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.mp_list);
+        try {
+            qorfontgen::parse_code_list(row.mp_list);
+            ADD_FAILURE() << "accepted";
+        } catch (qorfontgen::CFontgenError const &error) {
+            EXPECT_STREQ(row.mp_message, error.what());
+        }
     }
 }
 
-TEST(FontgenDefaultFonts, CourierHasOneWidthForAllCharacters) {
-    fs::path const data = fs::path(QOR_SOURCE_DIR) / "data";
-    SCharset const charset = read_charset(read_whole(data / "fonts" / "courier.fnt"));
-    ASSERT_FALSE(charset.m_chars.empty());
-    for (auto const &entry : charset.m_chars)
-        EXPECT_EQ(entry.second.m_w, charset.m_chars.begin()->second.m_w);
+namespace {
+
+qorfontgen::SGlyph glyph_box(int _left, int _top, int _width, int _rows, int _advance) {
+    qorfontgen::SGlyph glyph;
+    glyph.m_left = _left, glyph.m_top = _top, glyph.m_width = _width, glyph.m_rows = _rows;
+    glyph.m_advance = _advance;
+    return glyph;
 }
 
 } // namespace
+
+TEST(Fontgen, TheGridHoldsTheWidestGlyphAndTheTallestLineWithASparePixel) {
+    // A glyph left of the pen moves right into the cell: -1 + 11 columns need 11.
+    std::vector<qorfontgen::SGlyph> glyphs = {glyph_box(-1, 10, 11, 10, 9), glyph_box(1, 5, 3, 5, 6),
+                                              glyph_box(0, 10, 9, 10, 8)};
+    qorfontgen::fit_drawn_widths(glyphs, false);
+    EXPECT_EQ(11, glyphs[0].m_drawn_width);
+    EXPECT_EQ(6, glyphs[1].m_drawn_width);
+    qorfontgen::fit_drawn_widths(glyphs, true); // fixed width: the widest
+    EXPECT_EQ(11, glyphs[2].m_drawn_width);
+
+    std::vector<qorfontgen::SGlyph> five(5, glyph_box(0, 15, 4, 18, 5)); // 3 rows below the baseline
+    five[0].m_drawn_width = 15;
+    // Above: max(ascender 14, top 15) = 15; below: max(descender 4, 18 - 15) = 4; line 19, and
+    // one spare pixel makes 20: cells of 32. Five glyphs need a 4 by 4 grid: 128 pixels.
+    qorfontgen::SGrid const grid = qorfontgen::plan_grid(five, 14, -4);
+    EXPECT_EQ(15, grid.m_baseline);
+    EXPECT_EQ(19, grid.m_line_height);
+    EXPECT_EQ(4, grid.m_dimension);
+    EXPECT_EQ(32, grid.m_cell);
+    EXPECT_EQ(128, grid.m_texture);
+    // A line of 16 takes cells of 32 for its spare pixel; a line of 15 fits cells of 16.
+    EXPECT_EQ(32, qorfontgen::plan_grid({glyph_box(0, 12, 4, 16, 5)}, 12, -4).m_cell);
+    EXPECT_EQ(16, qorfontgen::plan_grid({glyph_box(0, 12, 4, 15, 5)}, 12, -3).m_cell);
+    try { // 65536 glyphs need 256 cells per side; cells of 32 make 8192 pixels
+        qorfontgen::plan_grid(std::vector<qorfontgen::SGlyph>(65536, glyph_box(0, 15, 4, 18, 5)), 15, -3);
+        ADD_FAILURE() << "accepted";
+    } catch (qorfontgen::CFontgenError const &error) {
+        EXPECT_STREQ("the texture would be 8192 pixels wide, more than 4096: ask for fewer characters or a "
+                     "smaller size",
+                     error.what());
+    }
+}
+
+// Bad input ends with code 1, a message and no file; codes without a glyph are left out with a
+// warning unless none is left.
+TEST(Fontgen, BadInputEndsWithCodeOneAndWritesNothing) {
+    std::string const dir = qortest::make_temp_dir(), out = dir + "/bad";
+    std::string const missing = dir + "/missing.ttf",
+                      text = qortest::write_file(dir + "/text.ttf", "no font\n");
+    auto run = [&](std::string const &_font, std::string const &_size, std::string const &_chars) {
+        return run_fontgen(dir, {"--font", _font, "--size", _size, "--chars", _chars, "--out", out});
+    };
+    struct {
+        SRun m_run;
+        std::string m_err;
+    } const rows[] = {
+        {run(missing, "15", "32-126"), "qorfontgen: cannot open the font file '" + missing + "'\n"},
+        {run(text, "15", "32-126"), "qorfontgen: '" + text + "' is no font that FreeType can read\n"},
+        {run(SANS, "15", "126-32"), "qorfontgen: bad range '126-32': its first code is above its last\n"},
+        {run(SANS, "0", "32"), "qorfontgen: bad size '0': give 4 to 256 pixels\n"},
+        {run_fontgen(dir, {"--font", SANS, "--size", "15", "--chars", "32"}),
+         "qorfontgen: option '--out' is missing\n"},
+        {run(SANS, "15", "0xFFFF"), "qorfontgen: warning: '" + SANS +
+                                        "' has no glyph for 0xFFFF; left out\nqorfontgen: '" + SANS +
+                                        "' has none of the characters asked for\n"},
+    };
+    for (auto const &row : rows) {
+        EXPECT_EQ(1, row.m_run.m_exit_code) << row.m_err;
+        EXPECT_EQ(row.m_err, row.m_run.m_err);
+    }
+    EXPECT_EQ(0u, run_fontgen(dir, {}).m_err.rfind("usage: qorfontgen", 0));
+    EXPECT_EQ("", qortest::read_file(out + ".fnt") + qortest::read_file(out + ".tga"));
+
+    SRun const some = run(SANS, "15", "65,0xFFFF"); // U+FFFF is no character: no font has it
+    EXPECT_EQ(0, some.m_exit_code);
+    EXPECT_EQ("qorfontgen: warning: '" + SANS + "' has no glyph for 0xFFFF; left out\n", some.m_err);
+    EXPECT_EQ(1u, read_charset(qortest::read_file(out + ".fnt")).m_chars.size());
+}
+
+// 95 of ASCII, 64 of the alphabet, Ë and ë, at one texel a pixel; courier of one width.
+TEST(Fontgen, TheDefaultFontsHaveAsciiAndCyrillicAtOneTexelPerPixel) {
+    std::string const data = std::string(QOR_SOURCE_DIR) + "/data";
+    for (char const *p_name : {"arial_white", "courier"}) {
+        SCOPED_TRACE(p_name);
+        SFontEntry const entry = read_font_entry(data + "/ui/fonts.lua", p_name);
+        EXPECT_EQ(p_name, entry.m_charset_name);
+        EXPECT_EQ("nehe", entry.m_file_type);
+        EXPECT_EQ("ui_image", entry.m_template);
+        SCharset const charset = read_charset(qortest::read_file(data + "/fonts/" + entry.m_file_name));
+        EXPECT_EQ(161u, charset.m_chars.size());
+        EXPECT_EQ(2u, charset.m_chars.count(0x401) + charset.m_chars.count(0x451));
+        EXPECT_EQ(32, charset.m_chars.begin()->first) << "a missing character is drawn as a space";
+        EXPECT_EQ(static_cast<int>(entry.m_size), read_texture(data + "/textures/" + entry.m_texture).m_w);
+        EXPECT_GE(static_cast<int>(charset.m_height * entry.m_size), 16); // a line of 16 to 24 pixels
+        EXPECT_LE(static_cast<int>(charset.m_height * entry.m_size), 24);
+        if (entry.m_charset_name == "courier") {
+            for (auto const &c : charset.m_chars)
+                EXPECT_EQ(charset.m_chars.begin()->second.m_w, c.second.m_w) << c.first;
+        }
+    }
+}
