@@ -19,13 +19,17 @@ struct SFixedPool {
     void *mp_free;             // head of the free list; a free element's first word links on
     void *mp_blocks;           // head of the block list; a block's first word links on
 };
+// The record's layout is shared with every client module: five words, then two pointers.
+static_assert(offsetof(SFixedPool, m_block_elements) == 16 && offsetof(SFixedPool, mp_free) == 24 &&
+                  offsetof(SFixedPool, mp_blocks) == 32,
+              "the fixed pool record keeps its field order");
 
 // What MMGetMemoryStatus and MMGetStatsForModules report: one record per heap.
 struct SMMHeapStats {
-    int m_heap;                  // heap id
-    uint64_t m_allocations;      // MMAllocate calls that returned memory
-    uint64_t m_deallocations;    // MMDeallocate calls on blocks of this heap
-    uint64_t m_live_bytes;       // requested bytes of blocks not yet freed
+    int m_heap;                   // heap id
+    uint64_t m_allocations;       // MMAllocate calls that returned memory
+    uint64_t m_deallocations;     // MMDeallocate calls on blocks of this heap
+    uint64_t m_live_bytes;        // requested bytes of blocks not yet freed
     uint64_t m_small_allocations; // MMSmallAlloc calls (process-wide, same in every record)
 };
 

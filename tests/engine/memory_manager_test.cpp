@@ -428,16 +428,6 @@ TEST(MemoryManagerChecks, DumpWritesALinePerHeap) {
 // Fixed pools
 // ---------------------------------------------------------------------------------------------
 
-TEST(MemoryManagerFixedPools, RecordFieldsLieInTheirContractOrder) {
-    EXPECT_EQ(0u, offsetof(SFixedPool, m_blocks));
-    EXPECT_EQ(4u, offsetof(SFixedPool, m_used));
-    EXPECT_EQ(8u, offsetof(SFixedPool, m_total_bytes));
-    EXPECT_EQ(12u, offsetof(SFixedPool, m_element_size));
-    EXPECT_EQ(16u, offsetof(SFixedPool, m_block_elements));
-    EXPECT_EQ(24u, offsetof(SFixedPool, mp_free));
-    EXPECT_EQ(32u, offsetof(SFixedPool, mp_blocks));
-}
-
 TEST(MemoryManagerFixedPools, NewRecordIsEmptyWithAtLeastAPointerPerElement) {
     SFixedPool *p_pool = MMGetFixedPool(3, 50);
     ASSERT_NE(nullptr, p_pool);
