@@ -32,10 +32,8 @@ void copy_file(std::string const &_from, std::string const &_to) {
     while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0)
         text.append(buffer, count);
     fclose(in);
-    FILE *out = fopen(_to.c_str(), "wb");
-    if (!out) return;
-    fwrite(text.data(), 1, text.size(), out);
-    fclose(out);
+    if (!qorbase::write_file_atomically(_to, text.data(), text.size()))
+        qordebug::warning("Cannot write the configuration copy '%s'", _to.c_str());
 }
 } // namespace
 

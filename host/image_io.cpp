@@ -1,6 +1,7 @@
 // Pictures of the host: TGA and PNG files loaded to RGBA (truncated files refused), PNG written,
 // and two pictures compared with a picture of their differences.
 #include "image_io.h"
+#include "qorbase.h"
 
 #define STB_IMAGE_IMPLEMENTATION
 #define STBI_ONLY_PNG
@@ -71,8 +72,14 @@ bool load_image(std::string const &_path, SImage &_image) {
 
 bool write_png(std::string const &_path, SImage const &_image) {
     if (_image.m_w <= 0 || _image.m_h <= 0) return false;
-    return stbi_write_png(_path.c_str(), _image.m_w, _image.m_h, 4, _image.m_pixels.data(), _image.m_w * 4) !=
-           0;
+    int size = 0;
+    unsigned char *p_png =
+        stbi_write_png_to_mem(_image.m_pixels.data(), _image.m_w * 4, _image.m_w, _image.m_h, 4, &size);
+    if (!p_png) return false;
+    // A reader of the folder sees the old frame or the new one, never half of one.
+    bool const written = qorbase::write_file_atomically(_path, p_png, static_cast<size_t>(size));
+    STBIW_FREE(p_png);
+    return written;
 }
 
 long compare_images(SImage const &_actual, SImage const &_expected, int _tolerance,

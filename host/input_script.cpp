@@ -6,6 +6,7 @@
 #include "image_io.h"
 #include "qordebug.h"
 
+#include <cmath>
 #include <cstdlib>
 #include <fstream>
 #include <map>
@@ -15,17 +16,39 @@ namespace qorhost {
 
 namespace {
 
-// How many numbers each verb takes: at least, at most.
+// How many numbers each verb takes, at least and at most, and the range of each; whole numbers
+// only where the step counts or names something. A value outside makes the line bad, so that a
+// script can neither run for ever nor hand the input system what it can't take.
 struct SArity {
     unsigned m_min, m_max;
+    double m_lowest, m_highest;
+    bool m_whole;
 };
+
+double const k_far = 1e6;             // pointer moves and wheel turns
+double const k_most_frames = 100000;  // about half an hour of frames
+double const k_most_ms = 86400000;    // a day of the clock
+double const k_highest_code = 0xFFFF; // keys and characters are 16-bit codes
+double const k_highest_button = 15;
 
 std::map<std::string, SArity> const &verbs() {
     static std::map<std::string, SArity> const s_verbs = {
-        {"move", {2, 2}},     {"press", {0, 1}},  {"release", {0, 1}}, {"wheel", {1, 1}},
-        {"key_down", {1, 2}}, {"key_up", {1, 1}}, {"char", {1, 1}},    {"wait", {1, 1}},
+        {"move", {2, 2, -k_far, k_far, false}},         {"press", {0, 1, 0, k_highest_button, true}},
+        {"release", {0, 1, 0, k_highest_button, true}}, {"wheel", {1, 1, -k_far, k_far, false}},
+        {"key_down", {1, 2, 0, k_highest_code, true}},  {"key_up", {1, 1, 0, k_highest_code, true}},
+        {"char", {1, 1, 0, k_highest_code, true}},      {"wait", {1, 1, 0, k_most_frames, true}},
     };
     return s_verbs;
+}
+
+// A file name that stays inside the output folder: relative, with no ".." among its parts.
+bool stays_inside(std::string const &_file) {
+    if (_file.empty() || _file[0] == '/') return false;
+    std::istringstream parts(_file);
+    std::string part;
+    while (std::getline(parts, part, '/'))
+        if (part == "..") return false;
+    return true;
 }
 
 bool to_number(std::string const &_token, float &_value) {
@@ -83,6 +106,8 @@ bool CInputScript::parse_line(std::string const &_line, SStep &_step, std::strin
         _step.m_text = rest_of(in);
         if (_step.m_text.empty())
             _error = "'" + _step.m_verb + "' needs " + (_step.m_verb == "command" ? "a line" : "a file");
+        else if (_step.m_verb == "screenshot" && !stays_inside(_step.m_text))
+            _error = "'" + _step.m_text + "' lies outside the output folder";
         return _error.empty();
     }
     auto const found = verbs().find(_step.m_verb);
@@ -101,6 +126,12 @@ bool CInputScript::parse_line(std::string const &_line, SStep &_step, std::strin
             _error = "'" + token + "' is no number";
             return false;
         }
+        SArity const &arity = found->second;
+        double const highest = _step.m_milliseconds ? k_most_ms : arity.m_highest;
+        if (!(value >= arity.m_lowest && value <= highest) || (arity.m_whole && value != std::floor(value))) {
+            _error = "'" + token + "' is out of range for '" + _step.m_verb + "'";
+            return false;
+        }
         _step.m_numbers.push_back(value);
     }
     SArity const arity = found->second;
@@ -110,6 +141,13 @@ bool CInputScript::parse_line(std::string const &_line, SStep &_step, std::strin
         return false;
     }
     return true;
+}
+
+unsigned long CInputScript::get_frames_count() const {
+    unsigned long frames = 0;
+    for (SStep const &step : m_steps)
+        if (step.m_verb == "wait" && !step.m_milliseconds) frames += static_cast<unsigned long>(step.m_numbers[0]);
+    return frames;
 }
 
 void CInputScript::play(CHost &_host) const {

@@ -30,6 +30,8 @@ public:
     // Runs every step on the host, whose interface is initialised.
     void play(CHost &_host) const;
     size_t get_steps_count() const { return m_steps.size(); }
+    // The frames that the waits of the script run.
+    unsigned long get_frames_count() const;
 
 private:
     struct SStep {

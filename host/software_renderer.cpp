@@ -107,10 +107,10 @@ void CSoftwareRenderer::set_clip_rect(vec2_t const &_position, vec2_t const &_si
     float const w = static_cast<float>(m_frame.m_w);
     float const h = static_cast<float>(m_frame.m_h);
     SClipRect clip;
-    clip.m_x0 = static_cast<int>(std::lround((_position.x + 1.0f) * 0.5f * w));
-    clip.m_x1 = static_cast<int>(std::lround((_position.x + _size.x + 1.0f) * 0.5f * w));
-    clip.m_y0 = static_cast<int>(std::lround((1.0f - (_position.y + _size.y)) * 0.5f * h));
-    clip.m_y1 = static_cast<int>(std::lround((1.0f - _position.y) * 0.5f * h));
+    clip.m_x0 = trunc_to_int(std::round((_position.x + 1.0f) * 0.5f * w));
+    clip.m_x1 = trunc_to_int(std::round((_position.x + _size.x + 1.0f) * 0.5f * w));
+    clip.m_y0 = trunc_to_int(std::round((1.0f - (_position.y + _size.y)) * 0.5f * h));
+    clip.m_y1 = trunc_to_int(std::round((1.0f - _position.y) * 0.5f * h));
     clip.m_x0 = std::clamp(clip.m_x0, 0, m_frame.m_w);
     clip.m_x1 = std::clamp(clip.m_x1, clip.m_x0, m_frame.m_w);
     clip.m_y0 = std::clamp(clip.m_y0, 0, m_frame.m_h);
@@ -190,10 +190,10 @@ void CSoftwareRenderer::draw_triangle(SVertex const &_a, SVertex const &_b, SVer
         std::swap(p1, p2);
         area = -area;
     }
-    int const x0 = std::max(m_clip.m_x0, static_cast<int>(std::floor(std::min({p0->m_x, p1->m_x, p2->m_x}))));
-    int const x1 = std::min(m_clip.m_x1, static_cast<int>(std::ceil(std::max({p0->m_x, p1->m_x, p2->m_x}))));
-    int const y0 = std::max(m_clip.m_y0, static_cast<int>(std::floor(std::min({p0->m_y, p1->m_y, p2->m_y}))));
-    int const y1 = std::min(m_clip.m_y1, static_cast<int>(std::ceil(std::max({p0->m_y, p1->m_y, p2->m_y}))));
+    int const x0 = std::max(m_clip.m_x0, trunc_to_int(std::floor(std::min({p0->m_x, p1->m_x, p2->m_x}))));
+    int const x1 = std::min(m_clip.m_x1, trunc_to_int(std::ceil(std::max({p0->m_x, p1->m_x, p2->m_x}))));
+    int const y0 = std::max(m_clip.m_y0, trunc_to_int(std::floor(std::min({p0->m_y, p1->m_y, p2->m_y}))));
+    int const y1 = std::min(m_clip.m_y1, trunc_to_int(std::ceil(std::max({p0->m_y, p1->m_y, p2->m_y}))));
     bool const top_left0 = is_top_left(p1->m_x, p1->m_y, p2->m_x, p2->m_y);
     bool const top_left1 = is_top_left(p2->m_x, p2->m_y, p0->m_x, p0->m_y);
     bool const top_left2 = is_top_left(p0->m_x, p0->m_y, p1->m_x, p1->m_y);
@@ -225,8 +225,8 @@ void CSoftwareRenderer::blend(int _x, int _y, float const *_rgba, SMaterial cons
     float source[4] = {_rgba[0], _rgba[1], _rgba[2], _rgba[3]};
     if (_p_material && _p_material->m_textured && _p_material->mp_texture) {
         SImage const &texture = *_p_material->mp_texture;
-        int const tx = std::clamp(static_cast<int>(std::floor(_u * texture.m_w)), 0, texture.m_w - 1);
-        int const ty = std::clamp(static_cast<int>(std::floor(_v * texture.m_h)), 0, texture.m_h - 1);
+        int const tx = std::clamp(trunc_to_int(std::floor(_u * texture.m_w)), 0, texture.m_w - 1);
+        int const ty = std::clamp(trunc_to_int(std::floor(_v * texture.m_h)), 0, texture.m_h - 1);
         uint8_t const *texel = texture.pixel(tx, ty);
         for (int i = 0; i < 4; ++i)
             source[i] = source[i] * texel[i] / 255.0f;
@@ -247,12 +247,29 @@ void CSoftwareRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, ve
     SVertex const b = to_vertex(_to, vec2_t{0, 0}, _c_to);
     float const ax = std::floor(a.m_x), ay = std::floor(a.m_y);
     float const bx = std::floor(b.m_x), by = std::floor(b.m_y);
-    int const steps = static_cast<int>(std::max(std::fabs(bx - ax), std::fabs(by - ay)));
+    double const steps = std::max(std::fabs(bx - ax), std::fabs(by - ay));
+    // Only the steps that come near the clip: a line from far outside costs what it shows.
+    double t_lo = 0.0, t_hi = 1.0;
+    auto keep_within = [&t_lo, &t_hi](double _from, double _to, int _low, int _high) {
+        double const d = _to - _from;
+        if (d == 0.0) {
+            if (_from < _low - 1 || _from > _high + 1) t_hi = -1.0;
+            return;
+        }
+        double const t0 = (_low - 1 - _from) / d, t1 = (_high + 1 - _from) / d;
+        t_lo = std::max(t_lo, std::min(t0, t1));
+        t_hi = std::min(t_hi, std::max(t0, t1));
+    };
+    keep_within(ax, bx, m_clip.m_x0, m_clip.m_x1);
+    keep_within(ay, by, m_clip.m_y0, m_clip.m_y1);
+    if (!(t_lo <= t_hi)) return;
+    long long const first = static_cast<long long>(std::floor(t_lo * steps));
+    long long const last = static_cast<long long>(std::ceil(t_hi * steps));
     SMaterial const ui_color = {false, nullptr};
-    for (int i = 0; i <= steps; ++i) {
-        float const t = steps ? static_cast<float>(i) / steps : 0.0f;
-        int const x = static_cast<int>(std::lround(ax + (bx - ax) * t));
-        int const y = static_cast<int>(std::lround(ay + (by - ay) * t));
+    for (long long i = first; i <= last; ++i) {
+        float const t = steps > 0.0 ? static_cast<float>(i) / static_cast<float>(steps) : 0.0f;
+        int const x = trunc_to_int(std::round(ax + (bx - ax) * t));
+        int const y = trunc_to_int(std::round(ay + (by - ay) * t));
         if (x < m_clip.m_x0 || x >= m_clip.m_x1 || y < m_clip.m_y0 || y >= m_clip.m_y1) continue;
         float rgba[4];
         for (int c = 0; c < 4; ++c)

@@ -16,7 +16,7 @@ namespace qorui {
 class CButton : public CWindowVisual {
 public:
     // Passive: a press on the button activates the window that holds it.
-    CButton(IWindowDesktop *_p_desktop, char const *_name);
+    CButton(CDesktop *_p_desktop, char const *_name);
     virtual ~CButton();
 
     QOR_CLASS_ID(CButton, CWindowVisual, "Button")
@@ -42,7 +42,7 @@ private:
 class CCheckBox : public CWindowVisual {
 public:
     // A 16 by 16 checker; not passive, so a check box can be the active window.
-    CCheckBox(IWindowDesktop *_p_desktop, char const *_name);
+    CCheckBox(CDesktop *_p_desktop, char const *_name);
     virtual ~CCheckBox();
 
     QOR_CLASS_ID(CCheckBox, CWindowVisual, "CheckBox")
@@ -74,7 +74,7 @@ private:
 
 class CRadioButton : public CCheckBox {
 public:
-    CRadioButton(IWindowDesktop *_p_desktop, char const *_name);
+    CRadioButton(CDesktop *_p_desktop, char const *_name);
     virtual ~CRadioButton();
 
     QOR_CLASS_ID(CRadioButton, CCheckBox, "RadioButton")

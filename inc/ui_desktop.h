@@ -11,7 +11,7 @@ namespace qorui {
 
 class IStatsPage;
 
-class CDesktop : public CWindowVisual, public IWindowDesktop {
+class CDesktop : public CWindowVisual {
 public:
     static int const MAX_ACTIVE_WINDOWS_STACK_SIZE = 32;
     static unsigned const DOUBLE_CLICK_TIME = 250; // ms
@@ -41,20 +41,25 @@ public:
     // Shows a hidden window, climbs past passive ones, brings the chain to the front.
     void set_active_window(CWindow *_p_wnd);
     void set_exclusive_render_window(CWindow *_p_wnd, bool _exclusive);
-    void input_subscribe(CWindow *_p_wnd, bool _subscribe) override;
-    void report_pointer_inside(CWindow *_p_wnd) override;
-    void on_hide(CWindow *_p_wnd) override;
-    void on_delete(CWindow *_p_wnd) override;
+    // Keyboard and wheel events to a window whether it is active or not.
+    void input_subscribe(CWindow *_p_wnd, bool _subscribe);
+    // The hit test: a window under the point reports itself; the last report wins.
+    void report_pointer_inside(CWindow *_p_wnd);
+    // A window is about to be hidden: if it or a descendant is the active window, activation moves.
+    void on_hide(CWindow *_p_wnd);
+    // A window is being destroyed: every reference to it goes.
+    void on_delete(CWindow *_p_wnd);
     // Deleted by a later update, once hidden and faded out; never twice.
-    void delete_window(CWindow *_p_wnd) override;
-    point_t get_pointer_pos() override;
+    void delete_window(CWindow *_p_wnd);
+    // The pointer's hot spot in desktop pixels.
+    point_t get_pointer_pos();
     void hide_pointer();
     void show_pointer();
     CPointer &get_pointer() { return m_pointer; }
-    IRender *get_render() override { return mp_render; }
-    CMaterial *create_material() override;
-    // One function for both bases: the desktop's own materials.
-    CMaterial *get_material(HUID const &_id) override { return CWindowVisual::get_material(_id); }
+    // The render bridge that the canvases of the tree draw through; null while there is none.
+    IRender *get_render() { return mp_render; }
+    // A new material over the render bridge, without a handle yet; the caller owns it.
+    CMaterial *create_material();
     // The whole layout to _file of _category, and the presets to "ui_material_presets.lua".
     void export_layout(int _category, char const *_file);
 

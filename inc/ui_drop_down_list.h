@@ -19,7 +19,7 @@ class CListBox;
 class CDropDownList : public CWindowVisual {
 public:
     // Closed, with the list passive, so that a press in the open list keeps the control active.
-    CDropDownList(IWindowDesktop *_p_desktop, char const *_name);
+    CDropDownList(CDesktop *_p_desktop, char const *_name);
     virtual ~CDropDownList();
 
     QOR_CLASS_ID(CDropDownList, CWindowVisual, "DropDownList")

@@ -21,7 +21,7 @@ class CScrollBar;
 class CCaret : public CWindowVisual {
 public:
     // Passive; no material in the hidden phase, a translucent grey rectangle in the visible one.
-    CCaret(IWindowDesktop *_p_desktop, char const *_name);
+    CCaret(CDesktop *_p_desktop, char const *_name);
     virtual ~CCaret() {}
 
     QOR_CLASS_ID(CCaret, CWindowVisual, "Caret")
@@ -40,7 +40,7 @@ protected:
 
 class CEditBox : public CWindowVisual {
 public:
-    CEditBox(IWindowDesktop *_p_desktop, char const *_name);
+    CEditBox(CDesktop *_p_desktop, char const *_name);
     virtual ~CEditBox() {}
 
     QOR_CLASS_ID(CEditBox, CWindowVisual, "EditBox")

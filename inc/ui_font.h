@@ -16,7 +16,7 @@ class LuaObject;
 namespace qorui {
 
 class CMaterial;
-class IWindowDesktop;
+class CDesktop;
 class CFontsFactory;
 
 class CCharset {
@@ -83,7 +83,7 @@ public:
     void init();
     // A new font with its own material, its charset shared by name; null after a warning when the
     // tables don't describe it. The caller owns the font.
-    CFont *create(char const *_name, IWindowDesktop *_p_desktop);
+    CFont *create(char const *_name, CDesktop *_p_desktop);
 
 private:
     CCharset *find_charset(char const *_name);

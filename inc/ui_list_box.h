@@ -24,7 +24,7 @@ class CListBox : public CWindowVisual {
 public:
     // Margins of 4, one column without title or width, and a hidden vertical scroll bar as the child
     // "scroll bar vert". The bar is as wide as a layout or the owner makes it.
-    CListBox(IWindowDesktop *_p_desktop, char const *_name);
+    CListBox(CDesktop *_p_desktop, char const *_name);
     virtual ~CListBox();
 
     QOR_CLASS_ID(CListBox, CWindowVisual, "ListBox")

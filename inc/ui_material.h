@@ -16,7 +16,7 @@ class LuaObject;
 namespace qorui {
 
 class IRender;
-class IWindowDesktop;
+class CDesktop;
 class CDesktop;
 
 class CMaterialBase {
@@ -93,6 +93,6 @@ private:
 
 // A new "ui_color" material of the desktop in one colour: the built-in look of a control. The caller
 // owns it; null without a desktop.
-CMaterial *create_color_material(IWindowDesktop *_p_desktop, rgba_t const &_color);
+CMaterial *create_color_material(CDesktop *_p_desktop, rgba_t const &_color);
 
 } // namespace qorui

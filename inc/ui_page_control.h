@@ -25,7 +25,7 @@ public:
         TABS_VERTICAL = 1    // tabs in a column left of the pages
     };
 
-    CPageControl(IWindowDesktop *_p_desktop, char const *_name);
+    CPageControl(CDesktop *_p_desktop, char const *_name);
     virtual ~CPageControl();
 
     QOR_CLASS_ID(CPageControl, CWindowVisual, "PageControl")

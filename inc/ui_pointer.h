@@ -26,7 +26,7 @@ protected:
 class CPointer : public CReferencePointWindow {
 public:
     // Appears and vanishes at once: no fades.
-    CPointer(IWindowDesktop *_p_desktop, char const *_name);
+    CPointer(CDesktop *_p_desktop, char const *_name);
     virtual ~CPointer() {}
 
     QOR_CLASS_ID(CPointer, CWindowVisual, "Pointer")

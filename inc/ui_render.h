@@ -18,6 +18,8 @@ class IRender {
 public:
     virtual ~IRender() {}
     virtual void set_resolution(int _w, int _h) = 0;
+    // The desktop's size in pixels as last set; nothing outside it is ever seen.
+    virtual point_t get_resolution() const = 0;
     virtual void begin_draw() = 0;
     virtual void end_draw() = 0;
     virtual int create_material(char const *_material_template, char const *_diffuse, char const *_bump,
@@ -45,6 +47,7 @@ public:
     CRender();
 
     void set_resolution(int _w, int _h) override;
+    point_t get_resolution() const override { return point_t{m_res_w, m_res_h}; }
     // begin_2d at every level of nesting, not only the outermost.
     void begin_draw() override;
     void end_draw() override;

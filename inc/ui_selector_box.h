@@ -16,7 +16,7 @@ class CButton;
 class CSelectorBox : public CWindowVisual {
 public:
     // Makes the two buttons as children, dressed in the desktop's left and right button materials.
-    CSelectorBox(IWindowDesktop *_p_desktop, char const *_name);
+    CSelectorBox(CDesktop *_p_desktop, char const *_name);
     virtual ~CSelectorBox();
 
     QOR_CLASS_ID(CSelectorBox, CWindowVisual, "SelectorBox")

@@ -10,7 +10,7 @@ namespace qorui {
 class CStaticText : public CWindowVisual {
 public:
     // Passive, left aligned, empty; a slot for the normal material that holds none.
-    CStaticText(IWindowDesktop *_p_desktop, char const *_name);
+    CStaticText(CDesktop *_p_desktop, char const *_name);
     virtual ~CStaticText();
 
     QOR_CLASS_ID(CStaticText, CWindowVisual, "StaticText")

@@ -15,7 +15,7 @@ class CButton;
 
 class CValueBar : public CWindowVisual {
 public:
-    CValueBar(IWindowDesktop *_p_desktop, char const *_name);
+    CValueBar(CDesktop *_p_desktop, char const *_name);
     virtual ~CValueBar();
 
     QOR_CLASS_ID(CValueBar, CWindowVisual, "ValueBar")
@@ -57,7 +57,7 @@ protected:
 
 class CProgressBar : public CValueBar {
 public:
-    CProgressBar(IWindowDesktop *_p_desktop, char const *_name);
+    CProgressBar(CDesktop *_p_desktop, char const *_name);
     virtual ~CProgressBar();
 
     QOR_CLASS_ID(CProgressBar, CValueBar, "ProgressBar")
@@ -68,7 +68,7 @@ protected:
 
 class CScrollBar : public CValueBar {
 public:
-    CScrollBar(IWindowDesktop *_p_desktop, char const *_name);
+    CScrollBar(CDesktop *_p_desktop, char const *_name);
     virtual ~CScrollBar();
 
     QOR_CLASS_ID(CScrollBar, CValueBar, "ScrollBar")

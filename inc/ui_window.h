@@ -13,6 +13,8 @@
 #include "ui_geometry.h"
 #include "ui_huid.h"
 
+#include <new>
+
 namespace LuaPlus {
 class LuaObject;
 }
@@ -20,41 +22,21 @@ class LuaObject;
 namespace qorui {
 
 class CWindow;
+class CDesktop;
 class CMaterial;
 class IRender;
 
-// What a window asks of the desktop of its tree: the desktop implements these, and a window is
-// constructed with the desktop that it will hang from.
-class IWindowDesktop {
-public:
-    // A window is about to be hidden: if it or a descendant is the active window, activation moves.
-    virtual void on_hide(CWindow *_p_wnd) = 0;
-    // A window is being destroyed: every reference to it goes.
-    virtual void on_delete(CWindow *_p_wnd) = 0;
-    // Deletion deferred to a later update.
-    virtual void delete_window(CWindow *_p_wnd) = 0;
-    // The hit test: a window under the point reports itself; the last report wins.
-    virtual void report_pointer_inside(CWindow *_p_wnd) = 0;
-    // Keyboard and wheel events to a window whether it is active or not.
-    virtual void input_subscribe(CWindow *_p_wnd, bool _subscribe) = 0;
-    // A new material over the desktop's render bridge, without a handle yet; the caller owns it.
-    virtual CMaterial *create_material() = 0;
-    // The render bridge that the canvases of the tree draw through; null while there is none.
-    virtual IRender *get_render() = 0;
-    // The pointer's hot spot in desktop pixels.
-    virtual point_t get_pointer_pos() = 0;
-    // The desktop's own material of that name, which controls copy for the look of their parts;
-    // null if it has none.
-    virtual CMaterial *get_material(HUID const &_id) = 0;
-
-protected:
-    ~IWindowDesktop() {}
-};
-
 class CWindow : public CEventDispatcher {
 public:
-    CWindow(IWindowDesktop *_p_desktop, char const *_name);
+    CWindow(CDesktop *_p_desktop, char const *_name);
     virtual ~CWindow();
+
+    // Windows live on the library's heap whichever module makes them with new, since the tree
+    // deletes them from inside the library.
+    static void *operator new(size_t _size);
+    static void *operator new(size_t _size, std::nothrow_t const &) noexcept;
+    static void operator delete(void *_p) noexcept;
+    static void operator delete(void *_p, std::nothrow_t const &) noexcept;
 
     virtual void send_event(CWindow *_p_receiver, CWndEvent const *_p_event,
                             CWndEvent::EDispatchType _type) override;
@@ -73,7 +55,7 @@ public:
     // The child goes last, then behind every always-on-top sibling.
     virtual void bring_to_front(CWindow *_p_child);
     CWindow *get_parent() { return mp_parent; }
-    IWindowDesktop *get_desktop() { return mp_desktop; }
+    CDesktop *get_desktop() { return mp_desktop; }
     unsigned int get_children_count() const { return static_cast<unsigned int>(m_children.size()); }
     CWindow *get_child(unsigned int _idx);
     // A direct child first, then depth first through the children in order. A null class name
@@ -184,7 +166,7 @@ protected:
     bool m_dbg_lock_hide;
     HUID m_id;
     CWindow *mp_parent;
-    IWindowDesktop *mp_desktop;
+    CDesktop *mp_desktop;
     // Flags
     bool m_is_hidden;
     bool m_is_disabled;
@@ -219,7 +201,7 @@ private:
 // The factory
 // ---------------------------------------------------------------------------------------------
 
-typedef CWindow *(*window_creator_t)(IWindowDesktop *_p_desktop, char const *_name);
+typedef CWindow *(*window_creator_t)(CDesktop *_p_desktop, char const *_name);
 
 // Class names to creators, keyed by the hash of the name.
 class CWindowsFactory {
@@ -227,7 +209,7 @@ public:
     // A second registration of a name replaces the first.
     void Register(HUID const &_class_name, window_creator_t _creator);
     // A new window, not attached to anything; null for a name never registered.
-    CWindow *Create(HUID const &_class_name, IWindowDesktop *_p_desktop, char const *_name);
+    CWindow *Create(HUID const &_class_name, CDesktop *_p_desktop, char const *_name);
 
 private:
     qor_map<HUID, window_creator_t> m_creators;
@@ -251,7 +233,7 @@ public:
     explicit CWindowRegistrar(char const *_class_name) : CWindowRegistrarBase(_class_name, &create) {}
 
 private:
-    static CWindow *create(IWindowDesktop *_p_desktop, char const *_name) {
+    static CWindow *create(CDesktop *_p_desktop, char const *_name) {
         return new (std::nothrow) TWindow(_p_desktop, _name);
     }
 };

@@ -17,7 +17,7 @@ class CText;
 
 class CWindowVisual : public CWindow, public ICanvasOwner {
 public:
-    CWindowVisual(IWindowDesktop *_p_desktop, char const *_name);
+    CWindowVisual(CDesktop *_p_desktop, char const *_name);
     virtual ~CWindowVisual();
 
     QOR_CLASS_ID(CWindowVisual, CWindow, "WindowVisual")

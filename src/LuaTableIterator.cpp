@@ -1,5 +1,8 @@
 // The readers of typed fields of Lua tables and the writer of pairs, shared by every layout.
 #include "LuaTableIterator.h"
+#include "qordebug.h"
+
+#include <cmath>
 
 namespace qorui {
 
@@ -10,24 +13,35 @@ bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_val
     return true;
 }
 
+bool read_number(LuaPlus::LuaObject const &_lo_value, char const *_key, double &_number) {
+    if (!_lo_value.IsNumber()) return false;
+    double const number = _lo_value.GetNumber();
+    if (!(std::fabs(number) <= k_data_number_limit)) { // NaN fails this too
+        qordebug::warning("UI: Number '%s' out of range: %g", _key ? _key : "", number);
+        return false;
+    }
+    _number = number;
+    return true;
+}
+
 bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (!value.IsNumber()) return false;
-    _value = static_cast<int>(value.GetNumber());
+    double number;
+    if (!read_number(_lo_table.GetByName(_key), _key, number)) return false;
+    _value = static_cast<int>(number);
     return true;
 }
 
 bool read_integer(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (!value.IsInteger()) return false;
-    _value = value.GetInteger();
+    double number;
+    if (!read_number(_lo_table.GetByName(_key), _key, number) || std::floor(number) != number) return false;
+    _value = static_cast<int>(number);
     return true;
 }
 
 bool read_float(LuaPlus::LuaObject const &_lo_table, char const *_key, float &_value) {
-    LuaPlus::LuaObject const value = _lo_table.GetByName(_key);
-    if (!value.IsNumber()) return false;
-    _value = value.GetFloat();
+    double number;
+    if (!read_number(_lo_table.GetByName(_key), _key, number)) return false;
+    _value = static_cast<float>(number);
     return true;
 }
 

@@ -16,7 +16,13 @@ void for_each_entry(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
         _visit(static_cast<LuaPlus::LuaObject const &>(key), static_cast<LuaPlus::LuaObject const &>(value));
 }
 
-// Each reader tells whether it took the value.
+// The one gate of numbers from data: a number of the value, finite and within
+// +-k_data_number_limit, in _number. Any other number is bad data: reported by a warning that
+// names _key, and false, so the field stays as it is. Not a number: false, with no message.
+double const k_data_number_limit = 16777216.0; // 2^24: sums of positions stay far inside int
+bool read_number(LuaPlus::LuaObject const &_lo_value, char const *_key, double &_number);
+
+// Each reader tells whether it took the value. Numbers go through read_number.
 bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
 // A number, truncated toward zero.
 bool read_int(LuaPlus::LuaObject const &_lo_table, char const *_key, int &_value);
@@ -32,9 +38,9 @@ template <class T>
 bool read_pair(LuaPlus::LuaObject const &_lo_table, char const *_key, T &_first, T &_second) {
     LuaPlus::LuaObject const pair = _lo_table.GetByName(_key);
     if (!pair.IsTable()) return false;
-    LuaPlus::LuaObject const first = pair.GetByIndex(1), second = pair.GetByIndex(2);
-    if (first.IsNumber()) _first = static_cast<T>(first.GetNumber());
-    if (second.IsNumber()) _second = static_cast<T>(second.GetNumber());
+    double number;
+    if (read_number(pair.GetByIndex(1), _key, number)) _first = static_cast<T>(number);
+    if (read_number(pair.GetByIndex(2), _key, number)) _second = static_cast<T>(number);
     return true;
 }
 

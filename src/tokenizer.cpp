@@ -1,6 +1,8 @@
 // The scanner of command arguments and font files: separators, comments, quoted tokens and
 // terminators, with the end of the text thrown as a failure.
 #include "tokenizer.h"
+#include <algorithm>
+#include <climits>
 #include <cstdlib>
 #include <cstring>
 
@@ -153,7 +155,9 @@ double CTokenizer::as_float() const {
 
 int CTokenizer::as_int() const {
     if (m_token.empty()) fail();
-    return std::atoi(m_token.c_str());
+    // As atoi reads it, held at the ends of int's range.
+    long const value = std::strtol(m_token.c_str(), nullptr, 10);
+    return static_cast<int>(std::clamp<long>(value, INT_MIN, INT_MAX));
 }
 
 void CTokenizer::expect(string const &_text) const {

@@ -5,6 +5,7 @@
 #include "qorscriptsystem.h"
 #include "ui_logger.h"
 #include "ui_material.h"
+#include "ui_desktop.h"
 
 namespace qorui {
 
@@ -20,7 +21,7 @@ CWindowRegistrar<CRadioButton> const s_radio_button_registrar("RadioButton");
 // Push button
 // ---------------------------------------------------------------------------------------------
 
-CButton::CButton(IWindowDesktop *_p_desktop, char const *_name) : CWindowVisual(_p_desktop, _name) {
+CButton::CButton(CDesktop *_p_desktop, char const *_name) : CWindowVisual(_p_desktop, _name) {
     set_passive(true);
 }
 
@@ -87,7 +88,7 @@ void CButton::load_state(LuaPlus::LuaObject &_lo_table) {
 // Check box
 // ---------------------------------------------------------------------------------------------
 
-CCheckBox::CCheckBox(IWindowDesktop *_p_desktop, char const *_name)
+CCheckBox::CCheckBox(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_checker_w(16), m_checker_h(16), m_just_clicked(false) {}
 
 CCheckBox::~CCheckBox() {}
@@ -156,7 +157,7 @@ void CCheckBox::load_state(LuaPlus::LuaObject &_lo_table) {
 // Radio button
 // ---------------------------------------------------------------------------------------------
 
-CRadioButton::CRadioButton(IWindowDesktop *_p_desktop, char const *_name) : CCheckBox(_p_desktop, _name) {}
+CRadioButton::CRadioButton(CDesktop *_p_desktop, char const *_name) : CCheckBox(_p_desktop, _name) {}
 
 CRadioButton::~CRadioButton() {}
 

@@ -11,10 +11,59 @@
 #include "ui_string.h"
 #include "ui_text.h"
 
+#include <algorithm>
+#include <climits>
 #include <cmath>
-#include <cstdio>
 
 namespace qorui {
+
+namespace {
+
+// Pixels farther out than this are on no screen: sizes and pens from data are held within it, so
+// that the sums of positions stay inside int.
+float const k_far_pixels = 268435456.0f; // 2^28
+
+// A size or position in float to pixels, cut toward zero and held within k_far_pixels.
+int to_pixels(float _v) {
+    return trunc_to_int(std::clamp(_v, -k_far_pixels, k_far_pixels));
+}
+
+// The range [_first, _last) of the tiles of size _tile from _start that meet the visible span
+// [_from, _to), of _count tiles in all.
+void visible_tiles(int _start, int _tile, int _count, int _from, int _to, int &_first, int &_last) {
+    long long const from = std::max<long long>(_from - static_cast<long long>(_start), 0);
+    long long const to =
+        std::min<long long>(_to - static_cast<long long>(_start), static_cast<long long>(_count) * _tile);
+    _first = static_cast<int>(from / _tile);
+    _last = to > from ? static_cast<int>((to + _tile - 1) / _tile) : _first;
+}
+
+bool is_scan_space(unsigned short _c) {
+    return _c == ' ' || (_c >= '\t' && _c <= '\r');
+}
+
+// One number of "%u" from _k on, as the standard scan reads it: blanks, a sign, decimal digits (a
+// value too large for unsigned long stays at its greatest value, a minus negates it); the low bits
+// land in _value. False when no digit stands there.
+bool scan_unsigned(CString const &_string, size_t &_k, unsigned &_value) {
+    size_t const length = _string.length();
+    while (_k < length && is_scan_space(_string[_k]))
+        ++_k;
+    bool const negative = _k < length && _string[_k] == '-';
+    if (_k < length && (_string[_k] == '-' || _string[_k] == '+')) ++_k;
+    size_t const first_digit = _k;
+    unsigned long value = 0;
+    unsigned long const limit = static_cast<unsigned long>(-1);
+    for (; _k < length && _string[_k] >= '0' && _string[_k] <= '9'; ++_k) {
+        unsigned const digit = _string[_k] - '0';
+        value = value > (limit - digit) / 10 ? limit : value * 10 + digit;
+    }
+    if (_k == first_digit) return false;
+    _value = static_cast<unsigned>(negative ? 0 - value : value);
+    return true;
+}
+
+} // namespace
 
 CCanvas::CCanvas(ICanvasOwner *_p_owner) : mp_owner(_p_owner), m_tags_enable(true) {}
 
@@ -125,8 +174,8 @@ void CCanvas::draw_nine_patch(IRender *_p_render, int _l, int _t, int _r, int _b
     float const u = m.get_tex_x(), v = m.get_tex_y(), tw = m.get_tex_w(), th = m.get_tex_h();
     float const bl = m.get_border_left(), br = m.get_border_right(), bt = m.get_border_top(),
                 bb = m.get_border_bottom();
-    int const x1 = _l + static_cast<int>(bl * rw), x2 = _r - static_cast<int>(br * rw);
-    int const y1 = _t + static_cast<int>(bt * rh), y2 = _b - static_cast<int>(bb * rh);
+    int const x1 = _l + to_pixels(bl * rw), x2 = _r - to_pixels(br * rw);
+    int const y1 = _t + to_pixels(bt * rh), y2 = _b - to_pixels(bb * rh);
     float const u1 = u + bl, u2 = u + tw - br, u3 = u + tw;
     float const v1 = v + bt, v2 = v + th - bb, v3 = v + th;
 
@@ -155,17 +204,25 @@ void CCanvas::draw_tiled(int _x, int _y, int _w, int _h, float _tex_x, float _te
     IRender *p_render;
     rgba_t color;
     if (_w < 1 || _h < 1 || !prepare(_p_material, p_render, color)) return;
-    int const tile_w = static_cast<int>(_tex_w * _tex_real_w);
-    int const tile_h = static_cast<int>(_tex_h * _tex_real_h);
+    int const tile_w = to_pixels(_tex_w * _tex_real_w);
+    int const tile_h = to_pixels(_tex_h * _tex_real_h);
     // A tile size of 0 (or less) draws no tile.
     int const columns = tile_w > 0 ? static_cast<int>(std::ceil(static_cast<double>(_w) / tile_w)) : 0;
     int const rows = tile_h > 0 ? static_cast<int>(std::ceil(static_cast<double>(_h) / tile_h)) : 0;
     p_render->set_clip_area(_x, _y, _w, _h);
     p_render->push_clip_area();
     p_render->set_material(_p_material->get_material_handle());
-    for (int row = 0; row < rows; ++row) {
+    // Only the tiles that the clip lets through to the desktop: a tiny tile over a large area
+    // costs no more than the screen has pixels.
+    point_t const screen = p_render->get_resolution();
+    int first_column = 0, last_column = 0, first_row = 0, last_row = 0;
+    if (columns > 0 && rows > 0) {
+        visible_tiles(_x, tile_w, columns, 0, screen.x, first_column, last_column);
+        visible_tiles(_y, tile_h, rows, 0, screen.y, first_row, last_row);
+    }
+    for (int row = first_row; row < last_row; ++row) {
         int const t = _y + row * tile_h;
-        for (int column = 0; column < columns; ++column) {
+        for (int column = first_column; column < last_column; ++column) {
             int const l = _x + column * tile_w;
             quad(p_render, l, t, l + tile_w, t + tile_h, _tex_x, _tex_y, _tex_x + _tex_w, _tex_y + _tex_h,
                  color);
@@ -192,15 +249,15 @@ size_t CCanvas::read_tag(CString const &_string, size_t _i, rgba_t const &_base,
         if (closing) {
             _current = _base;
         } else {
-            char numbers[64];
-            size_t n = 0;
-            for (size_t k = j + 5; k < length && n + 1 < sizeof numbers; ++k)
-                numbers[n++] = _string[k] < 128 ? static_cast<char>(_string[k]) : '?';
-            numbers[n] = '\0';
-            unsigned r, g, b, a;
-            if (std::sscanf(numbers, "%u %u %u %u", &r, &g, &b, &a) == 4)
-                _current = rgba_t(static_cast<unsigned char>(r), static_cast<unsigned char>(g),
-                                  static_cast<unsigned char>(b), static_cast<unsigned char>(a));
+            // The numbers behind the word, up to the end of the string.
+            size_t k = j + 5;
+            unsigned rgba[4];
+            int read = 0;
+            while (read < 4 && scan_unsigned(_string, k, rgba[read]))
+                ++read;
+            if (read == 4)
+                _current = rgba_t(static_cast<unsigned char>(rgba[0]), static_cast<unsigned char>(rgba[1]),
+                                  static_cast<unsigned char>(rgba[2]), static_cast<unsigned char>(rgba[3]));
         }
     }
     return close + 1;
@@ -209,7 +266,7 @@ size_t CCanvas::read_tag(CString const &_string, size_t _i, rgba_t const &_base,
 void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
     if (!_p_font || _string.empty()) return;
     float const size = _p_font->get_size();
-    int const line_h = static_cast<int>(size * _p_font->get_height());
+    int const line_h = to_pixels(size * _p_font->get_height());
     CMaterial *p_material = nullptr;
     rgba_t base, current;
     int x_cur = _x;
@@ -230,9 +287,9 @@ void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
         CCharset::SChar const *p_char = _p_font->get_char_description(_string[i]);
         if (!p_char) continue;
         p_material->set_color(current);
-        draw_rect(x_cur, _y, static_cast<int>(p_char->w * size), line_h, p_char->x, p_char->y, p_char->w,
+        draw_rect(x_cur, _y, to_pixels(p_char->w * size), line_h, p_char->x, p_char->y, p_char->w,
                   _p_font->get_height(), p_material);
-        x_cur = static_cast<int>(static_cast<float>(x_cur) + p_char->w * size);
+        x_cur = to_pixels(static_cast<float>(x_cur) + p_char->w * size);
     }
     if (p_material) p_material->set_color(base);
 }
@@ -257,7 +314,7 @@ void CCanvas::text_out(int _x, int _y, int _spacing, CText const &_text, CFont *
 }
 
 int CCanvas::get_text_height(CFont *_p_font) {
-    return _p_font ? static_cast<int>(_p_font->get_size() * _p_font->get_height()) : 0;
+    return _p_font ? to_pixels(_p_font->get_size() * _p_font->get_height()) : 0;
 }
 
 int CCanvas::get_text_height(CString const &, CFont *_p_font) {
@@ -267,7 +324,7 @@ int CCanvas::get_text_height(CString const &, CFont *_p_font) {
 int CCanvas::get_char_width(unsigned short _ch, CFont *_p_font) {
     if (!_p_font) return 0;
     CCharset::SChar const *p_char = _p_font->get_char_description(_ch);
-    return p_char ? static_cast<int>(p_char->w * _p_font->get_size()) : 0;
+    return p_char ? to_pixels(p_char->w * _p_font->get_size()) : 0;
 }
 
 int CCanvas::get_text_width(CString const &_string, CFont *_p_font, int _count) {
@@ -275,10 +332,10 @@ int CCanvas::get_text_width(CString const &_string, CFont *_p_font, int _count) 
     size_t const count = _count >= 0 && _string.length() >= static_cast<size_t>(_count)
                              ? static_cast<size_t>(_count)
                              : _string.length();
-    int width = 0;
+    long long width = 0; // each character within k_far_pixels: no overflow here
     for (size_t i = 0; i < count; ++i)
         width += get_char_width(_string[i], _p_font);
-    return width;
+    return static_cast<int>(std::clamp<long long>(width, INT_MIN, INT_MAX));
 }
 
 } // namespace qorui

@@ -414,17 +414,19 @@ void CDesktop::export_layout(int _category, char const *_file) {
     save_state(windows);
     IFileSystem *p_files = GetFileSystem();
     if (!p_files || !_file) return;
-    std::ostringstream layout;
-    lua.DoString("ui_windows_ini = nil");
+    std::ostringstream layout, presets_stream;
+    lua.DoString("ui_windows_ini = nil", true);
     windows.dump("ui_windows_ini", layout);
-    std::string const layout_text = layout.str();
-    p_files->save_file(_category, _file, layout_text.data(), static_cast<unsigned>(layout_text.size()), 0);
-    std::ostringstream presets_stream;
-    lua.DoString("ui_material_presets = nil");
+    lua.DoString("ui_material_presets = nil", true);
     presets.dump("ui_material_presets", presets_stream);
-    std::string const presets_text = presets_stream.str();
-    p_files->save_file(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua", presets_text.data(),
-                       static_cast<unsigned>(presets_text.size()), 0);
+    std::string const layout_text = layout.str(), presets_text = presets_stream.str();
+    // Both files or neither: a layout that can't be written leaves the presets as they were.
+    SFileToSave const files[] = {
+        {_category, _file, layout_text.data(), static_cast<unsigned>(layout_text.size())},
+        {qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua", presets_text.data(),
+         static_cast<unsigned>(presets_text.size())},
+    };
+    p_files->save_files(files, 2);
 }
 
 namespace {

@@ -21,7 +21,7 @@ CWindowRegistrar<CDropDownList> const s_drop_down_list_registrar("DropDownList")
 
 // The list hangs from the control but lies outside it, below; being passive, a press in it
 // activates the control, which so stays active while a row is chosen.
-CDropDownList::CDropDownList(IWindowDesktop *_p_desktop, char const *_name)
+CDropDownList::CDropDownList(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), mp_list_box(nullptr), m_max_list_box_height(0), m_list_box_h(0),
       m_offset(0), m_left_border_offset(0), m_right_border_offset(0) {
     mp_list_box = new CListBox(mp_desktop, "list_box");

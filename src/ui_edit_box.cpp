@@ -55,7 +55,7 @@ int const k_scroll_bar_size = 16;
 
 // The checked flag is the visible phase, so the state drawing of the visual window paints the
 // rectangle then and nothing otherwise.
-CCaret::CCaret(IWindowDesktop *_p_desktop, char const *_name)
+CCaret::CCaret(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_last_blink(0), m_blink_time(500) {
     add_material(MAT_NAME_NORMAL, nullptr);
     add_material(MAT_NAME_CHECKED, create_color_material(_p_desktop, rgba_t(120, 120, 120, 150)));
@@ -83,7 +83,7 @@ void CCaret::on_event_changed(CWndEvent const *_p_event) {
 // Construction and scroll bars
 // ---------------------------------------------------------------------------------------------
 
-CEditBox::CEditBox(IWindowDesktop *_p_desktop, char const *_name)
+CEditBox::CEditBox(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), mp_caret(nullptr), mp_scroll_bar_vert(nullptr),
       mp_scroll_bar_horz(nullptr), m_line_interval(0), m_text_offset{0, 0}, m_auto_scroll(false),
       m_scroll_speed(0.0f), m_last_update(0) {

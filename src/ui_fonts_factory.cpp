@@ -4,9 +4,11 @@
 #include "qordebug.h"
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
+#include "LuaTableIterator.h"
 #include "ui_font.h"
 #include "ui_material.h"
 #include "ui_window.h"
+#include "ui_desktop.h"
 
 #include <cstring>
 
@@ -19,9 +21,9 @@ CFontsFactory &get_fonts_factory() {
 
 void CFontsFactory::init() {
     LuaPlus::LuaState &lua = lua_machine();
-    lua.DoString("charsets={}");
-    lua.DoString("fonts={}");
-    lua.DoFile(qorbase::FILE_CATEGORY_UI, "fonts.lua");
+    lua.DoString("charsets={}", true);
+    lua.DoString("fonts={}", true);
+    lua.DoFile(qorbase::FILE_CATEGORY_UI, "fonts.lua", true);
 }
 
 CCharset *CFontsFactory::find_charset(char const *_name) {
@@ -47,7 +49,7 @@ CCharset *CFontsFactory::load_charset(char const *_name) {
     return p_charset;
 }
 
-CFont *CFontsFactory::create(char const *_name, IWindowDesktop *_p_desktop) {
+CFont *CFontsFactory::create(char const *_name, CDesktop *_p_desktop) {
     if (!QOR_CHECK(_p_desktop) || !_name) return nullptr;
     LuaPlus::LuaObject const lo_fonts = lua_machine().GetGlobals().GetByName("fonts");
     if (!QOR_CHECK(lo_fonts.IsTable())) return nullptr;
@@ -75,8 +77,8 @@ CFont *CFontsFactory::create(char const *_name, IWindowDesktop *_p_desktop) {
         p_material->load_state(material);
         p_font->m_materials.push_back(p_material);
     }
-    LuaPlus::LuaObject const size = entry.GetByName("size");
-    if (size.IsNumber()) p_font->set_size(size.GetFloat());
+    float size;
+    if (read_float(entry, "size", size)) p_font->set_size(size);
     return p_font;
 }
 

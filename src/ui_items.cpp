@@ -11,6 +11,7 @@
 #include "ui_debug.h"
 #include "ui_material.h"
 #include "ui_window_visual.h"
+#include "ui_desktop.h"
 
 #include <algorithm>
 #include <cstdio>
@@ -86,7 +87,7 @@ void CItem::load_state(LuaPlus::LuaObject &_lo_table, CWindowVisual *_p_desktop)
 // The new icon is made before the old one goes, so that a desktop that can't make one leaves the
 // row as it was.
 void CItem::load_icon(LuaPlus::LuaObject const &_lo_icon, CWindowVisual *_p_desktop) {
-    IWindowDesktop *p_source = _p_desktop->get_desktop();
+    CDesktop *p_source = _p_desktop->get_desktop();
     CMaterial *p_icon = p_source ? p_source->create_material() : nullptr;
     if (!QOR_CHECK_AS(p_icon, "mp_icon")) return;
     delete mp_icon;

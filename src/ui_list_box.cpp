@@ -40,7 +40,7 @@ int ceil_div(int _a, int _b) {
 // The bar's size of 16 lasts only until its set_horizontal takes the size anew from the window, 0
 // by 0 for a bar just made: the bar is as wide as a layout or the owner makes it, and keeps that
 // width through every layout of the list.
-CListBox::CListBox(IWindowDesktop *_p_desktop, char const *_name)
+CListBox::CListBox(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_show_columns(false), m_columns_h(20), m_columns_dw(4),
       m_custom_item_height(-1), m_item_icon_size(16), m_item_spacing(0), m_allow_check_items(true),
       m_columns(1, SColumn{CString(), 0}), mp_scroll_bar_vert(nullptr), m_max_lines(1),

@@ -89,9 +89,12 @@ size_t comment_start(wstring const &_line) {
     return _line.size();
 }
 
+// The most units that a narrow conversion takes.
+size_t const k_max_key_units = 255;
+
 // The line in a warning; cut so that its narrow form stays within what a conversion takes.
 string line_for_report(wstring const &_line) {
-    return CString(_line, static_cast<int>(std::min<size_t>(_line.size(), 255))).get_str_c();
+    return CString(_line, static_cast<int>(std::min(_line.size(), k_max_key_units))).get_str_c();
 }
 
 } // namespace
@@ -115,6 +118,11 @@ void read_local_strings(IFileReader *_p_stream, char const *_file_name, local_st
 
         size_t const end_key = std::min(line.find(' '), line.find('\t'));
         if (end_key == wstring::npos) continue; // no blank: no entry, and nothing to report
+        if (end_key > k_max_key_units) {        // longer than a narrow conversion takes
+            qordebug::warning("[init_local_strings('%s')]:\nCannot load string %u\n'%s'\nkey too long",
+                              _file_name ? _file_name : "", i + 1, line_for_report(line).c_str());
+            continue;
+        }
         string const key = CString(line, static_cast<int>(end_key)).get_str_c();
 
         size_t const first_quote = line.find(k_quote, end_key);

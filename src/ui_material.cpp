@@ -8,6 +8,7 @@
 #include "ui_debug.h"
 #include "ui_render.h"
 #include "ui_window.h"
+#include "ui_desktop.h"
 
 namespace qorui {
 
@@ -84,7 +85,7 @@ CMaterial *CMaterial::clone() const {
     return p_clone;
 }
 
-CMaterial *create_color_material(IWindowDesktop *_p_desktop, rgba_t const &_color) {
+CMaterial *create_color_material(CDesktop *_p_desktop, rgba_t const &_color) {
     CMaterial *p_material = _p_desktop ? _p_desktop->create_material() : nullptr;
     if (!p_material) return nullptr;
     p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
@@ -131,10 +132,15 @@ void CMaterial::read_keys(LuaPlus::LuaObject const &_lo_source) {
     read_pair(_lo_source, "tex_size", m_tex_real_w, m_tex_real_h);
     LuaPlus::LuaObject const color = _lo_source.GetByName("color");
     if (color.IsTable()) {
-        m_color.r = static_cast<unsigned char>(static_cast<int>(color.GetByName("r").GetNumber()));
-        m_color.g = static_cast<unsigned char>(static_cast<int>(color.GetByName("g").GetNumber()));
-        m_color.b = static_cast<unsigned char>(static_cast<int>(color.GetByName("b").GetNumber()));
-        m_color.a = static_cast<unsigned char>(static_cast<int>(color.GetByName("a").GetNumber()));
+        // Each channel the low eight bits of its number truncated; a channel that isn't a number
+        // gives 0, one out of range stays.
+        unsigned char rgba_t::*const channels[] = {&rgba_t::r, &rgba_t::g, &rgba_t::b, &rgba_t::a};
+        char const *const names[] = {"r", "g", "b", "a"};
+        for (int i = 0; i < 4; ++i) {
+            int channel = 0;
+            if (!color.GetByName(names[i]).IsNumber() || read_int(color, names[i], channel))
+                m_color.*channels[i] = static_cast<unsigned char>(channel);
+        }
     }
     read_bool(_lo_source, "bordered", m_bordered);
     if (m_bordered) {

@@ -37,7 +37,7 @@ bool holds(qor_vector<T *> const &_windows, CWindow const *_p_wnd) {
 // Construction
 // ---------------------------------------------------------------------------------------------
 
-CPageControl::CPageControl(IWindowDesktop *_p_desktop, char const *_name)
+CPageControl::CPageControl(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_active_page_idx(-1), m_tab_w(64), m_tab_h(32), m_tabs_interval(8),
       m_tabs_pages_interval(8), m_tabs_orientation(TABS_HORIZONTAL), m_tabs_alignment(ALIGNMENT_LEFT) {}
 

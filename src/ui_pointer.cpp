@@ -13,7 +13,7 @@ point_t CReferencePointWindow::get_pos() {
     return point_t{pos.x + offset.x, pos.y + offset.y};
 }
 
-CPointer::CPointer(IWindowDesktop *_p_desktop, char const *_name)
+CPointer::CPointer(CDesktop *_p_desktop, char const *_name)
     : CReferencePointWindow(_p_desktop, _name), m_hotspot{0, 0} {
     m_fade_in = 0;
     m_fade_out = 0;

@@ -20,7 +20,7 @@ CWindowRegistrar<CSelectorBox> const s_selector_box_registrar("SelectorBox");
 // The arrows' pictures are ordinary materials of the desktop's map, loaded with the rest of its
 // materials: a game restyles every selector at once by giving its desktop other ones, and a
 // desktop without them leaves the buttons in the plain look of a button.
-CSelectorBox::CSelectorBox(IWindowDesktop *_p_desktop, char const *_name)
+CSelectorBox::CSelectorBox(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_item_height(-1), m_item_icon_size(16), mp_left_button(nullptr),
       mp_right_button(nullptr) {
     mp_left_button = new CButton(mp_desktop, "left button");

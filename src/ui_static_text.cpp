@@ -18,7 +18,7 @@ CWindowRegistrar<CStaticText> const s_registrar("StaticText");
 // Construction and state
 // ---------------------------------------------------------------------------------------------
 
-CStaticText::CStaticText(IWindowDesktop *_p_desktop, char const *_name)
+CStaticText::CStaticText(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_text_alignment(ALIGNMENT_LEFT) {
     add_material(MAT_NAME_NORMAL, nullptr);
     set_passive(true);

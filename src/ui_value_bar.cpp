@@ -6,6 +6,7 @@
 #include "ui_button.h"
 #include "ui_debug.h"
 #include "ui_material.h"
+#include "ui_desktop.h"
 
 #include <algorithm>
 
@@ -25,7 +26,7 @@ CWindowRegistrar<CScrollBar> const s_scroll_bar_registrar("ScrollBar");
 
 // The bar size set here lasts only until set_horizontal's resize, which takes it from the window's
 // size: 0 until a layout or the owner sizes the bar.
-CValueBar::CValueBar(IWindowDesktop *_p_desktop, char const *_name)
+CValueBar::CValueBar(CDesktop *_p_desktop, char const *_name)
     : CWindowVisual(_p_desktop, _name), m_min(0.0f), m_max(100.0f), m_position(0.0f), m_bar_size(16),
       m_horizontal(true) {
     set_horizontal(true);
@@ -107,7 +108,7 @@ void CValueBar::load_state(LuaPlus::LuaObject &_lo_table) {
 // Progress bar
 // ---------------------------------------------------------------------------------------------
 
-CProgressBar::CProgressBar(IWindowDesktop *_p_desktop, char const *_name) : CValueBar(_p_desktop, _name) {
+CProgressBar::CProgressBar(CDesktop *_p_desktop, char const *_name) : CValueBar(_p_desktop, _name) {
     add_material(MAT_NAME_PROGRESS, create_color_material(mp_desktop, rgba_t(252, 252, 252, 200)));
     set_passive(true);
 }
@@ -132,7 +133,7 @@ void CProgressBar::on_event_draw(CWndEvent const *_p_event) {
 
 // The buttons get the bar size of the moment, 0 for a bar built by code: a layout or the owner
 // sizes them. The up and down materials serve horizontal bars as well.
-CScrollBar::CScrollBar(IWindowDesktop *_p_desktop, char const *_name)
+CScrollBar::CScrollBar(CDesktop *_p_desktop, char const *_name)
     : CValueBar(_p_desktop, _name), m_small_step(10.0f), m_large_step(50.0f), mp_button_min(nullptr),
       mp_button_max(nullptr), mp_button_scroller(nullptr), m_drag_offset{0, 0} {
     mp_button_min = add_button("button min", MAT_NAME_BUTTON_UP, MAT_NAME_BUTTON_UP_HIGHLIGHTED,

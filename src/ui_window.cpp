@@ -13,6 +13,7 @@
 #include "qordebug.h"
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
+#include "ui_desktop.h"
 
 #include <algorithm>
 #include <cstring>
@@ -39,7 +40,23 @@ bool is_one_of(EEventType _id, std::initializer_list<EEventType> _ids) {
 // Construction and destruction
 // ---------------------------------------------------------------------------------------------
 
-CWindow::CWindow(IWindowDesktop *_p_desktop, char const *_name)
+void *CWindow::operator new(size_t _size) {
+    return qor_malloc(_size);
+}
+
+void *CWindow::operator new(size_t _size, std::nothrow_t const &) noexcept {
+    return qor_malloc(_size);
+}
+
+void CWindow::operator delete(void *_p) noexcept {
+    qor_free(_p);
+}
+
+void CWindow::operator delete(void *_p, std::nothrow_t const &) noexcept {
+    qor_free(_p);
+}
+
+CWindow::CWindow(CDesktop *_p_desktop, char const *_name)
     : m_dbg_lock_hide(false), m_id(_name), mp_parent(nullptr), mp_desktop(_p_desktop), m_is_hidden(false),
       m_is_disabled(false), m_is_passive(false), m_auto_delete(false), m_pointer_capture(false),
       m_is_maximaized(false), m_always_on_top(false), m_is_modal(false), m_can_drag(false),
@@ -413,6 +430,18 @@ char const *string_or_empty(LuaPlus::LuaObject const &_lo_value) {
     return _lo_value.IsString() ? _lo_value.GetString() : "";
 }
 
+// The walk of one layout through the tree. A layout that contains itself, or one whose shared
+// tables multiply the work, ends at these limits with one report; what was loaded stays.
+int const k_max_layout_depth = 64;
+unsigned const k_max_layout_entries = 65536;
+
+struct SLayoutWalk {
+    int m_depth;
+    unsigned m_entries;
+    bool m_stopped;
+};
+SLayoutWalk s_walk = {0, 0, false}; // the tree has one thread
+
 } // namespace
 
 void CWindow::save_state(LuaPlus::LuaObject &_lo_table) {
@@ -461,6 +490,7 @@ void CWindow::load_state(LuaPlus::LuaObject &_lo_table) {
 // numbers, the order in which save_state wrote them (a Lua table walks its hash part in no
 // particular order), so that a layout loaded and saved again keeps its children's order.
 void CWindow::load_children(LuaPlus::LuaObject &_lo_table) {
+    if (s_walk.m_depth == 0) s_walk = SLayoutWalk{0, 0, false};
     std::vector<std::pair<double, LuaPlus::LuaObject>> entries;
     for_each_entry(_lo_table, [&entries](LuaPlus::LuaObject const &key, LuaPlus::LuaObject const &value) {
         if (!key.IsString()) entries.emplace_back(key.IsNumber() ? key.GetNumber() : 0.0, value);
@@ -473,9 +503,19 @@ void CWindow::load_children(LuaPlus::LuaObject &_lo_table) {
     }
 }
 
+// A table without a name or a class makes nothing.
 void CWindow::load_child(LuaPlus::LuaObject &_lo_child) {
-    char const *p_name = string_or_empty(_lo_child.GetByName("name"));
-    char const *p_class_name = string_or_empty(_lo_child.GetByName("class_name"));
+    if (s_walk.m_stopped) return;
+    if (s_walk.m_depth >= k_max_layout_depth || ++s_walk.m_entries > k_max_layout_entries) {
+        s_walk.m_stopped = true;
+        qordebug::warning("UI: Layout too deep or too large at window '%s'; the rest is skipped", get_name());
+        return;
+    }
+    LuaPlus::LuaObject const name = _lo_child.GetByName("name"),
+                             class_name = _lo_child.GetByName("class_name");
+    if (!name.IsString() || !class_name.IsString()) return;
+    char const *p_name = name.GetString();
+    char const *p_class_name = class_name.GetString();
     CWindow *p_child = get_child(p_name, p_class_name, true);
     if (!p_child) {
         p_child = get_windows_factory().Create(HUID(p_class_name), mp_desktop, p_name);
@@ -484,16 +524,18 @@ void CWindow::load_child(LuaPlus::LuaObject &_lo_child) {
         send_event(p_child, EVENT_ENABLE, CWndEvent::DISPATCH_NONE);
         send_event(p_child, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
     }
+    ++s_walk.m_depth;
     p_child->load_state(_lo_child);
+    --s_walk.m_depth;
 }
 
 void CWindow::import(int, char const *_file) {
     LuaPlus::LuaState &lua = lua_machine();
-    lua.DoString("ui_material_presets = nil");
-    if (lua.DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua") != 0)
+    lua.DoString("ui_material_presets = nil", true);
+    if (lua.DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua", true) != 0)
         qordebug::error("UI: File '%s' not found", "ui_material_presets.lua");
-    lua.DoString("ui_windows_ini = nil");
-    if (_file) lua.DoFile(qorbase::FILE_CATEGORY_UI, _file);
+    lua.DoString("ui_windows_ini = nil", true);
+    if (_file) lua.DoFile(qorbase::FILE_CATEGORY_UI, _file, true);
     LuaPlus::LuaObject layout = lua.GetGlobals().GetByName("ui_windows_ini");
     if (!layout.IsTable()) return;
     load_state(layout);
@@ -513,7 +555,7 @@ void CWindowsFactory::Register(HUID const &_class_name, window_creator_t _creato
     m_creators[_class_name] = _creator;
 }
 
-CWindow *CWindowsFactory::Create(HUID const &_class_name, IWindowDesktop *_p_desktop, char const *_name) {
+CWindow *CWindowsFactory::Create(HUID const &_class_name, CDesktop *_p_desktop, char const *_name) {
     auto const found = m_creators.find(_class_name);
     return found == m_creators.end() ? nullptr : found->second(_p_desktop, _name);
 }

@@ -22,6 +22,7 @@
 #include "ui_static_text.h"
 #include "ui_string.h"
 #include "ui_text.h"
+#include "ui_desktop.h"
 
 #include <algorithm>
 #include <cstdlib>
@@ -62,7 +63,7 @@ void for_each_named(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
 // Construction and destruction
 // ---------------------------------------------------------------------------------------------
 
-CWindowVisual::CWindowVisual(IWindowDesktop *_p_desktop, char const *_name)
+CWindowVisual::CWindowVisual(CDesktop *_p_desktop, char const *_name)
     : CWindow(_p_desktop, _name), m_is_highlighted(false), m_is_pushed(false), m_is_checked(false),
       m_top_margin(0), m_bottom_margin(0), m_left_margin(0), m_right_margin(0), m_z_order(0),
       m_visual_delta_left(0), m_visual_delta_top(0), m_visual_delta_right(0), m_visual_delta_bottom(0),
@@ -317,10 +318,12 @@ void CWindowVisual::update_movement() {
         m_movement_start = k_no_movement;
         return;
     }
-    float const f = static_cast<float>(t) / static_cast<float>(m_movement_time);
+    // In floats, the product before the division: t / T first lands a pixel short at some steps.
+    float const elapsed = static_cast<float>(t), total = static_cast<float>(m_movement_time);
     SRect const &o = m_movement_origin, &d = m_movement_destination;
-    auto step = [f](int _from, int _to) {
-        return static_cast<int>(_from + f * static_cast<float>(_to - _from));
+    auto step = [elapsed, total](int _from, int _to) {
+        return trunc_to_int(static_cast<float>(_from) +
+                            elapsed * (static_cast<float>(_to) - static_cast<float>(_from)) / total);
     };
     set_pos(step(o.x, d.x), step(o.y, d.y));
     set_size(step(o.w, d.w), step(o.h, d.h));
@@ -390,8 +393,8 @@ void CWindowVisual::load_sounds(LuaPlus::LuaObject &_lo_table) {
 
 void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaObject const &_lo_entry) {
     LuaPlus::LuaObject const files = _lo_entry.GetByName("file_names");
-    LuaPlus::LuaObject const volume = _lo_entry.GetByName("volume");
-    if (!files.IsTable() || files.GetTableCount() < 1 || !volume.IsNumber()) return;
+    float volume;
+    if (!files.IsTable() || files.GetTableCount() < 1 || !read_float(_lo_entry, "volume", volume)) return;
     SSound sound; // its defaults stand for the keys that are missing
     bool looping = false;
     read_bool(_lo_entry, "looping", looping);
@@ -419,7 +422,7 @@ void CWindowVisual::load_sound(LuaPlus::LuaObject const &_lo_key, LuaPlus::LuaOb
             ui_logger().log_message("Cannot create sound source from file '%s'", file.GetString());
             return;
         }
-        p_source->set_volume(volume.GetFloat() + 1.0f);
+        p_source->set_volume(volume + 1.0f);
         p_source->set_option(SOUND_OPTION_INTERFACE);
         p_source->set_looping(looping);
         sound.m_sources.emplace_back(file.GetString(), p_source);
@@ -518,13 +521,14 @@ void CWindowVisual::load_state(LuaPlus::LuaObject &_lo_table) {
     LuaPlus::LuaObject const fonts = _lo_table.GetByName("fonts");
     if (fonts.IsTable()) load_fonts(fonts);
     load_sounds(_lo_table);
-    LuaPlus::LuaObject const z_order = _lo_table.GetByName("z_order");
-    if (z_order.IsNumber()) m_z_order = static_cast<unsigned>(z_order.GetNumber());
+    int z_order;
+    if (read_int(_lo_table, "z_order", z_order)) m_z_order = static_cast<unsigned>(z_order);
     LuaPlus::LuaObject const auto_hide = _lo_table.GetByName("auto_hide");
     if (auto_hide.IsBoolean()) {
         m_auto_hide = auto_hide.GetBoolean();
-        LuaPlus::LuaObject const time = _lo_table.GetByName("auto_hide_time");
-        if (m_auto_hide && time.IsInteger()) m_auto_hide_time = static_cast<unsigned>(time.GetInteger());
+        int time;
+        if (m_auto_hide && read_integer(_lo_table, "auto_hide_time", time))
+            m_auto_hide_time = static_cast<unsigned>(time);
     }
     read_int(_lo_table, "top_margin", m_top_margin);
     read_int(_lo_table, "bottom_margin", m_bottom_margin);

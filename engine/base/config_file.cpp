@@ -12,6 +12,7 @@
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <vector>
 
 namespace qorbase {
 
@@ -240,28 +241,53 @@ bool read_text_file(std::string const &_path, std::string &_text) {
     return ok;
 }
 
-bool write_file_atomically(std::string const &_path, void const *_p_data, size_t _size) {
-    make_folders(_path);
-    std::string const temporary = _path + ".tmp";
-    int const fd = open(temporary.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
-    if (fd < 0) return false;
+namespace {
+
+// The whole buffer to _fd; false on a write error.
+bool write_all(int _fd, void const *_p_data, size_t _size) {
     char const *p = static_cast<char const *>(_p_data);
-    size_t left = _size;
-    while (left > 0) {
-        ssize_t const written = ::write(fd, p, left);
+    while (_size > 0) {
+        ssize_t const written = ::write(_fd, p, _size);
         if (written < 0 && errno == EINTR) continue;
-        if (written <= 0) break;
+        if (written <= 0) return false;
         p += written;
-        left -= static_cast<size_t>(written);
-    }
-    // The data reaches the disk before the rename makes it the file.
-    bool const complete = left == 0 && fsync(fd) == 0;
-    close(fd);
-    if (!complete || rename(temporary.c_str(), _path.c_str()) != 0) {
-        unlink(temporary.c_str());
-        return false;
+        _size -= static_cast<size_t>(written);
     }
     return true;
+}
+
+// A new temporary file beside _path with the content, on the disk; its name in _temporary.
+bool write_temporary(SFileContent const &_file, std::string &_temporary) {
+    make_folders(_file.m_path);
+    std::string name = _file.m_path + ".XXXXXX";
+    int const fd = mkstemp(&name[0]);
+    if (fd < 0) return false;
+    _temporary = name;
+    // The data reaches the disk before a rename makes it the file.
+    bool const complete =
+        fchmod(fd, 0644) == 0 && write_all(fd, _file.mp_data, _file.m_size) && fsync(fd) == 0;
+    return close(fd) == 0 && complete;
+}
+
+} // namespace
+
+bool write_files_atomically(SFileContent const *_p_files, size_t _count) {
+    std::vector<std::string> temporaries(_count);
+    bool complete = true;
+    for (size_t i = 0; i < _count && complete; ++i)
+        complete = write_temporary(_p_files[i], temporaries[i]);
+    for (size_t i = 0; i < _count && complete; ++i)
+        complete = rename(temporaries[i].c_str(), _p_files[i].m_path.c_str()) == 0;
+    int const error = errno;
+    for (std::string const &temporary : temporaries)
+        if (!temporary.empty()) unlink(temporary.c_str()); // gone already after its rename
+    errno = error;
+    return complete;
+}
+
+bool write_file_atomically(std::string const &_path, void const *_p_data, size_t _size) {
+    SFileContent const file = {_path, _p_data, _size};
+    return write_files_atomically(&file, 1);
 }
 
 } // namespace qorbase

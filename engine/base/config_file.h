@@ -93,7 +93,5 @@ int open_regular_file(std::string const &_path, size_t *_p_size);
 bool read_exactly(int _fd, void *_p_buffer, size_t _size);
 // Reads a whole regular file; false when it can't be read.
 bool read_text_file(std::string const &_path, std::string &_text);
-// Writes through "<path>.tmp", fsync and rename, creating missing folders; false on failure.
-bool write_file_atomically(std::string const &_path, void const *_p_data, size_t _size);
 
 } // namespace qorbase

@@ -19,6 +19,7 @@
 #include <map>
 #include <string>
 #include <unistd.h>
+#include <vector>
 
 namespace qorbase {
 
@@ -166,14 +167,27 @@ public:
     }
 
     void save_file(int _category, char const *_path, void const *_p_data, unsigned _size, int) override {
-        if (!_path || (!_p_data && _size)) {
-            qordebug::assert_func("Expression:   %s, \nFile: %s \nLine: %d\nFunction %s",
-                                  "_path && (_p_data || !_size)", __FILE__, __LINE__, __func__);
-            return;
+        SFileToSave const file = {_category, _path, _p_data, _size};
+        save_files(&file, 1);
+    }
+
+    bool save_files(SFileToSave const *_p_files, unsigned _count) override {
+        std::vector<SFileContent> contents;
+        for (unsigned i = 0; i < _count; ++i) {
+            SFileToSave const &file = _p_files[i];
+            if (!file.mp_path || (!file.mp_data && file.m_size)) {
+                qordebug::assert_func("Expression:   %s, \nFile: %s \nLine: %d\nFunction %s",
+                                      "_path && (_p_data || !_size)", __FILE__, __LINE__, __func__);
+                return false;
+            }
+            contents.push_back(
+                SFileContent{full_path(file.m_category, file.mp_path), file.mp_data, file.m_size});
         }
-        std::string const path = full_path(_category, _path);
-        if (!write_file_atomically(path, _p_data, _size))
-            qordebug::warning("Cannot save file '%s': %s", path.c_str(), strerror(errno));
+        if (write_files_atomically(contents.data(), contents.size())) return true;
+        int const error = errno;
+        for (SFileContent const &content : contents)
+            qordebug::warning("Cannot save file '%s': %s", content.m_path.c_str(), strerror(error));
+        return false;
     }
 
     // The sink gets the line without its line break; stdout gets one after every line.

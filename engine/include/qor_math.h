@@ -1,6 +1,7 @@
 // The engine's small math types that cross module boundaries: texture coordinates, movements and
 // device positions (vec2_t), and vertex colours (rgba_t). Global namespace, as the engine has them.
 #pragma once
+#include <climits>
 
 struct vec2_t {
     float x;
@@ -42,3 +43,12 @@ private:
         return static_cast<unsigned char>(v);
     }
 };
+
+// A float to an int by cutting toward zero, held at the ends of int's range; NaN gives 0. For
+// values that come from data, where a plain conversion of a value out of range is undefined.
+inline int trunc_to_int(double _v) {
+    if (!(_v == _v)) return 0;
+    if (_v >= static_cast<double>(INT_MAX)) return INT_MAX;
+    if (_v <= static_cast<double>(INT_MIN)) return INT_MIN;
+    return static_cast<int>(_v);
+}

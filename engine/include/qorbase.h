@@ -11,6 +11,9 @@
 #pragma once
 #include "qor_math.h"
 
+#include <cstddef>
+#include <string>
+
 class IConfigValue {
 public:
     virtual vec2_t get_vec2(float _default_x, float _default_y) = 0;
@@ -65,6 +68,14 @@ public:
     virtual unsigned read(unsigned _count, void *_p_buffer) = 0;
 };
 
+// One file of IFileSystem::save_files.
+struct SFileToSave {
+    int m_category;
+    char const *mp_path;
+    void const *mp_data;
+    unsigned m_size;
+};
+
 class IFileSystem {
 public:
     // Result: the file's size, 0 when there's none. *_pp_content takes the content, allocated
@@ -76,6 +87,9 @@ public:
     // Writes through a temporary file and a rename; folders are created as needed.
     virtual void save_file(int _category, char const *_path, void const *_p_data, unsigned _size,
                            int _reserved) = 0;
+    // Several files replaced together (qorbase::write_files_atomically): none when any fails,
+    // which is reported with qordebug::warning.
+    virtual bool save_files(SFileToSave const *_p_files, unsigned _count) = 0;
     // One line to the engine's log (the installed log sink, stdout by default).
     virtual void log(char const *_format, ...) __attribute__((format(printf, 2, 3))) = 0;
     // Null when the file can't be opened. The caller deletes the reader.
@@ -140,6 +154,18 @@ IConfigSection *find_config_section(char const *_section);
 // configuration, the section or the key. Reading creates nothing; the text belongs to the
 // configuration.
 char const *get_config_string(char const *_section, char const *_key, char const *_default);
+
+// Files that must never be seen half-written: each is written to a temporary file beside it,
+// flushed to the disk, and renamed over the old one, creating missing folders. With several files
+// all temporaries are complete before the first rename; a failure before the renames replaces
+// none (errno tells why). False on any failure.
+struct SFileContent {
+    std::string m_path;
+    void const *mp_data;
+    size_t m_size;
+};
+bool write_files_atomically(SFileContent const *_p_files, size_t _count);
+bool write_file_atomically(std::string const &_path, void const *_p_data, size_t _size);
 
 // Where IFileSystem::log writes; null restores stdout.
 typedef void (*log_sink_t)(char const *_line, void *_user);

@@ -47,11 +47,10 @@ void cmd_gameui_demo(char const *_arguments, void *) {
 // the windows factory as "DemoText", so layouts can make it and keep its "text".
 class CDemoText : public CWindowVisual {
 public:
-    CDemoText(IWindowDesktop *_p_desktop, char const *_name) : CWindowVisual(_p_desktop, _name) {
+    CDemoText(CDesktop *_p_desktop, char const *_name) : CWindowVisual(_p_desktop, _name) {
         set_passive(true);
     }
-    CDemoText(IWindowDesktop *_p_desktop, char const *_name, char const *_text)
-        : CDemoText(_p_desktop, _name) {
+    CDemoText(CDesktop *_p_desktop, char const *_name, char const *_text) : CDemoText(_p_desktop, _name) {
         m_text = CString(_text);
     }
 

@@ -32,9 +32,7 @@ LuaPlus::LuaObject layout(char const *_table) {
 // Only a class of the family can break the range: the setters never do.
 class CBrokenRange : public CValueBar {
 public:
-    CBrokenRange(IWindowDesktop *_p_desktop) : CValueBar(_p_desktop, "broken") {
-        m_min = 10.0f, m_max = 0.0f;
-    }
+    CBrokenRange(CDesktop *_p_desktop) : CValueBar(_p_desktop, "broken") { m_min = 10.0f, m_max = 0.0f; }
 };
 
 } // namespace

@@ -50,7 +50,7 @@ protected:
 };
 
 // The events that pass a window with the given flags, found by sending each one.
-std::vector<int> passing_events(IWindowDesktop *_p_desktop, bool _hidden, bool _disabled) {
+std::vector<int> passing_events(CDesktop *_p_desktop, bool _hidden, bool _disabled) {
     std::vector<int> passed;
     for (int id = EVENT_UPDATE; id <= EVENT_RESOURCE_INVALIDATE; ++id) {
         if (id == 29 || id == 30) continue; // no events of these values
@@ -111,7 +111,7 @@ TEST_F(WindowTest, AnEventRisingToTheRootNamesEachParentAsActivator) {
 }
 
 TEST_F(WindowTest, HiddenAndDisabledWindowsTakeOnlyTheirListedEvents) {
-    IWindowDesktop *p_desktop = &m_world.desktop();
+    CDesktop *p_desktop = &m_world.desktop();
     EXPECT_EQ((std::vector<int>{EVENT_UPDATE, EVENT_SHOW, EVENT_ENABLE, EVENT_DISABLE, EVENT_RESIZED,
                                 EVENT_SET_TEXT, EVENT_RESOURCE_INVALIDATE}),
               passing_events(p_desktop, true, false));
@@ -407,7 +407,7 @@ TEST_F(LayoutTest, UnknownClassesAreSkippedAndTheFactoryMakesTheRest) {
 
     static int s_made = 0;
     get_windows_factory().Register(HUID("TestCounted"), nullptr);
-    get_windows_factory().Register(HUID("testcounted"), [](IWindowDesktop *p_desktop, char const *p_name) {
+    get_windows_factory().Register(HUID("testcounted"), [](CDesktop *p_desktop, char const *p_name) {
         ++s_made;
         return new CWindow(p_desktop, p_name);
     });

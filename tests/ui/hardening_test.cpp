@@ -1,0 +1,253 @@
+// Bad data that once crashed, hung or corrupted: numbers out of range in layouts, layouts that
+// contain themselves, giant fonts and tiles, long keys of strings files, failed exports; and the
+// places where the library's arithmetic and file handling were made exact.
+#include "qorMemoryManager.h"
+#include "qorbase.h"
+#include "test_world.h"
+#include "ui_canvas.h"
+#include "ui_font.h"
+#include "ui_local_strings.h"
+#include "ui_material.h"
+#include "ui_window_visual.h"
+
+#include <gtest/gtest.h>
+
+#include <sstream>
+#include <type_traits>
+
+using namespace qorui;
+
+namespace {
+
+class HardeningTest : public ::testing::Test {
+protected:
+    CWindowVisual *child(char const *_name, int _w = 100, int _h = 50) {
+        return m_world.place(&m_world.desktop(), new CWindowVisual(&m_world.desktop(), _name), 5, 6, _w, _h);
+    }
+    static std::string dumped(LuaPlus::LuaObject const &_lo_table) {
+        std::ostringstream text;
+        _lo_table.dump("t", text);
+        return text.str();
+    }
+    static unsigned depth(CWindow *_p_wnd) {
+        unsigned levels = 0;
+        for (; _p_wnd->get_children_count() > 0; _p_wnd = _p_wnd->get_child(0u))
+            ++levels;
+        return levels;
+    }
+
+    qortest::CWorld m_world;
+};
+
+} // namespace
+
+// Each number out of range is one warning, and the window stays as it was in every field.
+TEST_F(HardeningTest, NumbersOutOfRangeAreReportedAndLeaveTheWindowAsItWas) {
+    struct {
+        char const *mp_keys;
+        size_t mn_warnings;
+    } const rows[] = {
+        {"pos = { 0/0, 1e10 }", 2},
+        {"size = { -1e10, 1/0 }", 2},
+        {"z_order = -1e12", 1},
+        {"fade_in = 0/0, fade_out = 1e300, top_margin = -1/0", 3},
+        {"movement = { pos = { 1e10, 0/0 }, size = { 1e300, -1e300 }, time = 1e10 }", 5},
+        {"materials = { normal = { color = { r = 1e10, g = 0/0, b = -1e10, a = 1/0 }, pos = { 0/0, 0 } } }",
+         5},
+        {"events_sounds = { EVENT_CLICK = { file_names = { 'click.wav' }, volume = 0/0 } }", 1},
+    };
+    CWindowVisual *p_wnd = child("w");
+    qortest::load_state(p_wnd, "{ name = 'w', class_name = 'WindowVisual', z_order = 3,"
+                               " movement = { pos = { 1, 2 }, size = { 3, 4 }, time = 5 },"
+                               " materials = { normal = { color = { r = 1, g = 2, b = 3, a = 4 } } } }");
+    std::string const before = dumped(qortest::saved_state(p_wnd));
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.mp_keys);
+        qortest::CReportCapture capture;
+        qortest::load_state(p_wnd,
+                            std::string("{ name = 'w', class_name = 'WindowVisual', ") + row.mp_keys + " }");
+        EXPECT_EQ(row.mn_warnings, capture.warnings().size());
+        EXPECT_EQ(before, dumped(qortest::saved_state(p_wnd)));
+    }
+}
+
+// A layout that contains itself, twice over, and one a thousand levels deep: the walk stops with
+// one report at its depth limit, and what it loaded stays.
+TEST_F(HardeningTest, LayoutsThatContainThemselvesOrNestTooDeepStopWithAReport) {
+    struct {
+        char const *mp_chunk;
+    } const rows[] = {
+        {"local w = { name = 'cycle', class_name = 'WindowVisual' }; w[1] = w; w[2] = w; hardening = w"},
+        {"local w = { name = 'deep', class_name = 'Window' }; hardening = w;"
+         " for i = 1, 1000 do local c = { name = 'deep', class_name = 'Window' }; w[1] = c; w = c end"},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.mp_chunk);
+        CWindowVisual *p_root = new CWindowVisual(&m_world.desktop(), "");
+        ASSERT_EQ(0, lua_machine().DoString(row.mp_chunk));
+        LuaPlus::LuaObject layout = lua_machine().GetGlobals().GetByName("hardening");
+        layout.SetString("name", "");
+        layout.SetString("class_name", "WindowVisual");
+        qortest::CReportCapture capture;
+        p_root->load_state(layout);
+        EXPECT_EQ(1u, capture.warnings().size());
+        EXPECT_EQ(64u, depth(p_root));
+        delete p_root;
+    }
+}
+
+TEST_F(HardeningTest, AChildWithoutNameOrClassMakesNothing) {
+    for (char const *p_child :
+         {"{ class_name = 'WindowVisual' }", "{ name = 'x' }", "{ name = 1, class_name = 'Window' }"}) {
+        SCOPED_TRACE(p_child);
+        CWindowVisual *p_wnd = child("parent");
+        qortest::load_state(p_wnd,
+                            std::string("{ name = 'parent', class_name = 'WindowVisual', ") + p_child + " }");
+        EXPECT_EQ(0u, p_wnd->get_children_count());
+        delete p_wnd;
+    }
+}
+
+// Each step is origin + t * (destination - origin) / T in floats: from 20 to 320 in 300 ms.
+TEST_F(HardeningTest, AMovementStepMultipliesBeforeItDivides) {
+    CWindowVisual *p_wnd = child("slider", 10, 10);
+    qortest::load_state(p_wnd, "{ name = 'slider', class_name = 'WindowVisual',"
+                               " movement = { pos = { 320, 6 }, size = { 10, 10 }, time = 300 } }");
+    for (unsigned t : {89u, 98u, 159u, 177u, 300u}) {
+        SCOPED_TRACE(t);
+        p_wnd->set_pos(20, 6);
+        p_wnd->send_event(p_wnd, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
+        m_world.clock().advance_ms(t);
+        p_wnd->send_event(p_wnd, EVENT_UPDATE, CWndEvent::DISPATCH_NONE);
+        EXPECT_EQ(static_cast<int>(20 + t), p_wnd->get_pos().x);
+    }
+}
+
+// The numbers of a colour tag are read up to the end of the string, past any blanks.
+TEST_F(HardeningTest, AColourTagIsReadWhateverItsLength) {
+    CWindowVisual *p_wnd = child("text", 300, 40);
+    CFont *p_font = get_fonts_factory().create("arial_white", &m_world.desktop());
+    ASSERT_NE(nullptr, p_font);
+    for (std::string const pad :
+         {" ", std::string(70, ' '), std::string(300, ' ') + "+00000000000000000000"}) {
+        SCOPED_TRACE(pad.size());
+        m_world.recorder().clear();
+        p_wnd->get_canvas().text_out(0, 0, CString(("<color" + pad + "255 1 2 3>x").c_str()), p_font);
+        ASSERT_EQ(2u, m_world.recorder().calls().size()); // set_material, then one quad
+        EXPECT_EQ(rgba_t(255, 1, 2, 3), m_world.recorder().calls().back().m_colours[0]);
+    }
+    delete p_font;
+}
+
+// A font of the greatest size that data may give: the pen never wraps, the frame completes.
+TEST_F(HardeningTest, AGiantFontKeepsItsPenOnTheLine) {
+    CWindowVisual *p_wnd = child("text", 300, 40);
+    CFont *p_font = get_fonts_factory().create("arial_white", &m_world.desktop());
+    ASSERT_NE(nullptr, p_font);
+    p_font->set_size(16777216.0f);
+    m_world.recorder().clear();
+    p_wnd->get_canvas().text_out(-100, 0, CString(std::string(300, 'W').c_str()), p_font);
+    int left = -200;
+    for (auto const &drawn : m_world.drawn()) {
+        EXPECT_LE(left, drawn.m_rect.x);
+        left = drawn.m_rect.x;
+    }
+    EXPECT_GT(left, 0);
+    EXPECT_GE(p_wnd->get_canvas().get_text_width(CString(std::string(300, 'W').c_str()), p_font), left);
+    m_world.frame();
+    delete p_font;
+}
+
+// A tiny tile over a huge area draws only the tiles that the screen shows.
+TEST_F(HardeningTest, TilesStopAtTheScreen) {
+    CWindowVisual *p_wnd = child("tiles");
+    CMaterial *p_material = m_world.colour(9, 9, 9);
+    struct {
+        int m_x, m_y, m_w, m_h;
+        size_t mn_quads;
+    } const rows[] = {
+        {-3, -1, 100000000, 100000000, 160u * 120u},
+        {300, 230, 100000000, 100000000, 10u * 5u},
+        {400, 0, 100, 100, 0u},
+        {0, 0, 4, 3, 2u * 2u},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_x);
+        m_world.recorder().clear();
+        p_wnd->get_canvas().draw_tiled(row.m_x, row.m_y, row.m_w, row.m_h, 0, 0, 1, 1, 2, 2, p_material);
+        size_t quads = 0;
+        for (auto const &call : m_world.recorder().calls())
+            quads += call.m_op == "draw_quad";
+        EXPECT_EQ(row.mn_quads, quads);
+    }
+    delete p_material;
+}
+
+TEST_F(HardeningTest, AStringsKeyTooLongForItsNarrowFormIsReportedAndSkipped) {
+    std::string const dir = qortest::make_temp_dir();
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, dir.c_str());
+    qortest::write_file(dir + "/long.lang", std::string(255, 'K') + " \"fits\"\n" + std::string(256, 'L') +
+                                                " \"too long\"\nOK \"yes\"\n");
+    qortest::CReportCapture capture;
+    local_strings_t table;
+    read_local_strings(GetFileSystem()->open_file(qorbase::FILE_CATEGORY_UI, "long.lang"), "long.lang",
+                       table);
+    EXPECT_EQ(2u, table.size());
+    EXPECT_EQ(1u, table.count(string(255, 'K')));
+    ASSERT_EQ(1u, capture.warnings().size());
+    EXPECT_NE(std::string::npos, capture.warnings()[0].find("Cannot load string 2"));
+    EXPECT_TRUE(capture.asserts().empty());
+}
+
+// The script module stays quiet under the import: a missing layout says nothing, missing presets
+// only the library's own error.
+TEST_F(HardeningTest, AnImportReportsOnlyWhatTheLibrarySays) {
+    std::string const dir = qortest::make_temp_dir();
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, dir.c_str());
+    qortest::CReportCapture capture;
+    m_world.desktop().import(qorbase::FILE_CATEGORY_UI, "missing.lua");
+    EXPECT_EQ((std::vector<std::string>{"UI: File 'ui_material_presets.lua' not found"}), capture.errors());
+    EXPECT_TRUE(capture.warnings().empty());
+    capture.clear();
+    qortest::write_file(dir + "/ui_material_presets.lua", "ui_material_presets = {}");
+    m_world.desktop().import(qorbase::FILE_CATEGORY_UI, "missing.lua");
+    EXPECT_TRUE(capture.reports().empty());
+}
+
+// A layout that can't be written leaves both files as they were; a good export replaces both.
+TEST_F(HardeningTest, AnExportReplacesBothFilesOrNeither) {
+    std::string const dir = qortest::make_temp_dir();
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, dir.c_str());
+    qortest::write_file(dir + "/ui_material_presets.lua", "old presets");
+    qortest::write_file(dir + "/blocked", "a file where a folder should be");
+    {
+        qortest::CReportCapture capture;
+        m_world.desktop().export_layout(qorbase::FILE_CATEGORY_UI, "blocked/layout.lua");
+        EXPECT_FALSE(capture.warnings().empty());
+    }
+    EXPECT_EQ("old presets", qortest::read_file(dir + "/ui_material_presets.lua"));
+    m_world.desktop().export_layout(qorbase::FILE_CATEGORY_UI, "layout.lua");
+    EXPECT_EQ(0u, qortest::read_file(dir + "/ui_material_presets.lua").find("ui_material_presets = "));
+    EXPECT_EQ(0u, qortest::read_file(dir + "/layout.lua").find("ui_windows_ini = "));
+    EXPECT_EQ(3u,
+              std::distance(std::filesystem::directory_iterator(dir), std::filesystem::directory_iterator()));
+}
+
+// A game's window class, made by its own code's new and written against the desktop itself.
+namespace {
+CWindow *create_game_window(CDesktop *_p_desktop, char const *_name) {
+    return new CWindowVisual(_p_desktop, _name);
+}
+} // namespace
+
+TEST_F(HardeningTest, AGameMakesWindowsOnTheLibrarysHeapAndSeesTheDesktop) {
+    static_assert(std::is_same<decltype(std::declval<CWindow &>().get_desktop()), CDesktop *>::value,
+                  "get_desktop gives the desktop");
+    get_windows_factory().Register(HUID("GameWindow"), &create_game_window);
+    CWindow *p_wnd = get_windows_factory().Create(HUID("GameWindow"), &m_world.desktop(), "game");
+    ASSERT_NE(nullptr, p_wnd);
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_wnd));
+    m_world.desktop().attach_child(p_wnd);
+    p_wnd->get_desktop()->set_active_window(p_wnd);
+    EXPECT_EQ(p_wnd, m_world.desktop().get_active_window());
+}
