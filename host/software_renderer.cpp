@@ -267,13 +267,14 @@ void CSoftwareRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, ve
     long long const last = static_cast<long long>(std::ceil(t_hi * steps));
     SMaterial const ui_color = {false, nullptr};
     for (long long i = first; i <= last; ++i) {
-        float const t = steps > 0.0 ? static_cast<float>(i) / static_cast<float>(steps) : 0.0f;
+        // In double: far ends need more than a float's digits to land on the right pixel.
+        double const t = steps > 0.0 ? static_cast<double>(i) / steps : 0.0;
         int const x = trunc_to_int(std::round(ax + (bx - ax) * t));
         int const y = trunc_to_int(std::round(ay + (by - ay) * t));
         if (x < m_clip.m_x0 || x >= m_clip.m_x1 || y < m_clip.m_y0 || y >= m_clip.m_y1) continue;
         float rgba[4];
         for (int c = 0; c < 4; ++c)
-            rgba[c] = a.m_rgba[c] + (b.m_rgba[c] - a.m_rgba[c]) * t;
+            rgba[c] = a.m_rgba[c] + (b.m_rgba[c] - a.m_rgba[c]) * static_cast<float>(t);
         blend(x, y, rgba, &ui_color, 0.0f, 0.0f);
     }
 }

@@ -1,5 +1,6 @@
 // A charset file of the type "nehe": read, and every character of the input looked up.
 #include "fuzz_world.h"
+#include "engine_interfaces.h"
 #include "qorbase.h"
 #include "qorscriptsystem.h"
 #include "ui_font.h"
@@ -31,7 +32,8 @@ std::string const &font_dir() {
 
 extern "C" int LLVMFuzzerTestOneInput(uint8_t const *_p_data, size_t _size) {
     qorfuzz::init();
-    std::ofstream(font_dir() + "/fuzz.fnt", std::ios::binary).write(reinterpret_cast<char const *>(_p_data), _size);
+    std::ofstream(font_dir() + "/fuzz.fnt", std::ios::binary)
+        .write(reinterpret_cast<char const *>(_p_data), _size);
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, font_dir().c_str());
     LuaPlus::LuaObject entry;
     entry.AssignNewTable(&qorui::lua_machine());

@@ -1,5 +1,6 @@
 // A fonts.lua: every font it names made and drawn with, then the real file again.
 #include "fuzz_world.h"
+#include "engine_interfaces.h"
 #include "LuaTableIterator.h"
 #include "ui_font.h"
 #include "ui_string.h"

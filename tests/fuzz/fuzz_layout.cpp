@@ -1,5 +1,6 @@
 // A layout file imported into a desktop, drawn twice and saved again.
 #include "fuzz_world.h"
+#include "engine_interfaces.h"
 #include "qorbase.h"
 #include "qorscriptsystem.h"
 

@@ -1,6 +1,7 @@
 // A presets file: each preset loaded as a material table of its own and by its name, and drawn
 // plain, stretched, tiled and as text.
 #include "fuzz_world.h"
+#include "engine_interfaces.h"
 #include "LuaTableIterator.h"
 #include "qorbase.h"
 #include "ui_material.h"
@@ -38,7 +39,8 @@ extern "C" int LLVMFuzzerTestOneInput(uint8_t const *_p_data, size_t _size) {
             p_wnd->get_canvas().draw_rect(-5, -5, 120, 70, p_material);
             p_wnd->get_canvas().draw_tiled(0, 0, 100, 60, p_material->get_tex_x(), p_material->get_tex_y(),
                                            p_material->get_tex_w(), p_material->get_tex_h(),
-                                           p_material->get_tex_real_w(), p_material->get_tex_real_h(), p_material);
+                                           p_material->get_tex_real_w(), p_material->get_tex_real_h(),
+                                           p_material);
             delete p_material;
         }
     }

@@ -121,11 +121,13 @@ std::string const &ui_dir() {
 }
 
 void write_ui_file(char const *_name, uint8_t const *_p_data, size_t _size) {
-    std::ofstream(ui_dir() + "/" + _name, std::ios::binary).write(reinterpret_cast<char const *>(_p_data), _size);
+    std::ofstream(ui_dir() + "/" + _name, std::ios::binary)
+        .write(reinterpret_cast<char const *>(_p_data), _size);
 }
 
 void restore_ui_file(char const *_name) {
-    fs::copy_file(k_source_data + "/ui/" + _name, ui_dir() + "/" + _name, fs::copy_options::overwrite_existing);
+    fs::copy_file(k_source_data + "/ui/" + _name, ui_dir() + "/" + _name,
+                  fs::copy_options::overwrite_existing);
 }
 
 CDesktop *new_desktop() {

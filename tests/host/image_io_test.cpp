@@ -131,7 +131,7 @@ TEST(Image, PngOfOneThreeOrFourChannelsBecomesRgbaAndRoundTrips) {
     expect_load_fails(dir.write("text.png", {'h', 'e', 'l', 'l', 'o', '\n'}));
     expect_load_fails(dir.path()); // a folder
     EXPECT_FALSE(write_png(dir.file("empty.png"), SImage()));
-    EXPECT_FALSE(write_png(dir.file("no/such/folder/out.png"), abc_def_image()));
+    EXPECT_FALSE(write_png(dir.file("text.png/out.png"), abc_def_image())); // under a file
 }
 
 TEST(Image, ComparisonCountsPixelsBeyondTheToleranceAndDrawsTheDifferences) {
