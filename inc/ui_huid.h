@@ -5,6 +5,7 @@
 //   HUID                 construction (hashes once), comparison by hash
 //   static names         MAT_NAME_* (28 materials) and FNT_NAME_* (7 fonts)
 #pragma once
+#include <cstddef>
 #include <cstdint>
 
 namespace qorui {
@@ -14,6 +15,8 @@ public:
     // Copies the name with its terminator and hashes it. A name of 120 bytes or more breaks the
     // contract: it is reported, its first 119 bytes are kept and the whole name is hashed.
     HUID(char const *_name);
+    // The longest name kept whole, in bytes.
+    static size_t const k_max_name = 119;
 
     // Compared by hash only, so "Window" == "WINDOW". The order is that of the unsigned hash.
     bool operator==(HUID const &_o) const { return m_hash == _o.m_hash; }
@@ -30,7 +33,7 @@ private:
     friend struct SStaticHuids;
     static char const *checked_name(char const *_name);
 
-    char m_name[120]; // zero-terminated, so 119 characters at most
+    char m_name[k_max_name + 1]; // zero-terminated
     uint64_t m_hash;
 };
 

@@ -1,8 +1,10 @@
 // The readers of typed fields of Lua tables and the writer of pairs, shared by every layout.
 #include "LuaTableIterator.h"
 #include "qordebug.h"
+#include "ui_huid.h"
 
 #include <cmath>
+#include <cstring>
 
 namespace qorui {
 
@@ -21,6 +23,17 @@ bool read_number(LuaPlus::LuaObject const &_lo_value, char const *_key, double &
         return false;
     }
     _number = number;
+    return true;
+}
+
+bool read_name(LuaPlus::LuaObject const &_lo_value, char const *&_name) {
+    if (!_lo_value.IsString()) return false;
+    char const *p_name = _lo_value.GetString();
+    if (strlen(p_name) > HUID::k_max_name) {
+        qordebug::warning("UI: Name too long: '%.40s...'", p_name);
+        return false;
+    }
+    _name = p_name;
     return true;
 }
 

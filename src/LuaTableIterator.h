@@ -22,6 +22,11 @@ void for_each_entry(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
 double const k_data_number_limit = 16777216.0; // 2^24: sums of positions stay far inside int
 bool read_number(LuaPlus::LuaObject const &_lo_value, char const *_key, double &_number);
 
+// The gate of names from data (windows, classes, materials, fonts): a string that fits a HUID, in
+// _name. A longer one is bad data: reported by a warning, and false. Not a string: false, with no
+// message.
+bool read_name(LuaPlus::LuaObject const &_lo_value, char const *&_name);
+
 // Each reader tells whether it took the value. Numbers go through read_number.
 bool read_bool(LuaPlus::LuaObject const &_lo_table, char const *_key, bool &_value);
 // A number, truncated toward zero.

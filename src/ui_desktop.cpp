@@ -18,7 +18,8 @@
 
 #include <algorithm>
 #include <cmath>
-#include <sstream>
+#include <ostream>
+#include <streambuf>
 
 namespace qorui {
 
@@ -405,6 +406,30 @@ void CDesktop::show_pointer() {
 // Layouts and helpers
 // ---------------------------------------------------------------------------------------------
 
+namespace {
+
+// An output stream's buffer in a string of the library's heap. A standard string stream grows its
+// buffer inside the C++ runtime, on the runtime's heap, and its string would then be freed here.
+class CStringOut : public std::streambuf {
+public:
+    string const &text() const { return m_text; }
+
+protected:
+    int_type overflow(int_type _c) override {
+        if (!traits_type::eq_int_type(_c, traits_type::eof())) m_text += traits_type::to_char_type(_c);
+        return traits_type::not_eof(_c);
+    }
+    std::streamsize xsputn(char const *_p, std::streamsize _count) override {
+        m_text.append(_p, static_cast<size_t>(_count));
+        return _count;
+    }
+
+private:
+    string m_text;
+};
+
+} // namespace
+
 void CDesktop::export_layout(int _category, char const *_file) {
     LuaPlus::LuaState &lua = lua_machine();
     LuaPlus::LuaObject windows, presets;
@@ -414,12 +439,13 @@ void CDesktop::export_layout(int _category, char const *_file) {
     save_state(windows);
     IFileSystem *p_files = GetFileSystem();
     if (!p_files || !_file) return;
-    std::ostringstream layout, presets_stream;
+    CStringOut layout, presets_out;
+    std::ostream layout_stream(&layout), presets_stream(&presets_out);
     lua.DoString("ui_windows_ini = nil", true);
-    windows.dump("ui_windows_ini", layout);
+    windows.dump("ui_windows_ini", layout_stream);
     lua.DoString("ui_material_presets = nil", true);
     presets.dump("ui_material_presets", presets_stream);
-    std::string const layout_text = layout.str(), presets_text = presets_stream.str();
+    string const &layout_text = layout.text(), &presets_text = presets_out.text();
     // Both files or neither: a layout that can't be written leaves the presets as they were.
     SFileToSave const files[] = {
         {_category, _file, layout_text.data(), static_cast<unsigned>(layout_text.size())},

@@ -84,7 +84,11 @@ void CCharset::read_nehe(char const *_p_text, unsigned _length) {
         if (key == "font_h") m_height = static_cast<float>(tokenizer.as_float());
         tokenizer.next();
     }
-    if (!QOR_CHECK(dimension > 0)) return;
+    if (dimension <= 0) { // bad data: the cells can't be laid out
+        qordebug::warning("Cannot load the charset '%s'\nbad 'dimension' record %d", m_name.c_str(),
+                          dimension);
+        return;
+    }
     m_height /= static_cast<float>(dimension);
     tokenizer.expect("[chars]");
     float const cells = static_cast<float>(dimension);

@@ -511,11 +511,10 @@ void CWindow::load_child(LuaPlus::LuaObject &_lo_child) {
         qordebug::warning("UI: Layout too deep or too large at window '%s'; the rest is skipped", get_name());
         return;
     }
-    LuaPlus::LuaObject const name = _lo_child.GetByName("name"),
-                             class_name = _lo_child.GetByName("class_name");
-    if (!name.IsString() || !class_name.IsString()) return;
-    char const *p_name = name.GetString();
-    char const *p_class_name = class_name.GetString();
+    char const *p_name = nullptr, *p_class_name = nullptr;
+    if (!read_name(_lo_child.GetByName("name"), p_name) ||
+        !read_name(_lo_child.GetByName("class_name"), p_class_name))
+        return;
     CWindow *p_child = get_child(p_name, p_class_name, true);
     if (!p_child) {
         p_child = get_windows_factory().Create(HUID(p_class_name), mp_desktop, p_name);

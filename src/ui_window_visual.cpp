@@ -53,7 +53,8 @@ void release_resource(CWindowVisual::SResource<TResource> &_entry) {
 template <class TVisit>
 void for_each_named(LuaPlus::LuaObject const &_lo_table, TVisit _visit) {
     for_each_entry(_lo_table, [&_visit](LuaPlus::LuaObject const &key, LuaPlus::LuaObject const &value) {
-        if (key.IsString()) _visit(key.GetString(), value);
+        char const *p_name;
+        if (read_name(key, p_name)) _visit(p_name, value);
     });
 }
 

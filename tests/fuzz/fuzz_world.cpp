@@ -170,8 +170,10 @@ void clean_output() {
     std::error_code ignored;
     fs::remove_all(ui_dir(), ignored);
     fs::copy(k_source_data + "/ui", ui_dir());
-    fs::remove_all(run_dir() + "/out", ignored);
     fs::create_directory(run_dir() + "/out", ignored);
+    for (fs::directory_entry const &entry : fs::directory_iterator(run_dir() + "/out", ignored))
+        if (entry.path().filename() != "qor.gdf")
+            fs::remove_all(entry.path(), ignored); // the host's copy stays
 }
 
 void restore_folders() {

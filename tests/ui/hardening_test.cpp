@@ -98,16 +98,51 @@ TEST_F(HardeningTest, LayoutsThatContainThemselvesOrNestTooDeepStopWithAReport) 
     }
 }
 
-TEST_F(HardeningTest, AChildWithoutNameOrClassMakesNothing) {
-    for (char const *p_child :
-         {"{ class_name = 'WindowVisual' }", "{ name = 'x' }", "{ name = 1, class_name = 'Window' }"}) {
-        SCOPED_TRACE(p_child);
+// A name too long for an identifier is reported as bad data, like any other that can't be used.
+TEST_F(HardeningTest, AChildWithoutAUsableNameOrClassMakesNothing) {
+    std::string const long_name(120, 'n');
+    struct {
+        std::string m_child;
+        size_t mn_warnings;
+    } const rows[] = {
+        {"{ class_name = 'WindowVisual' }", 0},
+        {"{ name = 'x' }", 0},
+        {"{ name = 1, class_name = 'Window' }", 0},
+        {"{ name = '" + long_name + "', class_name = 'Window' }", 1},
+        {"{ name = 'x', class_name = '" + long_name + "' }", 1},
+        {"{ name = 'x', class_name = 'WindowVisual', materials = { " + long_name + " = { color = {} } } }",
+         1},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_child);
         CWindowVisual *p_wnd = child("parent");
-        qortest::load_state(p_wnd,
-                            std::string("{ name = 'parent', class_name = 'WindowVisual', ") + p_child + " }");
-        EXPECT_EQ(0u, p_wnd->get_children_count());
+        qortest::CReportCapture capture;
+        qortest::load_state(p_wnd, "{ name = 'parent', class_name = 'WindowVisual', " + row.m_child + " }");
+        EXPECT_EQ(row.mn_warnings, capture.warnings().size());
+        EXPECT_TRUE(capture.asserts().empty());
+        size_t const made = row.m_child.find("materials") != std::string::npos ? 1u : 0u;
+        ASSERT_EQ(made, p_wnd->get_children_count());
         delete p_wnd;
     }
+}
+
+// A charset whose cells can't be laid out is bad data: reported, and the font has no characters.
+TEST_F(HardeningTest, ACharsetWithoutCellsIsReported) {
+    std::string const dir = qortest::make_temp_dir();
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, dir.c_str());
+    qortest::write_file(dir + "/broken.fnt", "[common]\ndimension = 0\nfont_h = 16\n[chars]\n65 = 8\n");
+    ASSERT_EQ(
+        0, lua_machine().DoString(
+               "charsets.broken = { file_type = 'nehe', file_name = 'broken.fnt' };"
+               " fonts.broken = { charset_name = 'broken', material = { material_template = 'ui_color' } }"));
+    qortest::CReportCapture capture;
+    CFont *p_font = get_fonts_factory().create("broken", &m_world.desktop());
+    ASSERT_NE(nullptr, p_font);
+    EXPECT_EQ(nullptr, p_font->get_char_description('A'));
+    EXPECT_EQ((std::vector<std::string>{"Cannot load the charset 'broken'\nbad 'dimension' record 0"}),
+              capture.warnings());
+    EXPECT_TRUE(capture.asserts().empty());
+    delete p_font;
 }
 
 // Each step is origin + t * (destination - origin) / T in floats: from 20 to 320 in 300 ms.
