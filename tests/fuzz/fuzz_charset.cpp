@@ -6,9 +6,6 @@
 #include "ui_font.h"
 
 #include <cmath>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
 
 namespace {
 
@@ -18,23 +15,12 @@ public:
     using qorui::CCharset::init;
 };
 
-std::string const &font_dir() {
-    static std::string const s_dir = [] {
-        std::string pattern = (std::filesystem::temp_directory_path() / "qorfuzz_fonts_XXXXXX").string();
-        if (!mkdtemp(pattern.data())) std::abort();
-        std::atexit([] { std::filesystem::remove_all(font_dir()); });
-        return pattern;
-    }();
-    return s_dir;
-}
-
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(uint8_t const *_p_data, size_t _size) {
     qorfuzz::init();
-    std::ofstream(font_dir() + "/fuzz.fnt", std::ios::binary)
-        .write(reinterpret_cast<char const *>(_p_data), _size);
-    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, font_dir().c_str());
+    qorfuzz::write_ui_file("fuzz.fnt", _p_data, _size); // the run's font folder is shared data
+    qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, qorfuzz::ui_dir().c_str());
     LuaPlus::LuaObject entry;
     entry.AssignNewTable(&qorui::lua_machine());
     entry.SetString("file_type", "nehe");
