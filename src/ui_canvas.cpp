@@ -42,9 +42,9 @@ bool is_scan_space(unsigned short _c) {
     return _c == ' ' || (_c >= '\t' && _c <= '\r');
 }
 
-// One number of "%u" from _k on, as the standard scan reads it: blanks, a sign, decimal digits (a
-// value too large for unsigned long stays at its greatest value, a minus negates it); the low bits
-// land in _value. False when no digit stands there.
+// One number of "%u" from _k on, as the standard scan reads it: blanks, a sign, decimal digits; a
+// minus negates the value, and one too large for unsigned long is its greatest value, whatever the
+// sign. The low bits land in _value. False when no digit stands there.
 bool scan_unsigned(CString const &_string, size_t &_k, unsigned &_value) {
     size_t const length = _string.length();
     while (_k < length && is_scan_space(_string[_k]))
@@ -53,13 +53,15 @@ bool scan_unsigned(CString const &_string, size_t &_k, unsigned &_value) {
     if (_k < length && (_string[_k] == '-' || _string[_k] == '+')) ++_k;
     size_t const first_digit = _k;
     unsigned long value = 0;
+    bool too_large = false;
     unsigned long const limit = static_cast<unsigned long>(-1);
     for (; _k < length && _string[_k] >= '0' && _string[_k] <= '9'; ++_k) {
         unsigned const digit = _string[_k] - '0';
-        value = value > (limit - digit) / 10 ? limit : value * 10 + digit;
+        too_large = too_large || value > (limit - digit) / 10;
+        value = value * 10 + digit;
     }
     if (_k == first_digit) return false;
-    _value = static_cast<unsigned>(negative ? 0 - value : value);
+    _value = static_cast<unsigned>(too_large ? limit : negative ? 0 - value : value);
     return true;
 }
 

@@ -160,18 +160,27 @@ TEST_F(HardeningTest, AMovementStepMultipliesBeforeItDivides) {
     }
 }
 
-// The numbers of a colour tag are read up to the end of the string, past any blanks.
+// The numbers of a colour tag are read up to the end of the string, past any blanks, as the
+// standard scan of unsigned numbers reads them.
 TEST_F(HardeningTest, AColourTagIsReadWhateverItsLength) {
     CWindowVisual *p_wnd = child("text", 300, 40);
     CFont *p_font = get_fonts_factory().create("arial_white", &m_world.desktop());
     ASSERT_NE(nullptr, p_font);
-    for (std::string const &pad :
-         {std::string(" "), std::string(70, ' '), std::string(300, ' ') + "+0000000000000"}) {
-        SCOPED_TRACE(pad.size());
+    struct {
+        std::string m_tag;
+        rgba_t m_colour;
+    } const rows[] = {
+        {"<color 255 1 2 3>", rgba_t(255, 1, 2, 3)},
+        {"<color" + std::string(70, ' ') + "255 1 2 3>", rgba_t(255, 1, 2, 3)},
+        {"<color" + std::string(300, '\t') + "+0000000000000255 1 2 3>", rgba_t(255, 1, 2, 3)},
+        {"<color -1 99999999999999999999999 -99999999999999999999999 260>", rgba_t(255, 255, 255, 4)},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.m_tag.size());
         m_world.recorder().clear();
-        p_wnd->get_canvas().text_out(0, 0, CString(("<color" + pad + "255 1 2 3>x").c_str()), p_font);
+        p_wnd->get_canvas().text_out(0, 0, CString((row.m_tag + "x").c_str()), p_font);
         ASSERT_EQ(3u, m_world.recorder().calls().size()); // the font's material, the quad's, the quad
-        EXPECT_EQ(rgba_t(255, 1, 2, 3), m_world.recorder().calls().back().m_colours[0]);
+        EXPECT_EQ(row.m_colour, m_world.recorder().calls().back().m_colours[0]);
     }
     delete p_font;
 }
