@@ -146,7 +146,8 @@ bool CInputScript::parse_line(std::string const &_line, SStep &_step, std::strin
 unsigned long CInputScript::get_frames_count() const {
     unsigned long frames = 0;
     for (SStep const &step : m_steps)
-        if (step.m_verb == "wait" && !step.m_milliseconds) frames += static_cast<unsigned long>(step.m_numbers[0]);
+        if (step.m_verb == "wait" && !step.m_milliseconds)
+            frames += static_cast<unsigned long>(step.m_numbers[0]);
     return frames;
 }
 
