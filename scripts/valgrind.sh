@@ -8,7 +8,7 @@ cd "$(dirname "$0")/.."
 cmake --build build -j "$(nproc)" --target qorhost gameui_demo
 export QOR_MM_BACKEND=system
 memcheck=(valgrind --tool=memcheck --leak-check=full --errors-for-leak-kinds=definite --error-exitcode=3
-          --suppressions=scripts/valgrind.supp --quiet)
+          --quiet)
 rm -rf out-valgrind
 mkdir -p out-valgrind
 cp -r data out-valgrind/data
