@@ -18,24 +18,9 @@ namespace qorhost {
 namespace {
 unsigned const k_frame_ms = 16;
 
-bool file_exists(std::string const &_path) {
+bool folder_exists(std::string const &_path) {
     struct stat info;
-    return stat(_path.c_str(), &info) == 0;
-}
-
-void copy_file(std::string const &_from, std::string const &_to) {
-    std::string text;
-    FILE *in = fopen(_from.c_str(), "rb");
-    if (!in) return;
-    char buffer[8192];
-    size_t count;
-    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0)
-        text.append(buffer, count);
-    fclose(in);
-    FILE *out = fopen(_to.c_str(), "wb");
-    if (!out) return;
-    fwrite(text.data(), 1, text.size(), out);
-    fclose(out);
+    return stat(_path.c_str(), &info) == 0 && S_ISDIR(info.st_mode);
 }
 } // namespace
 
@@ -66,7 +51,10 @@ CHost::CHost(SHostOptions const &_options)
     m_vars.set_var("scr_resy", std::to_string(m_options.m_h).c_str());
     m_renderer.set_texture_folders({m_options.m_data + "/textures", m_options.m_data});
     m_renderer.set_frame_sink([this](SImage const &_frame, unsigned _index) { write_frame(_frame, _index); });
-    m_server.set_modules_folder(executable_folder());
+    // A game ships its interface library with its data; the host's own modules lie beside it, or
+    // in the library folder of an installed host.
+    m_server.set_modules_folders(
+        {m_options.m_data, executable_folder(), executable_folder() + "/" + QORHOST_LIBDIR_FROM_BIN});
 
     m_server.register_interface(&m_input);
     m_server.register_interface(&m_vars);
@@ -89,22 +77,26 @@ CHost::~CHost() {
     if (m_options.m_manual_clock) qorplatform::set_clock(nullptr);
 }
 
-// The configuration is worked on as a copy in the output folder, made from the data folder's on
-// the first run: what the interface writes back stays out of the data.
+// The configuration is read from the data folder on every run, so an edit there always takes
+// effect; what the interface writes back goes to the output folder's qor.gdf (the configuration
+// with the changed values), never into the data. Without an output folder it goes nowhere.
 void CHost::configure_files() {
     std::string const data = m_options.m_data;
     qorbase::set_category_root(qorbase::FILE_CATEGORY_CONFIG, data.c_str());
     qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
-    std::string gdf = data + "/qor.gdf";
+    std::string written_back;
     if (!m_options.m_out.empty()) {
         mkdir(m_options.m_out.c_str(), 0755);
         qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_options.m_out.c_str());
-        std::string const copy = m_options.m_out + "/qor.gdf";
-        if (!file_exists(copy)) copy_file(gdf, copy);
-        if (file_exists(copy)) gdf = copy;
+        written_back = m_options.m_out + "/qor.gdf";
     }
-    qorbase::set_gdf_path(gdf.c_str());
+    qorbase::set_gdf_path((data + "/qor.gdf").c_str(), written_back.c_str());
+}
+
+std::string default_data_folder() {
+    std::string const installed = executable_folder() + "/" + QORHOST_DATA_FROM_BIN;
+    return folder_exists(installed) ? installed : "data";
 }
 
 void CHost::log_sink(char const *_line, void *_user) {
@@ -186,8 +178,7 @@ bool CHost::start() {
 }
 
 void CHost::finish() {
-    if (!mp_ui) return;
-    mp_ui->shutdown();
+    if (mp_ui) mp_ui->shutdown();
     qorbase::flush_gdf();
 }
 

@@ -24,15 +24,19 @@ class IUserInterface;
 
 namespace qorhost {
 
+// The data folder a host runs on when none is given: the installed data of an installed host,
+// else "data" in the current folder.
+std::string default_data_folder();
+
 struct SHostOptions {
-    std::string m_data = "data"; // the data folder
-    int m_w = 1024;              // screen size in pixels
+    std::string m_data = default_data_folder(); // the data folder
+    int m_w = 1024;                             // screen size in pixels
     int m_h = 768;
-    unsigned m_frames = 12;     // in a window, 0 runs until the window is closed
-    std::string m_out = "out";  // frames, stats and the working copy of the configuration; "" for none
-    bool m_quiet = false;       // the log isn't printed
-    bool m_record = false;      // a recorder stands in front of the renderer
-    bool m_manual_clock = true; // time moves 16 ms a frame, so runs repeat exactly
+    unsigned m_frames = 12;              // in a window, 0 runs until the window is closed
+    std::string m_out = "out";           // frames, stats and the configuration written back; "" for none
+    bool m_quiet = false;                // the log isn't printed
+    bool m_record = false;               // a recorder stands in front of the renderer
+    bool m_manual_clock = true;          // time moves 16 ms a frame, so runs repeat exactly
     std::vector<std::string> m_commands; // run after init, "name arguments"
     std::string m_script;                // an input script played instead of the frames; "" for none
     bool m_window = false; // frames are shown in a window that gives the input; none are written
@@ -53,7 +57,7 @@ public:
     // service, 2 for a script that doesn't load.
     int run();
     // The two ends of a run, for a host that runs the frames itself: init and the commands
-    // (false without a service), and shutdown.
+    // (false without a service), and shutdown with the configuration written back.
     bool start();
     void finish();
     // One frame: clear, update, draw, present.

@@ -121,9 +121,10 @@ namespace qorbase {
 
 enum { FILE_CATEGORY_STATS = 2, FILE_CATEGORY_CONFIG = 5, FILE_CATEGORY_FONTS = 8, FILE_CATEGORY_UI = 16 };
 
-// The GDF file that GetGDFRegistry reads at its first use, and from then on writes back.
-// Setting a new path drops the loaded registry (after writing back pending changes).
-void set_gdf_path(char const *_path);
+// The GDF file that GetGDFRegistry reads at its first use, and the file that its changes are
+// written back to: null _write_path for the same file, "" for none. Setting a new path drops the
+// loaded registry (after writing back pending changes).
+void set_gdf_path(char const *_path, char const *_write_path = nullptr);
 // Writes pending set_vec2 changes now, atomically. Also runs at process end.
 void flush_gdf();
 

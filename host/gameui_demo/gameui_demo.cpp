@@ -78,17 +78,8 @@ private:
 
 CWindowRegistrar<CDemoText> const s_demo_text_registrar("DemoText");
 
-CMaterial *colour(CDesktop *_p_desktop, unsigned char _r, unsigned char _g, unsigned char _b,
-                  unsigned char _a = 255) {
-    CMaterial *p_material = _p_desktop->create_material();
-    if (!p_material) return nullptr;
-    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
-    p_material->set_color(rgba_t(_r, _g, _b, _a));
-    return p_material;
-}
-
 // A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
-// by name.
+// by name. Every material of the scene is one, so an export writes every preset back.
 CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
     CMaterial *p_material = _p_desktop->create_material();
     if (!p_material) return nullptr;
@@ -172,10 +163,10 @@ CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *
                            int _w, int _h) {
     CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, _w, _h);
     p_dialog->set_can_drag(true);
-    p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
+    p_dialog->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "panel"));
     CWindowVisual *p_title = place(p_dialog, new CWindowVisual(_p_desktop, "title bar"), 0, 0, _w, 26);
     p_title->set_passive(true);
-    p_title->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
+    p_title->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "title_bar"));
     place(p_title, new CDemoText(_p_desktop, "title", _title), 10, 4, _w - 20, 20);
     return p_dialog;
 }
@@ -247,6 +238,7 @@ void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     CEditBox *p_notes = place(p_dialog, new CEditBox(_p_desktop, "notes"), 16, 166, 388, 110);
     p_notes->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
     p_notes->set_uniform_margins(4);
+    p_notes->get_caret()->add_material(MAT_NAME_CHECKED, preset(_p_desktop, "caret"));
 
     make_button(_p_desktop, p_dialog, "apply", "Apply", 294, 288);
 }
@@ -355,12 +347,12 @@ void cmd_gameui_demo_scene(char const *, void *) {
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
     CDesktop *p_desktop = p_ui ? p_ui->get_desktop() : nullptr;
     if (!p_desktop) return;
-    p_desktop->add_material(MAT_NAME_NORMAL, colour(p_desktop, 22, 26, 34));
+    lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
+    p_desktop->add_material(MAT_NAME_NORMAL, preset(p_desktop, "desktop"));
     CWindowVisual *p_bar = place(p_desktop, new CWindowVisual(p_desktop, "top bar"), 0, 0, 1024, 36);
     p_bar->set_alignment(ALIGNMENT_TOP);
-    p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
+    p_bar->add_material(MAT_NAME_NORMAL, preset(p_desktop, "top_bar"));
     place(p_bar, new CDemoText(p_desktop, "heading", "qorui - demo scene"), 16, 8, 400, 20);
-    lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
     dress_desktop_for_step_buttons(p_desktop);
     make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
     make_message_dialog(p_desktop, "second dialog",

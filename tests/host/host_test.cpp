@@ -1,6 +1,6 @@
 // The reference engine without the UI library: its interfaces on the server, the screen size
-// variables, the engine's log lines, the working copy of the configuration, presented frames as
-// files, and the withdrawal of every interface when it goes.
+// variables, the engine's log lines, the configuration read from the data and written back to
+// the output folder, presented frames as files, and the withdrawal of every interface when it goes.
 #include "host.h"
 #include "host_test_support.h"
 #include "qorbase.h"
@@ -100,19 +100,28 @@ TEST_F(HostTest, EngineLogLinesGoToTheEngineLoggerWhileTheHostLives) {
     EXPECT_EQ("after 1\n", testing::internal::GetCapturedStdout());
 }
 
-TEST_F(HostTest, DataFoldersAndTheWorkingCopyOfTheConfiguration) {
-    std::string const configuration = "[ui]\nlanguage = en\n";
-    m_dir.write("data/qor.gdf", hosttest::bytes_t(configuration.begin(), configuration.end()));
+// Each host reads the data folder's configuration, so an edit there takes effect at the next
+// start even when an earlier run wrote the configuration back into the output folder.
+TEST_F(HostTest, DataFoldersAndTheConfigurationReadFromTheDataWrittenBackToTheOutput) {
+    m_dir.write("data/qor.gdf", hosttest::bytes_t{'[', 'a', ']', '\n', 'k', ' ', '=', ' ', '1', '\n'});
     SHostOptions options = quiet_options(m_dir.file("data"), 16, 8);
     options.m_out = m_dir.file("out");
-    CHost host(options);
+    {
+        CHost host(options);
+        EXPECT_EQ(m_dir.file("data/ui"), qorbase::get_category_root(qorbase::FILE_CATEGORY_UI));
+        EXPECT_EQ(m_dir.file("data/fonts"), qorbase::get_category_root(qorbase::FILE_CATEGORY_FONTS));
+        EXPECT_EQ(m_dir.file("data"), qorbase::get_category_root(qorbase::FILE_CATEGORY_CONFIG));
+        EXPECT_EQ(m_dir.file("out"), qorbase::get_category_root(qorbase::FILE_CATEGORY_STATS));
+        EXPECT_STREQ("1", qorbase::get_config_string("a", "k", ""));
+        qorbase::find_config_section("a")->get_value("k", false)->set_vec2(5, 6);
+        host.finish(); // without a service only the configuration is written back
+    }
+    EXPECT_EQ("[a]\nk = 5, 6\n", qortest::read_file(m_dir.file("out/qor.gdf")));
+    EXPECT_EQ("[a]\nk = 1\n", qortest::read_file(m_dir.file("data/qor.gdf")));
 
-    EXPECT_EQ(m_dir.file("data/ui"), qorbase::get_category_root(qorbase::FILE_CATEGORY_UI));
-    EXPECT_EQ(m_dir.file("data/fonts"), qorbase::get_category_root(qorbase::FILE_CATEGORY_FONTS));
-    EXPECT_EQ(m_dir.file("data"), qorbase::get_category_root(qorbase::FILE_CATEGORY_CONFIG));
-    EXPECT_EQ(m_dir.file("out"), qorbase::get_category_root(qorbase::FILE_CATEGORY_STATS));
-    hosttest::bytes_t const copy = hosttest::read_bytes(m_dir.file("out/qor.gdf"));
-    EXPECT_EQ(configuration, std::string(copy.begin(), copy.end()));
+    m_dir.write("data/qor.gdf", hosttest::bytes_t{'[', 'a', ']', '\n', 'k', ' ', '=', ' ', '2', '\n'});
+    CHost host(options);
+    EXPECT_STREQ("2", qorbase::get_config_string("a", "k", ""));
 
     // A presented frame lands in the output folder.
     EXPECT_EQ(m_dir.file("out/frame_0012.png"), host.frame_path(12));
@@ -123,15 +132,6 @@ TEST_F(HostTest, DataFoldersAndTheWorkingCopyOfTheConfiguration) {
     EXPECT_EQ(16, frame.m_w);
     EXPECT_EQ(8, frame.m_h);
     EXPECT_EQ(host.renderer().get_frame().m_pixels, frame.m_pixels);
-}
-
-TEST_F(HostTest, WorkingCopyOfTheConfigurationIsNotOverwritten) {
-    m_dir.write("data/qor.gdf", {'[', 'a', ']', '\n'});
-    m_dir.write("out/qor.gdf", {'[', 'b', ']', '\n'});
-    SHostOptions options = quiet_options(m_dir.file("data"));
-    options.m_out = m_dir.file("out");
-    { CHost host(options); }
-    EXPECT_EQ((hosttest::bytes_t{'[', 'b', ']', '\n'}), hosttest::read_bytes(m_dir.file("out/qor.gdf")));
 }
 
 TEST_F(HostTest, DestructionWithdrawsEveryInterfaceNewestFirst) {

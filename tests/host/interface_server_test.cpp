@@ -173,7 +173,7 @@ TEST(InterfaceServer, WithdrawAllGoesNewestFirst) {
 TEST(InterfaceServerModules, MissingLibraryIsReportedByName) {
     CReportCapture reports;
     CInterfaceServer server;
-    server.set_modules_folder(executable_folder());
+    server.set_modules_folders({executable_folder()});
     server.load_module(1, "libqorhost_no_such_module.so");
     EXPECT_EQ(nullptr, server.open_module("/nowhere/libqorhost_no_such_module.so"));
     server.load_module(1, nullptr);
@@ -198,7 +198,7 @@ TEST(InterfaceServerModules, LoadedModuleRegistersThroughItsEntryPoint) {
     CVarManager vars;
     CCmdManager commands(&vars);
     CInterfaceServer server;
-    server.set_modules_folder(executable_folder());
+    server.set_modules_folders({executable_folder()});
     server.register_interface(&log);
     server.register_interface(&commands);
 

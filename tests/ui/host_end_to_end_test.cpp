@@ -1,5 +1,6 @@
 // qorhost on the default data, as the main job runs it: the plaque, the demo scene, input
-// scripts, layouts exported and imported, the build-version page, and bad arguments.
+// scripts, layouts exported and imported, the build-version page, bad arguments, and the host's
+// files: the configuration, exports over the shipped presets, classes missing from the factory.
 #include "image_io.h"
 #include "test_world.h"
 
@@ -21,11 +22,12 @@ struct SRun {
     }
 };
 
-// qorhost on a data folder, its output to a new folder.
+// qorhost on a data folder, its output to a new folder unless one is given.
 SRun run_host(std::vector<std::string> const &_arguments,
-              std::string const &_data = qortest::source_dir() + "/data") {
+              std::string const &_data = qortest::source_dir() + "/data",
+              std::string const &_out = qortest::make_temp_dir()) {
     SRun run;
-    run.m_out = qortest::make_temp_dir();
+    run.m_out = _out;
     std::vector<std::string> arguments = {"--data", _data, "--out", run.m_out};
     arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
     run.m_result = qortest::run_child("qorhost", {}, arguments);
@@ -179,4 +181,70 @@ TEST(HostEndToEnd, TheBuildVersionPageIsShownAndDumped) {
     EXPECT_NE(std::string::npos, dump.find("qorui 1.0 (demo build)\n203\n")) << dump;
     EXPECT_NE(std::string::npos, run.m_result.m_output.find("Out file: 'stats_build_version_demo_0000.txt'"));
     run.expect_golden("version.png", "build_version_page_1024x768");
+}
+
+// The configuration is read from the data folder on every run: an edit after a first run takes
+// effect on the next, although the first wrote the configuration back into the output folder.
+TEST(HostEndToEnd, AnEditOfTheDataFoldersConfigurationTakesEffect) {
+    std::string const data = data_copy(true), out = qortest::make_temp_dir();
+    SRun const first = run_host({"--frames", "1"}, data, out);
+    ASSERT_EQ(0, first.m_result.m_exit_code) << first.m_result.m_output;
+    EXPECT_NE(std::string::npos, first.m_result.m_output.find("Demo scene built"));
+    std::string const gdf = qortest::read_file(data + "/qor.gdf");
+    std::string const edited = gdf.substr(0, gdf.find("startup = ")) + "startup = gameui_demo edited\n";
+    qortest::write_file(data + "/qor.gdf", edited);
+
+    SRun const second = run_host({"--frames", "1"}, data, out);
+    ASSERT_EQ(0, second.m_result.m_exit_code) << second.m_result.m_output;
+    EXPECT_NE(std::string::npos, second.m_result.m_output.find("GameUI: gameui_demo edited"));
+    EXPECT_EQ(std::string::npos, second.m_result.m_output.find("Demo scene built"));
+    EXPECT_EQ(edited, qortest::read_file(data + "/qor.gdf"));
+}
+
+// The demo's materials are all presets, so its export writes every shipped preset back: the scene
+// built again from the written presets looks as before and exports the same files, and its layout
+// imported into an empty desktop gives the scene of the shipped layout.
+TEST(HostEndToEnd, AnExportOfTheDemoKeepsEveryPresetAndTheLook) {
+    std::string const data = data_copy(true), presets = data + "/ui/ui_material_presets.lua";
+    std::string const shipped = qortest::read_file(presets);
+    SRun const exported = run_host({"+ui_export", "exported.lua"}, data);
+    ASSERT_EQ(0, exported.m_result.m_exit_code) << exported.m_result.m_output;
+    std::string const written = qortest::read_file(presets);
+    size_t count = 0;
+    for (size_t at = shipped.find("\n    "); at != std::string::npos; at = shipped.find("\n    ", at + 1)) {
+        std::string const name = shipped.substr(at + 5, shipped.find(' ', at + 5) - at - 5);
+        if (name == "--") continue; // a comment
+        ++count;
+        EXPECT_NE(std::string::npos, written.find("\n    " + name + " = {")) << name;
+    }
+    EXPECT_EQ(40u, count);
+
+    SRun const again = run_host({"+ui_export", "again.lua"}, data);
+    ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
+    EXPECT_EQ(std::string::npos, again.m_result.m_output.find("Preset")) << again.m_result.m_output;
+    again.expect_golden("frame_0012.png", "demo_scene_1024x768");
+    EXPECT_EQ(qortest::read_file(data + "/ui/exported.lua"), qortest::read_file(data + "/ui/again.lua"));
+    EXPECT_EQ(written, qortest::read_file(presets));
+
+    std::string const gdf = qortest::read_file(data + "/qor.gdf");
+    qortest::write_file(data + "/qor.gdf", gdf.substr(0, gdf.find("[host]")));
+    run_host({"+ui_import", "exported.lua"}, data)
+        .expect_golden("frame_0012.png", "demo_layout_imported_1024x768");
+}
+
+// A layout's child of a class that no module registered is left out with its subtree, and the
+// host's log names the class; the children beside it are made.
+TEST(HostEndToEnd, AnImportedChildOfAnUnregisteredClassIsNamedInTheLog) {
+    std::string const data = data_copy(false);
+    qortest::write_file(data + "/ui/unknown.lua",
+                        "ui_windows_ini = { [11] = { name = 'ghost', class_name = 'NoSuchWindow' },\n"
+                        "  [12] = { name = 'label', class_name = 'StaticText', text = 'seen' } }\n");
+    SRun const run = run_host({"--frames", "1", "+ui_import", "unknown.lua", "+ui_export", "back.lua"}, data);
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    EXPECT_NE(std::string::npos,
+              run.m_result.m_output.find("Window class not registered: NoSuchWindow ('ghost' left out)"))
+        << run.m_result.m_output;
+    std::string const back = qortest::read_file(data + "/ui/back.lua");
+    EXPECT_EQ(std::string::npos, back.find("ghost"));
+    EXPECT_NE(std::string::npos, back.find("\"label\""));
 }
