@@ -13,10 +13,11 @@ prefix="$work/prefix"
 cmake --install "$build" --prefix "$prefix" >/dev/null
 export PKG_CONFIG_PATH="$prefix/lib/pkgconfig"
 
-for header in "$prefix"/include/qorui/*.h "$prefix"/include/qorui/detail/*.h; do
-  echo "#include \"$header\"" | c++ -std=c++17 -fsyntax-only -Wall -Wextra $(pkg-config --cflags qorui) -x c++ - \
-    || { echo "examples: $header doesn't compile on its own"; exit 1; }
-done
+# Every installed header on its own (exit 255 stops xargs at the first that fails).
+cflags="$(pkg-config --cflags qorui)"
+ls "$prefix"/include/qorui/*.h "$prefix"/include/qorui/detail/*.h | xargs -P "$(nproc)" -I{} sh -c \
+  'echo "#include \"{}\"" | c++ -std=c++17 -fsyntax-only -Wall -Wextra '"$cflags"' -x c++ - \
+   || { echo "examples: {} does not compile on its own"; exit 255; }'
 
 for example in gameui_hello engine_loop; do
   cmake -S "examples/$example" -B "$work/$example" -G Ninja -DCMAKE_PREFIX_PATH="$prefix" >/dev/null

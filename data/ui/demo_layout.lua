@@ -42,23 +42,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 66,
-                    g = 48,
-                    r = 40,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "top_bar",
             },
         },
         name = "top bar",
@@ -121,23 +105,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -313,23 +281,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 235,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "dialog",
@@ -392,23 +344,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -584,23 +520,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 235,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "second dialog",
@@ -663,23 +583,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -1381,23 +1285,7 @@ ui_windows_ini = {
                 left_margin = 0,
                 materials = {
                     MAT_NAME_CHECKED = {
-                        color = {
-                            a = 150,
-                            b = 120,
-                            g = 120,
-                            r = 120,
-                        },
-                        load_textures_from_game_save = false,
-                        material_template = "ui_color",
-                        pos = {
-                            [1] = 0,
-                            [2] = 0,
-                        },
-                        precache_enable = true,
-                        size = {
-                            [1] = 1,
-                            [2] = 1,
-                        },
+                        material_preset = "caret",
                     },
                     MAT_NAME_NORMAL = {},
                 },
@@ -1510,23 +1398,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 235,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "controls",
@@ -1589,23 +1461,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -3188,23 +3044,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 235,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "options",
@@ -3285,23 +3125,7 @@ ui_windows_ini = {
             material_preset = "arrow_up_pushed",
         },
         MAT_NAME_NORMAL = {
-            color = {
-                a = 255,
-                b = 34,
-                g = 26,
-                r = 22,
-            },
-            load_textures_from_game_save = false,
-            material_template = "ui_color",
-            pos = {
-                [1] = 0,
-                [2] = 0,
-            },
-            precache_enable = true,
-            size = {
-                [1] = 1,
-                [2] = 1,
-            },
+            material_preset = "desktop",
         },
     },
     name = "desktop",

@@ -101,7 +101,7 @@ void cmd_hello_scene(char const *, void *) {
     p_title_bar->add_material(MAT_NAME_NORMAL, create_color_material(p_desktop, rgba_t(70, 90, 150, 255)));
     p_title_bar->make_static_text(CString("Hello, qorui"), CRectArea(12, 6, 376, 20), "title");
 
-    CStaticText *p_line = p_window->make_static_text(CString("This window comes from libgameui_hello.so."),
+    CStaticText *p_line = p_window->make_static_text(CString("Made by libgameui_hello.so."),
                                                      CRectArea(20, 60, 360, 20), "line");
     // The fixed-width font for this line; the factory makes fonts named in the data's fonts.lua.
     p_line->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("courier", p_desktop));
