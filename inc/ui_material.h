@@ -94,5 +94,10 @@ private:
 // A new "ui_color" material of the desktop in one colour: the built-in look of a control. The caller
 // owns it; null without a desktop.
 CMaterial *create_color_material(IWindowDesktop *_p_desktop, rgba_t const &_color);
+// A new material of the desktop that refers to the preset _preset of the global
+// ui_material_presets (run "ui_material_presets.lua" into the library's Lua state first), so an
+// export writes the preset back; a missing preset is reported as load_state reports it. The
+// caller owns it; null without a desktop.
+CMaterial *create_preset_material(IWindowDesktop *_p_desktop, char const *_preset);
 
 } // namespace qorui

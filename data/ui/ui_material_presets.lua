@@ -49,5 +49,5 @@ ui_material_presets = {
     panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 235 } },
     title_bar = { material_template = "ui_color", color = { r = 90, g = 70, b = 150, a = 255 } },
     text_field = { material_template = "ui_color", color = { r = 15, g = 15, b = 15, a = 150 } },
-    caret = { material_template = "ui_color", color = { r = 220, g = 226, b = 240, a = 200 } },
+    caret = { material_template = "ui_color", color = { r = 120, g = 120, b = 120, a = 150 } },
 }

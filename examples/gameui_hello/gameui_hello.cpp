@@ -62,41 +62,29 @@ private:
 
 CWindowRegistrar<CClickCounter> const s_click_counter_registrar("ClickCounter");
 
-// A material of the presets file (data/ui/ui_material_presets.lua) by its name; the file is run
-// into the library's Lua state first. A material can also be made whole in code: see the
-// colours below (create_color_material) and CMaterial::init.
-CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
-    CMaterial *p_material = _p_desktop->create_material();
-    if (!p_material) return nullptr;
-    LuaPlus::LuaObject table;
-    table.AssignNewTable(&lua_machine());
-    table.SetString("material_preset", _name);
-    p_material->load_state(table);
-    return p_material;
-}
-
-template <class TWindow>
-TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int _h) {
-    _p_parent->attach_child(_p_wnd);
-    _p_wnd->set_pos(_x, _y);
-    _p_wnd->set_size(_w, _h);
-    return _p_wnd;
-}
-
 // "hello_scene": the window, in the middle of the 1024 by 768 desktop.
 void cmd_hello_scene(char const *, void *) {
     IUserInterface *p_ui =
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
     CDesktop *p_desktop = p_ui ? p_ui->get_desktop() : nullptr;
     if (!p_desktop) return;
+    // The presets of data/ui/ui_material_presets.lua, which the button's materials refer to by name.
     lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
     p_desktop->add_material(MAT_NAME_NORMAL, create_color_material(p_desktop, rgba_t(24, 28, 36, 255)));
 
-    CWindowVisual *p_window = place(p_desktop, new CWindowVisual(p_desktop, "hello"), 312, 259, 400, 250);
+    // Windows are made with new and owned by the parent they are attached to; places and sizes
+    // are in desktop pixels (the desktop is 1024 by 768 whatever the screen).
+    CWindowVisual *p_window = new CWindowVisual(p_desktop, "hello");
+    p_desktop->attach_child(p_window);
+    p_window->set_pos(312, 259);
+    p_window->set_size(400, 250);
     p_window->set_can_drag(true);
     p_window->add_material(MAT_NAME_NORMAL, create_color_material(p_desktop, rgba_t(36, 44, 60, 255)));
 
-    CWindowVisual *p_title_bar = place(p_window, new CWindowVisual(p_desktop, "title bar"), 0, 0, 400, 30);
+    CWindowVisual *p_title_bar = new CWindowVisual(p_desktop, "title bar");
+    p_window->attach_child(p_title_bar);
+    p_title_bar->set_pos(0, 0);
+    p_title_bar->set_size(400, 30);
     p_title_bar->set_passive(true);
     p_title_bar->add_material(MAT_NAME_NORMAL, create_color_material(p_desktop, rgba_t(70, 90, 150, 255)));
     p_title_bar->make_static_text(CString("Hello, qorui"), CRectArea(12, 6, 376, 20), "title");
@@ -106,12 +94,18 @@ void cmd_hello_scene(char const *, void *) {
     // The fixed-width font for this line; the factory makes fonts named in the data's fonts.lua.
     p_line->add_font(FNT_NAME_DEFAULT, get_fonts_factory().create("courier", p_desktop));
 
-    CClickCounter *p_counter = place(p_window, new CClickCounter(p_desktop, "counter"), 20, 110, 360, 20);
-    CButton *p_button = place(p_window, new CButton(p_desktop, "click me"), 140, 170, 120, 34);
+    CClickCounter *p_counter = new CClickCounter(p_desktop, "counter");
+    p_window->attach_child(p_counter);
+    p_counter->set_pos(20, 110);
+    p_counter->set_size(360, 20);
+    CButton *p_button = new CButton(p_desktop, "click me");
+    p_window->attach_child(p_button);
+    p_button->set_pos(140, 170);
+    p_button->set_size(120, 34);
     p_button->m_text = CString("Click me");
-    p_button->add_material(MAT_NAME_NORMAL, preset(p_desktop, "button_normal"));
-    p_button->add_material(MAT_NAME_HIGHLIGHTED, preset(p_desktop, "button_highlighted"));
-    p_button->add_material(MAT_NAME_PUSHED, preset(p_desktop, "button_pushed"));
+    p_button->add_material(MAT_NAME_NORMAL, create_preset_material(p_desktop, "button_normal"));
+    p_button->add_material(MAT_NAME_HIGHLIGHTED, create_preset_material(p_desktop, "button_highlighted"));
+    p_button->add_material(MAT_NAME_PUSHED, create_preset_material(p_desktop, "button_pushed"));
     p_button->register_callback(EVENT_CLICK, CEventCallback(p_counter, &CClickCounter::on_click));
 }
 

@@ -81,13 +81,7 @@ CWindowRegistrar<CDemoText> const s_demo_text_registrar("DemoText");
 // A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
 // by name. Every material of the scene is one, so an export writes every preset back.
 CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
-    CMaterial *p_material = _p_desktop->create_material();
-    if (!p_material) return nullptr;
-    LuaPlus::LuaObject table;
-    table.AssignNewTable(&lua_machine());
-    table.SetString("material_preset", _name);
-    p_material->load_state(table);
-    return p_material;
+    return create_preset_material(_p_desktop, _name);
 }
 
 // Materials of a window by state, from presets; null names are skipped.
