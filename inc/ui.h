@@ -18,6 +18,7 @@ namespace qorui {
 
 class CStatsPage;
 
+// The user-interface service: owns the desktop and the stats pages and forwards the engine's input.
 class CUserInterface : public IUserInterface, public IPointerListener, public IKeyListener {
 public:
     CUserInterface();

@@ -19,6 +19,7 @@ class IRender;
 class IWindowDesktop;
 class CDesktop;
 
+// The description of a material: colour, texture rectangle, texture names, nine-patch borders.
 class CMaterialBase {
 public:
     CMaterialBase();
@@ -37,6 +38,7 @@ protected:
     bool m_load_textures_from_game_save;
 };
 
+// How a rectangle is painted, owning one handle of a material in the engine's renderer.
 class CMaterial : public CPooled<CMaterial, 128>, public CMaterialBase {
 public:
     virtual ~CMaterial();

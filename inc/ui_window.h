@@ -51,6 +51,7 @@ protected:
     ~IWindowDesktop() {}
 };
 
+// A node of the window tree: links, position and size, behaviour flags and the routing of events.
 class CWindow : public CEventDispatcher {
 public:
     CWindow(IWindowDesktop *_p_desktop, char const *_name);

@@ -15,6 +15,7 @@ class CStaticText;
 class CString;
 class CText;
 
+// A window that can be seen: materials and fonts by name, margins, states, a canvas, fades and sounds.
 class CWindowVisual : public CWindow, public ICanvasOwner {
 public:
     CWindowVisual(IWindowDesktop *_p_desktop, char const *_name);

@@ -11,6 +11,7 @@
 #pragma once
 #include "qor_math.h"
 
+// One value of a configuration file.
 class IConfigValue {
 public:
     virtual vec2_t get_vec2(float _default_x, float _default_y) = 0;
@@ -26,6 +27,7 @@ protected:
     virtual ~IConfigValue() {}
 };
 
+// One "[section]" of a configuration file.
 class IConfigSection {
 public:
     // With _create true a missing key is added without content; otherwise null.
@@ -35,6 +37,7 @@ protected:
     virtual ~IConfigSection() {}
 };
 
+// A configuration file of the GDF format.
 class IConfigFile {
 public:
     // Null when there's no section of that name.
@@ -46,6 +49,7 @@ protected:
     virtual ~IConfigFile() {}
 };
 
+// The engine's configuration file.
 class IGDFRegistry {
 public:
     virtual IConfigFile *get_config() = 0;
@@ -65,6 +69,7 @@ public:
     virtual unsigned read(unsigned _count, void *_p_buffer) = 0;
 };
 
+// The engine's files by category, and its log.
 class IFileSystem {
 public:
     // Result: the file's size, 0 when there's none. *_pp_content takes the content, allocated
