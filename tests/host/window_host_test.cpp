@@ -19,6 +19,7 @@
 using namespace qorhost;
 using hosttest::bytes_t;
 using hosttest::chunk;
+using hosttest::CInputRecord;
 using hosttest::CReportCapture;
 using hosttest::CTempDir;
 using hosttest::format_chunk;
@@ -26,28 +27,6 @@ using hosttest::wave;
 using hosttest::wave16;
 
 namespace {
-
-// Every input a listener hears, as text.
-class CInputRecord : public IPointerListener, public IKeyListener {
-public:
-    void on_button_down(unsigned _button) override { add("down %u", _button); }
-    void on_button_up(unsigned _button) override { add("up %u", _button); }
-    void on_pointer_move(vec2_t const &_movement) override { add("move %g %g", _movement.x, _movement.y); }
-    void on_wheel(float _rotation) override { add("wheel %g", _rotation); }
-    void on_key_down(unsigned _key, unsigned _extra) override { add("key_down 0x%X %u", _key, _extra); }
-    void on_key_up(unsigned _key) override { add("key_up 0x%X", _key); }
-    void on_char(unsigned _code) override { add("char 0x%X", _code); }
-
-    std::vector<std::string> m_lines;
-
-private:
-    template <class... Args>
-    void add(char const *_format, Args... _args) {
-        char line[64];
-        snprintf(line, sizeof(line), _format, _args...);
-        m_lines.push_back(line);
-    }
-};
 
 SDL_Event event_of(Uint32 _type) {
     SDL_Event event;
@@ -136,7 +115,8 @@ protected:
 
     CTempDir m_dir;
     CReportCapture m_reports;
-    CInputRecord m_record;
+    std::vector<std::string> m_lines;
+    CInputRecord m_record{m_lines};
     std::unique_ptr<CHost> mp_host;
     std::unique_ptr<CWindowHost> mp_window;
 };
@@ -226,19 +206,19 @@ TEST_F(WindowHostTest, EventsReachTheListenersAsTheLibrarysInputAtTheNextFrame) 
     push(key_event(SDL_KEYDOWN, SDLK_AUDIOPLAY, SDL_SCANCODE_AUDIOPLAY)); // no code: not delivered
     push(text_event("h\xC3\xA9"));
     push(motion_event(0, 0));
-    EXPECT_TRUE(m_record.m_lines.empty()); // nothing before the frame's events are polled
+    EXPECT_TRUE(m_lines.empty()); // nothing before the frame's events are polled
     EXPECT_TRUE(mp_window->step());
     EXPECT_EQ((std::vector<std::string>{"move 6 -4", "down 0", "up 0", "down 1", "down 2", "wheel 1",
                                         "wheel -2", "key_down 0xC0 0", "key_up 0xC0", "key_down 0x8 1",
                                         "char 0x68", "char 0xE9"}),
-              m_record.m_lines);
-    m_record.m_lines.clear();
+              m_lines);
+    m_lines.clear();
     vec2_t const scale = {2.0f, 0.5f}; // delivering tells whether anything was input
     EXPECT_TRUE(deliver_input(motion_event(-4, 8), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(motion_event(0, 0), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(wheel_event(0.0f, SDL_MOUSEWHEEL_NORMAL), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(text_event("\xF0\x9F\x98\x80"), mp_host->input(), scale));
-    EXPECT_EQ((std::vector<std::string>{"move -8 4"}), m_record.m_lines);
+    EXPECT_EQ((std::vector<std::string>{"move -8 4"}), m_lines);
 }
 
 TEST_F(WindowHostTest, RunsShowTheRenderersPictureUntilTheWindowCloses) {
