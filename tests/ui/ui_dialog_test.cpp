@@ -91,8 +91,8 @@ TEST_F(DialogTest, ButtonsAreLaidOutInARowOrAColumnAtTheFoot) {
 }
 
 // A dialog of 200 by 120 at (60, 40) between 150 and 215 wide and 100 and 132 high, grabbed by a
-// border and dragged: the edges of the border's drag mode move, the left and top edges keeping the
-// opposite edge where it was, and the borders follow the new size.
+// border and dragged: the border's edge moves, and a second one when the grab is near an end of the
+// border; the left and top edges keep the opposite edge where it was, and the borders follow.
 TEST_F(DialogTest, DraggingABorderResizesTheDialogByItsEdgeOrCornerWithinItsLimits) {
     struct {
         char const *m_case;
@@ -107,6 +107,15 @@ TEST_F(DialogTest, DraggingABorderResizesTheDialogByItsEdgeOrCornerWithinItsLimi
         {"top grabbed near its left end", 75, 43, -5, -5, {55, 35, 205, 125}},
         {"bottom grabbed near its right end", 248, 155, 10, 10, {60, 40, 210, 130}},
         {"right grabbed near its bottom end", 255, 150, 4, 6, {60, 40, 204, 126}},
+        // The corner reaches 2 * 8 pixels from each end, the limit included.
+        {"top at 16 from its left end", 60 + 16, 43, -5, -5, {55, 35, 205, 125}},
+        {"top at 17 from its left end", 60 + 17, 43, -5, -5, {60, 35, 200, 125}},
+        {"top at 16 from its right end", 60 + 184, 43, 5, -5, {60, 35, 205, 125}},
+        {"top at 17 from its right end", 60 + 183, 43, 5, -5, {60, 35, 200, 125}},
+        {"left at 16 from its top end", 63, 40 + 16, -5, -5, {55, 35, 205, 125}},
+        {"left at 17 from its top end", 63, 40 + 17, -5, -5, {55, 40, 205, 120}},
+        {"left at 16 from its bottom end", 63, 40 + 104, -5, 5, {55, 40, 205, 125}},
+        {"left at 17 from its bottom end", 63, 40 + 103, -5, 5, {55, 40, 205, 120}},
         {"left past the minimum width", 63, 100, 80, 0, {110, 40, 150, 120}},
         {"top past the minimum height", 160, 43, 0, 50, {60, 60, 200, 100}},
     };
@@ -120,37 +129,6 @@ TEST_F(DialogTest, DraggingABorderResizesTheDialogByItsEdgeOrCornerWithinItsLimi
         EXPECT_EQ((SRect{d.w - 8, 0, 8, d.h}), rect_of(p_dialog->get_child("border right", "Border", true)));
         EXPECT_EQ((SRect{0, d.h - 8, d.w, 8}), rect_of(p_dialog->get_child("border bottom", "Border", true)));
         delete p_dialog;
-    }
-}
-
-// The corner is 2 * 16 pixels from each end of a border of size 8, the limits included.
-TEST_F(DialogTest, AGrabWithinTwiceTheBorderSizeOfAnEndActsOnTwoEdges) {
-    struct {
-        char const *m_border;
-        int m_x, m_y;
-        unsigned m_mode;
-    } const rows[] = {
-        {"border top", 60 + 16, 43, BORDER_TOP | BORDER_LEFT},
-        {"border top", 60 + 17, 43, BORDER_TOP},
-        {"border top", 60 + 184, 43, BORDER_TOP | BORDER_RIGHT},
-        {"border top", 60 + 183, 43, BORDER_TOP},
-        {"border left", 63, 40 + 16, BORDER_LEFT | BORDER_TOP},
-        {"border left", 63, 40 + 17, BORDER_LEFT},
-        {"border left", 63, 40 + 104, BORDER_LEFT | BORDER_BOTTOM},
-        {"border left", 63, 40 + 103, BORDER_LEFT},
-    };
-    CDialog *p_dialog = make(60, 40, 200, 120);
-    for (auto const &row : rows) {
-        SCOPED_TRACE(testing::Message() << row.m_border << " " << row.m_x << "," << row.m_y);
-        CBorder *p_border = class_cast<CBorder>(p_dialog->get_child(row.m_border, "Border", true));
-        ASSERT_TRUE(p_border);
-        m_world.move_to(row.m_x, row.m_y);
-        m_world.press();
-        m_world.move_to(row.m_x, row.m_y);
-        EXPECT_EQ(row.m_mode, p_border->get_drag_mode());
-        m_world.release();
-        EXPECT_EQ(0u, p_border->get_drag_mode());
-        EXPECT_EQ((SRect{60, 40, 200, 120}), rect_of(p_dialog));
     }
 }
 
