@@ -11,6 +11,7 @@
 #include "test_support.h"
 #include "ui_desktop.h"
 #include "ui_edit_box.h"
+#include "ui_value_bar.h"
 
 #include <gtest/gtest.h>
 
@@ -304,4 +305,36 @@ TEST_F(ConsoleTest, TheGeometryComesFromTheConfigurationAndTheBoxesFillIt) {
     EXPECT_EQ(128.0f, size.x);
     EXPECT_EQ(128.0f, size.y);
     service().init(false); // for TearDown
+}
+
+// The page keys move the history by one line step of its bar; a double click on the caption
+// maximises the console and a second one gives it its place back.
+TEST_F(ConsoleTest, PageKeysScrollTheHistoryAndADoubleClickMaximises) {
+    ILogger *p_other = host().log().create_logger("OtherModule", "Other: ");
+    for (unsigned i = 0; i < 100; ++i)
+        p_other->write("a line", 0);
+    frame();
+    CScrollBar *p_bar = console().get_history()->get_scroll_bar_vert();
+    ASSERT_FALSE(p_bar->is_hidden());
+    float const end = p_bar->get_position();
+    EXPECT_EQ(p_bar->get_max(), end); // new lines scroll to the end
+    key(33);
+    EXPECT_EQ(end - p_bar->get_small_step(), p_bar->get_position());
+    key(34);
+    EXPECT_EQ(end, p_bar->get_position());
+
+    service().on_pointer_move(vec2_t{0, 0}); // the pointer is placed at its first movement
+    point_t const at = service().get_desktop()->get_pointer_pos();
+    service().on_pointer_move(vec2_t{static_cast<float>(60 - at.x), static_cast<float>(15 - at.y)});
+    for (bool const maximised : {true, false}) {
+        SCOPED_TRACE(maximised);
+        for (int click = 0; click < 2; ++click) {
+            service().on_button_down(0);
+            service().on_button_up(0);
+        }
+        EXPECT_EQ(maximised, console().is_maximaized());
+        host().clock().advance_ms(CDesktop::DOUBLE_CLICK_TIME); // the next click starts anew
+    }
+    EXPECT_EQ(0, console().get_pos().x);
+    EXPECT_EQ(128, console().get_w());
 }
