@@ -100,6 +100,9 @@ TEST_F(ConsoleTest, TheLogOfEveryModuleShowsInTheHistoryAlsoWhileHidden) {
     EXPECT_NE("a line of another module", last_message()); // not before the next frame
     frame();
     EXPECT_EQ("a line of another module", last_message());
+    unsigned const lines = history().get_num_strings();
+    frame(); // nothing new: nothing shown again
+    EXPECT_EQ(lines, history().get_num_strings());
 
     // Closed with a half-typed line: the line goes; what is logged meanwhile is there on opening.
     type("half typed");
