@@ -121,6 +121,10 @@ protected:
     qor_vector<CButton *> m_buttons; // in order of adding; owned by the window tree
     CButton *mp_default_button;
 
+    // Stores a value that the layout depends on and lays the dialog out again.
+    template <class TValue>
+    void relayout(TValue &_field, TValue _value);
+
 private:
     void layout_buttons();
 };

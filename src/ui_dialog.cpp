@@ -201,30 +201,32 @@ void CDialog::on_default_button_click() {
     if (mp_default_button) send_event(mp_default_button, EVENT_CLICK, CWndEvent::DISPATCH_NONE);
 }
 
-void CDialog::set_caption_h(int _h) {
-    m_caption_h = _h;
+// Every change of the layout is sent, also one to the same value.
+template <class TValue>
+void CDialog::relayout(TValue &_field, TValue _value) {
+    _field = _value;
     send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+}
+
+void CDialog::set_caption_h(int _h) {
+    relayout(m_caption_h, _h);
 }
 
 void CDialog::set_button_size(int _w, int _h) {
     m_button_w = _w;
-    m_button_h = _h;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_button_h, _h);
 }
 
 void CDialog::set_buttons_interval(int _interval) {
-    m_buttons_interval = _interval;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_buttons_interval, _interval);
 }
 
 void CDialog::set_caption_alignment(EAlignment _alignment) {
-    m_caption_alignment = _alignment;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_caption_alignment, _alignment);
 }
 
 void CDialog::set_buttons_horizontal(bool _horizontal) {
-    m_buttons_horizontal = _horizontal;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_buttons_horizontal, _horizontal);
 }
 
 void CDialog::on_event_resized(CWndEvent const *_p_event) {
@@ -308,8 +310,7 @@ CListDialog::CListDialog(IWindowDesktop *_p_desktop, char const *_name)
 CListDialog::~CListDialog() {}
 
 void CListDialog::set_buttons_list_box_interval(int _interval) {
-    m_buttons_list_box_interval = _interval;
-    send_event(this, EVENT_RESIZED, CWndEvent::DISPATCH_NONE);
+    relayout(m_buttons_list_box_interval, _interval);
 }
 
 void CListDialog::on_event_resized(CWndEvent const *_p_event) {

@@ -2,7 +2,8 @@
 // "gameui_library" in the configuration. It announces itself in the log and adds three commands:
 // "gameui_demo" echoes its arguments to the log, "gameui_demo_scene" builds the demo's windows on
 // the desktop and places the console (the host runs it at start from its configuration),
-// "gameui_show_stats NAME" shows one stats page.
+// "gameui_show_stats NAME" shows one stats page. In the scene, the button "Ask" of the second
+// dialog opens a modal message box and shows its answer.
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
@@ -10,6 +11,7 @@
 #include "engine_interfaces.h"
 #include "ui_button.h"
 #include "ui_console.h"
+#include "ui_dialog.h"
 #include "ui_desktop.h"
 #include "ui_drop_down_list.h"
 #include "ui_edit_box.h"
@@ -115,14 +117,18 @@ TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int 
     return _p_wnd;
 }
 
-CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
-                     int _x, int _y) {
-    CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
-    dress(_p_desktop, p_button,
+void dress_button(CDesktop *_p_desktop, CButton *_p_button) {
+    dress(_p_desktop, _p_button,
           {{MAT_NAME_NORMAL, "button_normal"},
            {MAT_NAME_HIGHLIGHTED, "button_highlighted"},
            {MAT_NAME_PUSHED, "button_pushed"},
            {MAT_NAME_DISABLED, "button_disabled"}});
+}
+
+CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
+                     int _x, int _y) {
+    CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
+    dress_button(_p_desktop, p_button);
     p_button->m_text = CString(_caption);
     return p_button;
 }
@@ -194,6 +200,63 @@ void make_message_dialog(CDesktop *_p_desktop, char const *_name, char const *_t
           16, 70, 330, 20);
     make_button(_p_desktop, p_dialog, "ok", "OK", 110, 150);
     make_button(_p_desktop, p_dialog, "cancel", "Cancel", 234, 150);
+}
+
+// A dialog's buttons in the scene's button look, 110 by 30, on a bottom margin of 20.
+void dress_dialog_buttons(CDesktop *_p_desktop, CDialog *_p_dialog) {
+    _p_dialog->set_button_size(110, 30);
+    _p_dialog->set_bottom_margin(20);
+    for (unsigned i = 0; i < _p_dialog->get_buttons_count(); ++i)
+        dress_button(_p_desktop, _p_dialog->get_button(i));
+}
+
+// A modal message box in the middle of the desktop: a click on "Yes" or "No" writes the answer into
+// _p_answer and the log, and closes the box, which deletes itself when it has faded out.
+void ask(CDesktop *_p_desktop, CStaticText *_p_answer) {
+    CMessageBox *p_box = new CMessageBox(_p_desktop, "question");
+    // Placed as a plain window: GCC folds the identical instantiations of place and then warns of
+    // the largest class's size against the smaller objects of the others.
+    place<CWindow>(_p_desktop, p_box, _p_desktop->get_w() / 2 - 180, _p_desktop->get_h() / 2 - 80, 360, 160);
+    p_box->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 48, 40, 72, 245));
+    p_box->set_uniform_margins(8);
+    p_box->set_caption_h(30);
+    p_box->set_caption(CString("Question"));
+    p_box->set_caption_alignment(ALIGNMENT_CENTER);
+    p_box->set_message_text(CString("Do you like the demo?"));
+    p_box->set_auto_delete(true);
+    for (char const *p_choice : {"Yes", "No"})
+        p_box->add_button(CString(p_choice))
+            ->register_callback(EVENT_CLICK, CEventCallback([p_box, _p_answer, p_choice](CWndEvent const *) {
+                                    _p_answer->set_text(
+                                        CString((std::string("Answer: ") + p_choice).c_str()));
+                                    if (ILogger *p_logger = demo_logger())
+                                        p_logger->write((std::string("answer ") + p_choice).c_str(), 0);
+                                    p_box->send_event(p_box, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
+                                }));
+    dress_dialog_buttons(_p_desktop, p_box);
+    _p_desktop->set_active_window(p_box);
+}
+
+// A dialog of the library, framed by its borders, by which it can be resized; its button "Ask"
+// opens a message box, and the answer stands below the text.
+void make_question_dialog(CDesktop *_p_desktop, char const *_name, char const *_caption, int _x, int _y) {
+    CDialog *p_dialog = place(_p_desktop, new CDialog(_p_desktop, _name), _x, _y, 360, 200);
+    p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
+    for (char const *p_edge : {"border left", "border right", "border top", "border bottom"})
+        if (CBorder *p_border = class_cast<CBorder>(p_dialog->get_child(p_edge, "Border", true)))
+            p_border->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
+    p_dialog->set_left_margin(16);
+    p_dialog->set_top_margin(8);
+    p_dialog->set_caption_h(30);
+    p_dialog->set_caption(CString(_caption));
+    place(p_dialog, new CDemoText(_p_desktop, "line 1", "Drag my frame to resize me."), 16, 44, 330, 20);
+    CStaticText *p_answer =
+        p_dialog->make_static_text(CString("Not asked yet."), CRectArea(16, 70, 330, 20), "answer");
+    p_dialog->add_button(CString("Ask"))
+        ->register_callback(EVENT_CLICK, CEventCallback([_p_desktop, p_answer](CWndEvent const *) {
+                                ask(_p_desktop, p_answer);
+                            }));
+    dress_dialog_buttons(_p_desktop, p_dialog);
 }
 
 // A scroll bar made by code has parts of no size: square step buttons as thick as the bar and a
@@ -378,9 +441,9 @@ void cmd_gameui_demo_scene(char const *, void *) {
     lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
     dress_desktop_for_step_buttons(p_desktop);
     make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
-    make_message_dialog(p_desktop, "second dialog",
-                        "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
-                        120, 420);
+    make_question_dialog(p_desktop, "second dialog",
+                         "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
+                         120, 420);
     make_controls_dialog(p_desktop, 540, 80);
     make_options_dialog(p_desktop, 540, 430);
     place_console(p_ui);

@@ -204,3 +204,23 @@ TEST(HostEndToEnd, TheConsoleOpensRunsACommandCompletesANameAndCloses) {
     run.expect_golden("completed.png", "console_completed_1024x768");
     run.expect_golden("closed.png", "demo_scene_1024x768");
 }
+
+// The demo's second dialog resized by its lower right corner (a grab on the bottom border near its
+// right end), its "Ask" button clicked at the place of the new layout, and the modal message box
+// answered: the answer stands in the dialog and in the log.
+TEST(HostEndToEnd, AScriptResizesADialogByItsCornerAndAnswersAMessageBox) {
+    SRun const run =
+        run_host({"--script", script("wait 12\n"
+                                     "move -44 231  # from the centre onto the bottom border (468, 615)\n"
+                                     "press\nmove 1 0\nmove 80 60\nrelease\nwait 2\n"
+                                     "screenshot resized.png\n"
+                                     "move -209 -30 # the button 'Ask' of the new layout (340, 645)\n"
+                                     "press\nrelease\nwait 12\nscreenshot asked.png\n"
+                                     "move 110 -217 # the message box's 'Yes' (450, 428)\n"
+                                     "press\nrelease\nwait 12\nscreenshot answered.png\n")});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("GameUI: answer Yes")) << run.m_result.m_output;
+    run.expect_golden("resized.png", "dialog_resized_1024x768");
+    run.expect_golden("asked.png", "dialog_asked_1024x768");
+    run.expect_golden("answered.png", "dialog_answered_1024x768");
+}
