@@ -1,15 +1,16 @@
 // The demo game's interface library: the engine loads it beside the UI library, named by
-// "gameui_library" in the configuration. It announces itself in the log and adds two commands:
+// "gameui_library" in the configuration. It announces itself in the log and adds three commands:
 // "gameui_demo" echoes its arguments to the log, "gameui_demo_scene" builds the demo's windows on
-// the desktop (the host runs it at start from its configuration), "gameui_show_stats NAME" shows
-// one stats page. In the scene, the button "Ask" of the second dialog opens a modal message box
-// and shows its answer.
+// the desktop and places the console (the host runs it at start from its configuration),
+// "gameui_show_stats NAME" shows one stats page. In the scene, the button "Ask" of the second
+// dialog opens a modal message box and shows its answer.
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
 #include "qorbase.h"
 #include "engine_interfaces.h"
 #include "ui_button.h"
+#include "ui_console.h"
 #include "ui_dialog.h"
 #include "ui_desktop.h"
 #include "ui_drop_down_list.h"
@@ -413,6 +414,20 @@ void cmd_gameui_show_stats(char const *_arguments, void *) {
     }
 }
 
+// The console, closed until its key opens it, where the configuration keeps it: as the import of
+// a game's layout would place it.
+void place_console(IUserInterface *_p_ui) {
+    IConsole *p_console = _p_ui->get_console();
+    IConfigSection *p_section = qorbase::find_config_section("ui");
+    if (!p_console || !p_section) return;
+    IConfigValue *p_pos = p_section->get_value("console_pos", false);
+    IConfigValue *p_size = p_section->get_value("console_size", false);
+    vec2_t const pos = p_pos ? p_pos->get_vec2(20.0f, 30.0f) : vec2_t{20.0f, 30.0f};
+    vec2_t const size = p_size ? p_size->get_vec2(400.0f, 500.0f) : vec2_t{400.0f, 500.0f};
+    p_console->get_console()->set_pos(static_cast<int>(pos.x), static_cast<int>(pos.y));
+    p_console->get_console()->set_size(static_cast<int>(size.x), static_cast<int>(size.y));
+}
+
 void cmd_gameui_demo_scene(char const *, void *) {
     IUserInterface *p_ui =
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
@@ -431,6 +446,7 @@ void cmd_gameui_demo_scene(char const *, void *) {
                          120, 420);
     make_controls_dialog(p_desktop, 540, 80);
     make_options_dialog(p_desktop, 540, 430);
+    place_console(p_ui);
     if (ILogger *p_logger = demo_logger()) p_logger->write("Demo scene built", 0);
 }
 

@@ -181,3 +181,27 @@ TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
     EXPECT_EQ(qortest::read_file(data + "/ui/second.lua"), qortest::read_file(data + "/ui/third.lua"));
 }
+
+// The console on the demo scene: the console key opens it (its character goes nowhere), a line
+// typed and run exports the layout into the data folder, tab completes a command's name, and the
+// key closes it again onto the scene as it was.
+TEST(HostEndToEnd, TheConsoleOpensRunsACommandCompletesANameAndCloses) {
+    std::string const data = data_copy(true);
+    SRun const run = run_host({"--script", script("wait 12\n"
+                                                  "key_down 0xC0\nchar 0x60\nkey_up 0xC0\nwait 12\n"
+                                                  "screenshot opened.png\n"
+                                                  "type ui_export console_layout.lua\n"
+                                                  "key_down 13\nkey_up 13\nwait 2\nscreenshot exported.png\n"
+                                                  "type print_st\nkey_down 9\nchar 9\nkey_up 9\nwait 2\n"
+                                                  "screenshot completed.png\n"
+                                                  "key_down 0xC0\nchar 0x60\nkey_up 0xC0\nwait 12\n"
+                                                  "screenshot closed.png\n")},
+                              data);
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    std::string const layout = qortest::read_file(data + "/ui/console_layout.lua");
+    EXPECT_NE(std::string::npos, layout.find("ui_windows_ini")) << layout;
+    run.expect_golden("opened.png", "console_opened_1024x768");
+    run.expect_golden("exported.png", "console_exported_1024x768");
+    run.expect_golden("completed.png", "console_completed_1024x768");
+    run.expect_golden("closed.png", "demo_scene_1024x768");
+}
