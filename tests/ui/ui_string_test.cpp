@@ -68,7 +68,9 @@ TEST(String, Utf8RoundTripsAndInvalidBytesBecomeReplacementCharacters) {
         SCOPED_TRACE(row.mp_utf8);
         CString const text(row.mp_utf8);
         EXPECT_EQ(units(row.m_units), text);
-        if (row.m_round_trip) EXPECT_STREQ(row.mp_utf8, text.get_c());
+        if (row.m_round_trip) {
+            EXPECT_STREQ(row.mp_utf8, text.get_c());
+        }
     }
     // Unpaired surrogates have no UTF-8 form and leave as the replacement character.
     unsigned short const lonely[] = {'x', 0xD83D, 'y', 0xDE00, 0};
