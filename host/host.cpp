@@ -170,7 +170,7 @@ int CHost::run() {
 
 bool CHost::start() {
     if (!mp_ui && !load_ui()) return false;
-    mp_ui->init(false);
+    mp_ui->init(true); // the console starts closed; its key opens it
     run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());

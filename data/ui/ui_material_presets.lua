@@ -42,8 +42,8 @@ ui_material_presets = {
     -- Lists: the row under the pointer and the chosen row.
     row_under_pointer = { material_template = "ui_color", color = { r = 78, g = 100, b = 140, a = 160 } },
     row_chosen = { material_template = "ui_color", color = { r = 236, g = 186, b = 84, a = 110 } },
-    -- The desktop, the bar along its top, the dialogs' bodies and title bars, the text fields on
-    -- them and the caret of an edit box.
+    -- The desktop, the bar along its top, the dialogs' bodies and their title bars and frames, the
+    -- text fields on them and the caret of an edit box.
     desktop = { material_template = "ui_color", color = { r = 22, g = 26, b = 34, a = 255 } },
     top_bar = { material_template = "ui_color", color = { r = 40, g = 48, b = 66, a = 255 } },
     panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 235 } },
