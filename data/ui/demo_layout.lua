@@ -351,23 +351,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border right",
@@ -402,23 +386,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border top",
@@ -453,23 +421,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border bottom",
