@@ -193,6 +193,9 @@ bool CHost::start() {
     run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());
+    // The library puts its pointer where the pointer is at the first movement; one of nothing tells
+    // it at once, so that the pointer isn't drawn in the corner until the mouse moves.
+    m_input.pointer_move(vec2_t{0.0f, 0.0f});
     return true;
 }
 

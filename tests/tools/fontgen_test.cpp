@@ -305,6 +305,23 @@ TEST(Fontgen, TheGridHoldsTheWidestGlyphAndTheTallestLineWithASparePixel) {
     // A line of 16 takes cells of 32 for its spare pixel; a line of 15 fits cells of 16.
     EXPECT_EQ(32, qorfontgen::plan_grid({glyph_box(0, 12, 4, 16, 5)}, 12, -4).m_cell);
     EXPECT_EQ(16, qorfontgen::plan_grid({glyph_box(0, 12, 4, 15, 5)}, 12, -3).m_cell);
+    // A side given is cut into the fewest cells that hold the glyphs: 161 glyphs need 13 by 13
+    // cells or more, and 15 cells of 20 are the first to divide 300 pixels.
+    std::vector<qorfontgen::SGlyph> const many(161, glyph_box(0, 13, 4, 17, 9)); // cells of 18 needed
+    qorfontgen::SGrid const given = qorfontgen::plan_grid(many, 13, -4, 300);
+    EXPECT_EQ(15, given.m_dimension);
+    EXPECT_EQ(20, given.m_cell);
+    EXPECT_EQ(300, given.m_texture);
+    EXPECT_EQ(16, qorfontgen::plan_grid(many, 13, -4, 288).m_dimension); // cells of exactly 18
+    try {
+        qorfontgen::plan_grid(many, 13, -4, 200);
+        ADD_FAILURE() << "accepted";
+    } catch (qorfontgen::CFontgenError const &error) {
+        EXPECT_STREQ(
+            "no grid of cells of 18 pixels or more fills a texture of 200 pixels with 161 characters: ask "
+            "for another texture side",
+            error.what());
+    }
     try { // 65536 glyphs need 256 cells per side; cells of 32 make 8192 pixels
         qorfontgen::plan_grid(std::vector<qorfontgen::SGlyph>(65536, glyph_box(0, 15, 4, 18, 5)), 15, -3);
         ADD_FAILURE() << "accepted";
@@ -332,6 +349,8 @@ TEST(Fontgen, BadInputEndsWithCodeOneAndWritesNothing) {
         {run(text, "15", "32-126"), "qorfontgen: '" + text + "' is no font that FreeType can read\n"},
         {run(SANS, "15", "126-32"), "qorfontgen: bad range '126-32': its first code is above its last\n"},
         {run(SANS, "0", "32"), "qorfontgen: bad size '0': give 4 to 256 pixels\n"},
+        {run_fontgen(dir, {"--font", SANS, "--size", "15", "--chars", "32", "--out", out, "--texture", "8"}),
+         "qorfontgen: bad texture side '8': give 16 to 4096 pixels\n"},
         {run_fontgen(dir, {"--font", SANS, "--size", "15", "--chars", "32"}),
          "qorfontgen: option '--out' is missing\n"},
         {run(SANS, "15", "0xFFFF"), "qorfontgen: warning: '" + SANS +
@@ -365,11 +384,13 @@ TEST(Fontgen, TheDefaultFontsHaveAsciiAndCyrillicAtOneTexelPerPixel) {
         EXPECT_EQ(2u, charset.m_chars.count(0x401) + charset.m_chars.count(0x451));
         EXPECT_EQ(32, charset.m_chars.begin()->first) << "a missing character is drawn as a space";
         EXPECT_EQ(static_cast<int>(entry.m_size), read_texture(data + "/textures/" + entry.m_texture).m_w);
-        EXPECT_GE(static_cast<int>(charset.m_height * entry.m_size), 16); // a line of 16 to 24 pixels
+        EXPECT_GE(static_cast<int>(charset.m_height * entry.m_size), 15); // a line of 15 to 24 pixels
         EXPECT_LE(static_cast<int>(charset.m_height * entry.m_size), 24);
         if (entry.m_charset_name == "courier") {
             for (auto const &c : charset.m_chars)
                 EXPECT_EQ(charset.m_chars.begin()->second.m_w, c.second.m_w) << c.first;
+            // The size the build-version page draws the fixed font at: one texel a pixel there too.
+            EXPECT_EQ(300.0, entry.m_size);
         }
     }
 }
