@@ -29,6 +29,17 @@ struct SWindowDemo {
     }
 };
 
+// SDL's driver, and for OpenGL the implementation that draws (Mesa's "llvmpipe" under Xvfb).
+std::string driver(qorhost::CSdlRenderer const &_screen) {
+    std::string name = _screen.get_driver();
+    typedef unsigned char const *(*get_string_t)(unsigned);
+    unsigned const gl_renderer = 0x1F01;
+    auto p_get_string = reinterpret_cast<get_string_t>(SDL_GL_GetProcAddress("glGetString"));
+    unsigned char const *p_gl =
+        name.rfind("opengl", 0) == 0 && p_get_string ? p_get_string(gl_renderer) : nullptr;
+    return p_gl ? name + " (" + reinterpret_cast<char const *>(p_gl) + ")" : name;
+}
+
 // One for the process: the library's service is a static of the process.
 SWindowDemo &window_demo() {
     static SWindowDemo s_demo;
@@ -54,7 +65,7 @@ void BM_WindowHostStep(benchmark::State &_state) {
     unsigned const batches = demo.m_window.screen()->get_batches_drawn();
     for (auto _ : _state)
         demo.m_window.step();
-    _state.SetLabel(demo.m_window.screen()->get_driver());
+    _state.SetLabel(driver(*demo.m_window.screen()));
     _state.counters["batches"] = static_cast<double>(demo.m_window.screen()->get_batches_drawn() - batches) /
                                  static_cast<double>(_state.iterations());
     _state.counters["fps"] =

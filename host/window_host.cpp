@@ -18,7 +18,7 @@ namespace {
 // The library's desktop, whatever the screen's size.
 float const k_desktop_w = 1024.0f;
 float const k_desktop_h = 768.0f;
-Uint32 const k_frame_ms = 16;
+unsigned const k_frames_per_second = 60;
 
 struct SKeyCode {
     int m_sdl; // SDL_Keycode or SDL_Scancode
@@ -259,13 +259,20 @@ bool CWindowHost::step() {
     return true;
 }
 
+// Frames are due at a steady rate; a frame that comes early waits for its time, and a run that
+// falls behind by more than a frame starts its count again rather than rushing to catch up.
 unsigned CWindowHost::run(unsigned _frames) {
     unsigned const first = m_presented;
+    Uint64 const period = SDL_GetPerformanceFrequency() / k_frames_per_second;
+    Uint64 due = SDL_GetPerformanceCounter();
     while (_frames == 0 || m_presented - first < _frames) {
-        Uint32 const begin = SDL_GetTicks();
         if (!step()) break;
-        Uint32 const spent = SDL_GetTicks() - begin;
-        if (spent < k_frame_ms) SDL_Delay(k_frame_ms - spent);
+        due += period;
+        Uint64 const now = SDL_GetPerformanceCounter();
+        if (now < due)
+            SDL_Delay(static_cast<Uint32>((due - now) * 1000 / SDL_GetPerformanceFrequency()));
+        else if (now - due > period)
+            due = now;
     }
     return m_presented - first;
 }

@@ -48,8 +48,8 @@ public:
     // Sound goes to the audio device when one opens, otherwise the sources stay silent and a
     // warning says why.
     bool open(std::string &_error);
-    // Frames until the window is closed or, when _frames isn't 0, _frames of them, about 60 a
-    // second. Result the number presented.
+    // Frames until the window is closed or, when _frames isn't 0, _frames of them, 60 a second
+    // while they are drawn in time. Result the number presented.
     unsigned run(unsigned _frames);
     // The events, then a frame shown; false, with nothing shown, once the window is closed.
     bool step();
