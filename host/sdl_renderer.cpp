@@ -2,7 +2,7 @@
 //
 //   frame      clear, the picture read back, present
 //   drawing    quads and lines as vertex-coloured triangles
-//   batches    the vertices that share a texture and a clip, drawn at once
+//   batches    the vertices that share a texture, a clip and whether they blend, drawn at once
 #include "sdl_renderer.h"
 
 #include "qordebug.h"
@@ -17,14 +17,13 @@ namespace qorhost {
 
 CSdlRenderer::CSdlRenderer(SDL_Renderer *_p_renderer, int _w, int _h)
     : CHostRenderer(_w, _h), mp_renderer(_p_renderer), m_batch_clip(m_clip) {
-    SDL_SetRenderDrawBlendMode(mp_renderer, SDL_BLENDMODE_BLEND);
     m_vertices.reserve(4096);
     m_indices.reserve(6144);
 }
 
 CSdlRenderer::~CSdlRenderer() {
     for (auto const &entry : m_textures)
-        SDL_DestroyTexture(entry.second);
+        if (entry.second.mp_texture) SDL_DestroyTexture(entry.second.mp_texture);
 }
 
 std::string CSdlRenderer::get_driver() const {
@@ -68,7 +67,8 @@ SDL_Vertex CSdlRenderer::vertex(float _x, float _y, vec2_t const &_t, rgba_t con
 void CSdlRenderer::draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const &_c0, vec2_t const &_p1,
                              vec2_t const &_t1, rgba_t const &_c1, vec2_t const &_p2, vec2_t const &_t2,
                              rgba_t const &_c2, vec2_t const &_p3, vec2_t const &_t3, rgba_t const &_c3) {
-    if (!begin_batch(current_texture())) return;
+    bool const opaque = _c0.a == 255 && _c1.a == 255 && _c2.a == 255 && _c3.a == 255;
+    if (!begin_batch(current_texture(), opaque)) return;
     add_quad(
         {vertex(pixel_x(_p0.x), pixel_y(_p0.y), _t0, _c0), vertex(pixel_x(_p1.x), pixel_y(_p1.y), _t1, _c1),
          vertex(pixel_x(_p2.x), pixel_y(_p2.y), _t2, _c2), vertex(pixel_x(_p3.x), pixel_y(_p3.y), _t3, _c3)});
@@ -78,7 +78,7 @@ void CSdlRenderer::draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const 
 // its colour interpolated along it.
 void CSdlRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, vec2_t const &_to,
                              rgba_t const &_c_to, float) {
-    if (!begin_batch(nullptr)) return;
+    if (!begin_batch(nullptr, _c_from.a == 255 && _c_to.a == 255)) return;
     float const ax = std::floor(pixel_x(_from.x)) + 0.5f, ay = std::floor(pixel_y(_from.y)) + 0.5f;
     float const bx = std::floor(pixel_x(_to.x)) + 0.5f, by = std::floor(pixel_y(_to.y)) + 0.5f;
     float const length = std::hypot(bx - ax, by - ay);
@@ -95,11 +95,13 @@ void CSdlRenderer::draw_line(vec2_t const &_from, rgba_t const &_c_from, vec2_t 
 // Batches
 // ---------------------------------------------------------------------------------------------
 
-bool CSdlRenderer::begin_batch(SImage const *_p_texture) {
+bool CSdlRenderer::begin_batch(SImage const *_p_texture, bool _opaque) {
     if (m_clip.m_x0 >= m_clip.m_x1 || m_clip.m_y0 >= m_clip.m_y1) return false;
-    if (_p_texture != mp_batch_texture || m_clip != m_batch_clip) flush();
+    bool const opaque = _opaque && (!_p_texture || uploaded(_p_texture).m_opaque);
+    if (_p_texture != mp_batch_texture || m_clip != m_batch_clip || opaque != m_batch_opaque) flush();
     mp_batch_texture = _p_texture;
     m_batch_clip = m_clip;
+    m_batch_opaque = opaque;
     return true;
 }
 
@@ -115,32 +117,37 @@ void CSdlRenderer::flush() {
     SDL_Rect const clip = {m_batch_clip.m_x0, m_batch_clip.m_y0, m_batch_clip.m_x1 - m_batch_clip.m_x0,
                            m_batch_clip.m_y1 - m_batch_clip.m_y0};
     SDL_RenderSetClipRect(mp_renderer, &clip);
-    if (SDL_RenderGeometry(mp_renderer, uploaded(mp_batch_texture), m_vertices.data(),
-                           static_cast<int>(m_vertices.size()), m_indices.data(),
-                           static_cast<int>(m_indices.size())) != 0)
+    SDL_BlendMode const blend = m_batch_opaque ? SDL_BLENDMODE_NONE : SDL_BLENDMODE_BLEND;
+    SDL_Texture *p_texture = mp_batch_texture ? uploaded(mp_batch_texture).mp_texture : nullptr;
+    if (p_texture)
+        SDL_SetTextureBlendMode(p_texture, blend);
+    else
+        SDL_SetRenderDrawBlendMode(mp_renderer, blend);
+    if (SDL_RenderGeometry(mp_renderer, p_texture, m_vertices.data(), static_cast<int>(m_vertices.size()),
+                           m_indices.data(), static_cast<int>(m_indices.size())) != 0)
         qordebug::warning("The window's renderer can't draw: %s", SDL_GetError());
     ++m_batches_drawn;
     m_vertices.clear();
     m_indices.clear();
 }
 
-// A texture the first time it is drawn, kept for the renderer's life as the picture is; null for
-// none, and for one that SDL can't make (its quads then show their vertex colour).
-SDL_Texture *CSdlRenderer::uploaded(SImage const *_p_texture) {
-    if (!_p_texture) return nullptr;
+// A texture the first time it is drawn, kept for the renderer's life as the picture is. One that
+// SDL can't make is reported once; its quads then show their vertex colour.
+CSdlRenderer::STexture const &CSdlRenderer::uploaded(SImage const *_p_texture) {
     auto found = m_textures.find(_p_texture);
     if (found != m_textures.end()) return found->second;
-    SDL_Texture *p_texture = SDL_CreateTexture(mp_renderer, SDL_PIXELFORMAT_RGBA32, SDL_TEXTUREACCESS_STATIC,
-                                               _p_texture->m_w, _p_texture->m_h);
-    if (p_texture) {
-        SDL_UpdateTexture(p_texture, nullptr, _p_texture->m_pixels.data(), _p_texture->m_w * 4);
-        SDL_SetTextureBlendMode(p_texture, SDL_BLENDMODE_BLEND);
-        SDL_SetTextureScaleMode(p_texture, SDL_ScaleModeNearest);
+    STexture texture = {SDL_CreateTexture(mp_renderer, SDL_PIXELFORMAT_RGBA32, SDL_TEXTUREACCESS_STATIC,
+                                          _p_texture->m_w, _p_texture->m_h),
+                        true};
+    if (texture.mp_texture) {
+        SDL_UpdateTexture(texture.mp_texture, nullptr, _p_texture->m_pixels.data(), _p_texture->m_w * 4);
+        SDL_SetTextureScaleMode(texture.mp_texture, SDL_ScaleModeNearest);
     } else {
         qordebug::warning("The window's renderer can't make a texture: %s", SDL_GetError());
     }
-    m_textures[_p_texture] = p_texture;
-    return p_texture;
+    for (size_t i = 3; i < _p_texture->m_pixels.size() && texture.m_opaque; i += 4)
+        texture.m_opaque = _p_texture->m_pixels[i] == 255;
+    return m_textures[_p_texture] = texture;
 }
 
 } // namespace qorhost

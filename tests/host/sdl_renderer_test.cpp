@@ -1,7 +1,8 @@
 // The window's renderer on SDL's offscreen video driver, which draws with OpenGL where the system
 // has it (Mesa's software OpenGL through EGL as a rule, no display needed): the same calls as the
-// software renderer give the same picture, read back through the frame sink; quads of one texture
-// and clip go to SDL in one batch, and an empty clip draws nothing.
+// software renderer give the same picture, read back through the frame sink, opaque batches copied
+// without blending; quads of one texture and clip go to SDL in one batch, and an empty clip draws
+// nothing.
 #ifdef QORHOST_WITH_SDL2
 #include "host_test_support.h"
 #include "sdl_renderer.h"
@@ -33,6 +34,10 @@ protected:
                 picture.m_pixels.insert(picture.m_pixels.end(),
                                         {uint8_t(x * 32), uint8_t(y * 32), 90, uint8_t(x < 4 ? 255 : 128)});
         EXPECT_TRUE(write_png(m_dir.file("picture.png"), picture));
+        SImage solid = picture; // opaque
+        for (size_t i = 3; i < solid.m_pixels.size(); i += 4)
+            solid.m_pixels[i] = 255;
+        EXPECT_TRUE(write_png(m_dir.file("solid.png"), solid));
     }
     ~SdlRendererTest() override {
         mp_screen.reset();
@@ -50,11 +55,12 @@ protected:
                             at(_x1, _y1), vec2_t{1, 1}, _colour, at(_x0, _y1), vec2_t{0, 1}, _colour);
     }
     // A scene of what an interface draws: opaque and translucent colour, a picture at its own size
-    // and at twice it, tinted, and clipped to a corner; a line of two colours.
+    // and at twice it, tinted, and clipped to a corner; an opaque picture; a line of two colours.
     void draw_scene(CHostRenderer &_renderer) {
         _renderer.set_texture_folders({m_dir.path()});
         int const colour = _renderer.create_material("ui_color", nullptr, 0, 0, 0, 0, false, false);
         int const image = _renderer.create_material("ui_image", "picture.png", 0, 0, 0, 0, false, false);
+        int const solid = _renderer.create_material("ui_image", "solid.png", 0, 0, 0, 0, false, false);
         _renderer.begin_frame(rgba_t(10, 20, 30, 255));
         _renderer.set_material(colour);
         rect(_renderer, 2, 2, 40, 30, rgba_t(60, 70, 120, 255));
@@ -66,6 +72,8 @@ protected:
         _renderer.set_clip_rect(vec2_t{0.25f, -1.0f}, vec2_t{0.5f, 0.5f}); // x 40 to 56, y 36 to 48
         rect(_renderer, 36, 30, 60, 46, rgba_t(255, 255, 255, 200)); // three pixels a texel across, two down
         _renderer.pop_clip_rect();
+        _renderer.set_material(solid);
+        rect(_renderer, 42, 2, 58, 18, rgba_t(200, 255, 100, 255));
         _renderer.draw_line(at(2.5f, 40.5f), rgba_t(0, 0, 0, 255), at(30.5f, 40.5f), rgba_t(56, 0, 0, 255),
                             1);
     }
@@ -98,9 +106,10 @@ TEST_F(SdlRendererTest, TheWindowShowsWhatTheSoftwareRendererDraws) {
 TEST_F(SdlRendererTest, QuadsOfOneTextureAndClipAreOneBatchAndAnEmptyClipDrawsNothing) {
     ASSERT_TRUE(mp_screen);
     draw_scene(*mp_screen);
-    // Colour, the picture, the picture clipped, the line.
+    // Opaque colour, translucent colour, the picture, the picture clipped, the opaque picture (not
+    // blended), the line.
     mp_screen->present();
-    EXPECT_EQ(4u, mp_screen->get_batches_drawn());
+    EXPECT_EQ(6u, mp_screen->get_batches_drawn());
     mp_screen->begin_frame(rgba_t(1, 2, 3, 255));
     mp_screen->set_clip_rect(vec2_t{0, 0}, vec2_t{0, 0});
     rect(*mp_screen, 0, 0, k_w, k_h, rgba_t(255, 255, 255, 255));
@@ -109,6 +118,6 @@ TEST_F(SdlRendererTest, QuadsOfOneTextureAndClipAreOneBatchAndAnEmptyClipDrawsNo
     CSoftwareRenderer cleared(k_w, k_h);
     cleared.begin_frame(rgba_t(1, 2, 3, 255));
     EXPECT_EQ(0, compare_images(presented(*mp_screen), cleared.get_frame(), 0));
-    EXPECT_EQ(4u, mp_screen->get_batches_drawn());
+    EXPECT_EQ(6u, mp_screen->get_batches_drawn());
 }
 #endif
