@@ -59,6 +59,12 @@ uint8_t round_to_byte(float _value) {
     return static_cast<uint8_t>(static_cast<double>(_value) + 0.5);
 }
 
+// A whole pixel position held to the clip's range _low to _high, taken in float first so that a
+// position far off the frame doesn't overflow an int.
+int in_clip(float _pixel, int _low, int _high) {
+    return static_cast<int>(std::clamp(_pixel, static_cast<float>(_low), static_cast<float>(_high)));
+}
+
 // In double: with snapped positions the products are exact, so the fill rule decides every tie.
 float edge(double _ax, double _ay, double _bx, double _by, double _px, double _py) {
     double const value = (_bx - _ax) * (_py - _ay) - (_by - _ay) * (_px - _ax);
@@ -102,7 +108,7 @@ bool CSoftwareRenderer::make_triangle(SVertex const &_a, SVertex const &_b, SVer
                                       STriangle &_triangle) {
     SVertex const *p0 = &_a, *p1 = &_b, *p2 = &_c;
     float area = edge(p0->m_x, p0->m_y, p1->m_x, p1->m_y, p2->m_x, p2->m_y);
-    if (area == 0.0f) return false;
+    if (area == 0.0f || std::isnan(area)) return false;
     if (area < 0.0f) {
         std::swap(p1, p2);
         area = -area;
@@ -128,14 +134,10 @@ bool CSoftwareRenderer::covers(STriangle const &_triangle, int _x, int _y, float
 
 void CSoftwareRenderer::draw_triangle(STriangle const &_triangle, SImage const *_p_texture) {
     SVertex const *const *v = _triangle.mp_v;
-    int const x0 =
-        std::max(m_clip.m_x0, static_cast<int>(std::floor(std::min({v[0]->m_x, v[1]->m_x, v[2]->m_x}))));
-    int const x1 =
-        std::min(m_clip.m_x1, static_cast<int>(std::ceil(std::max({v[0]->m_x, v[1]->m_x, v[2]->m_x}))));
-    int const y0 =
-        std::max(m_clip.m_y0, static_cast<int>(std::floor(std::min({v[0]->m_y, v[1]->m_y, v[2]->m_y}))));
-    int const y1 =
-        std::min(m_clip.m_y1, static_cast<int>(std::ceil(std::max({v[0]->m_y, v[1]->m_y, v[2]->m_y}))));
+    int const x0 = in_clip(std::floor(std::min({v[0]->m_x, v[1]->m_x, v[2]->m_x})), m_clip.m_x0, m_clip.m_x1);
+    int const x1 = in_clip(std::ceil(std::max({v[0]->m_x, v[1]->m_x, v[2]->m_x})), m_clip.m_x0, m_clip.m_x1);
+    int const y0 = in_clip(std::floor(std::min({v[0]->m_y, v[1]->m_y, v[2]->m_y})), m_clip.m_y0, m_clip.m_y1);
+    int const y1 = in_clip(std::ceil(std::max({v[0]->m_y, v[1]->m_y, v[2]->m_y})), m_clip.m_y0, m_clip.m_y1);
     float w[3];
     for (int y = y0; y < y1; ++y)
         for (int x = x0; x < x1; ++x)
@@ -273,10 +275,10 @@ bool CSoftwareRenderer::fill_rect(SVertex const (&_v)[4], STriangle const (&_hal
     SVertex const &left = _v[0].m_x < _v[2].m_x ? _v[0] : _v[2], &right = &left == &_v[0] ? _v[2] : _v[0];
     SVertex const &top = _v[0].m_y < _v[2].m_y ? _v[0] : _v[2], &bottom = &top == &_v[0] ? _v[2] : _v[0];
     // Pixel centres from the left and top edges up to the right and bottom ones.
-    int const x0 = std::max(m_clip.m_x0, static_cast<int>(std::ceil(left.m_x - 0.5f)));
-    int const x1 = std::min(m_clip.m_x1, static_cast<int>(std::ceil(right.m_x - 0.5f)));
-    int const y0 = std::max(m_clip.m_y0, static_cast<int>(std::ceil(top.m_y - 0.5f)));
-    int const y1 = std::min(m_clip.m_y1, static_cast<int>(std::ceil(bottom.m_y - 0.5f)));
+    int const x0 = in_clip(std::ceil(left.m_x - 0.5f), m_clip.m_x0, m_clip.m_x1);
+    int const x1 = in_clip(std::ceil(right.m_x - 0.5f), m_clip.m_x0, m_clip.m_x1);
+    int const y0 = in_clip(std::ceil(top.m_y - 0.5f), m_clip.m_y0, m_clip.m_y1);
+    int const y1 = in_clip(std::ceil(bottom.m_y - 0.5f), m_clip.m_y0, m_clip.m_y1);
     if (x0 >= x1 || y0 >= y1) return true;
 
     int const colour[4] = {int(_v[0].m_rgba[0]), int(_v[0].m_rgba[1]), int(_v[0].m_rgba[2]),
