@@ -90,6 +90,15 @@ CMaterial *colour(CDesktop *_p_desktop, unsigned char _r, unsigned char _g, unsi
     return p_material;
 }
 
+// The configured background picture, as an imported layout shows it.
+CMaterial *background(CDesktop *_p_desktop) {
+    CMaterial *p_material = _p_desktop->create_material();
+    if (!p_material) return nullptr;
+    char const *p_picture = qorbase::get_config_string("ui", "background", "_back.tga");
+    p_material->init("ui_image", p_picture, nullptr, nullptr, nullptr, nullptr, true, false);
+    return p_material;
+}
+
 // A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
 // by name.
 CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
@@ -179,7 +188,7 @@ CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *
                            int _w, int _h) {
     CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, _w, _h);
     p_dialog->set_can_drag(true);
-    p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
+    p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48));
     CWindowVisual *p_title = place(p_dialog, new CWindowVisual(_p_desktop, "title bar"), 0, 0, _w, 26);
     p_title->set_passive(true);
     p_title->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
@@ -433,7 +442,7 @@ void cmd_gameui_demo_scene(char const *, void *) {
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
     CDesktop *p_desktop = p_ui ? p_ui->get_desktop() : nullptr;
     if (!p_desktop) return;
-    p_desktop->add_material(MAT_NAME_NORMAL, colour(p_desktop, 22, 26, 34));
+    p_desktop->add_material(MAT_NAME_NORMAL, background(p_desktop));
     CWindowVisual *p_bar = place(p_desktop, new CWindowVisual(p_desktop, "top bar"), 0, 0, 1024, 36);
     p_bar->set_alignment(ALIGNMENT_TOP);
     p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
