@@ -39,8 +39,8 @@ CInterfaceServer &new_server() {
 
 CHost::CHost(SHostOptions const &_options)
     : m_options(_options), m_server(new_server()), m_commands(&m_vars), mp_engine_logger(nullptr),
-      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0),
-      m_start_tick(qorplatform::get_tick_count()) {
+      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_active_renderer(&m_renderer),
+      mp_ui(nullptr), m_frame_time(0), m_start_tick(qorplatform::get_tick_count()) {
     m_log.set_quiet(m_options.m_quiet);
     mp_engine_logger = m_log.create_logger("Engine", "");
     qorbase::set_log_sink(log_sink, this);
@@ -62,10 +62,21 @@ CHost::CHost(SHostOptions const &_options)
     m_server.register_interface(&m_level);
     m_server.register_interface(&m_log);
     m_server.register_interface(&m_sound);
-    if (m_options.m_record)
-        m_server.register_interface(&m_recorder);
-    else
-        m_server.register_interface(&m_renderer);
+    m_server.register_interface(served(&m_renderer));
+}
+
+// The software renderer goes on the server behind the recorder when there is one.
+IRenderQOR *CHost::served(CHostRenderer *_p_renderer) {
+    return _p_renderer == &m_renderer && m_options.m_record ? static_cast<IRenderQOR *>(&m_recorder)
+                                                            : _p_renderer;
+}
+
+void CHost::use_renderer(CHostRenderer &_renderer) {
+    if (&_renderer == mp_active_renderer) return;
+    m_server.withdraw_interface(served(mp_active_renderer));
+    _renderer.set_texture_folders(m_renderer.get_texture_folders());
+    m_server.register_interface(served(&_renderer));
+    mp_active_renderer = &_renderer;
 }
 
 // Every interface is withdrawn before it goes, so no module keeps a pointer to it; then the
@@ -125,10 +136,10 @@ void CHost::write_frame(SImage const &_frame, unsigned _index) {
 
 void CHost::frame() {
     if (!mp_ui) return;
-    m_renderer.begin_frame(rgba_t(0, 0, 0, 255));
+    mp_active_renderer->begin_frame(rgba_t(0, 0, 0, 255));
     mp_ui->update(static_cast<int>(m_frame_time));
     mp_ui->draw();
-    m_renderer.present();
+    mp_active_renderer->present();
     if (m_options.m_manual_clock) {
         m_clock.advance_ms(k_frame_ms);
         m_frame_time += k_frame_ms;
@@ -174,6 +185,9 @@ bool CHost::start() {
     run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());
+    // The library puts its pointer where the pointer is at the first movement; one of nothing tells
+    // it at once, so that the pointer isn't drawn in the corner until the mouse moves.
+    m_input.pointer_move(vec2_t{0.0f, 0.0f});
     return true;
 }
 

@@ -69,7 +69,13 @@ public:
     CVarManager &vars() { return m_vars; }
     CLogManager &log() { return m_log; }
     CSoundSystem &sound() { return m_sound; }
+    // The software renderer, which draws headless; and the renderer that the frames are drawn with.
     CSoftwareRenderer &renderer() { return m_renderer; }
+    CHostRenderer &active_renderer() { return *mp_active_renderer; }
+    // Frames are drawn with _renderer from now on, in place of the one on the server (the software
+    // renderer, or the recorder in front of it), with the host's texture folders; before start,
+    // since the library keeps the renderer it finds at init.
+    void use_renderer(CHostRenderer &_renderer);
     CRecordingRenderer &recorder() { return m_recorder; }
     CLevelDescription &level() { return m_level; }
     qorplatform::CManualClock &clock() { return m_clock; }
@@ -81,6 +87,7 @@ public:
 private:
     void run_startup_commands();
     void configure_files();
+    IRenderQOR *served(CHostRenderer *_p_renderer);
     void write_frame(SImage const &_frame, unsigned _index);
     static void log_sink(char const *_line, void *_user);
 
@@ -95,6 +102,7 @@ private:
     CSoundSystem m_sound;
     CSoftwareRenderer m_renderer;
     CRecordingRenderer m_recorder;
+    CHostRenderer *mp_active_renderer; // the one on the server, or the recorder's target
     qorplatform::CManualClock m_clock;
     qorui::IUserInterface *mp_ui;
     unsigned m_frame_time; // handed to update, ms: 16 a frame on the manual clock, else since m_start_tick

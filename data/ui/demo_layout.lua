@@ -42,7 +42,23 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                material_preset = "top_bar",
+                color = {
+                    a = 255,
+                    b = 66,
+                    g = 48,
+                    r = 40,
+                },
+                load_textures_from_game_save = false,
+                material_template = "ui_color",
+                pos = {
+                    [1] = 0,
+                    [2] = 0,
+                },
+                precache_enable = true,
+                size = {
+                    [1] = 1,
+                    [2] = 1,
+                },
             },
         },
         name = "top bar",
@@ -105,7 +121,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "title bar",
@@ -281,7 +313,23 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                material_preset = "panel",
+                color = {
+                    a = 255,
+                    b = 48,
+                    g = 36,
+                    r = 30,
+                },
+                load_textures_from_game_save = false,
+                material_template = "ui_color",
+                pos = {
+                    [1] = 0,
+                    [2] = 0,
+                },
+                precache_enable = true,
+                size = {
+                    [1] = 1,
+                    [2] = 1,
+                },
             },
         },
         name = "dialog",
@@ -316,7 +364,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "border left",
@@ -351,7 +415,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "border right",
@@ -386,7 +466,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "border top",
@@ -421,7 +517,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "border bottom",
@@ -585,7 +697,23 @@ ui_windows_ini = {
         left_margin = 16,
         materials = {
             MAT_NAME_NORMAL = {
-                material_preset = "panel",
+                color = {
+                    a = 255,
+                    b = 48,
+                    g = 36,
+                    r = 30,
+                },
+                load_textures_from_game_save = false,
+                material_template = "ui_color",
+                pos = {
+                    [1] = 0,
+                    [2] = 0,
+                },
+                precache_enable = true,
+                size = {
+                    [1] = 1,
+                    [2] = 1,
+                },
             },
         },
         name = "second dialog",
@@ -648,7 +776,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "title bar",
@@ -1350,7 +1494,23 @@ ui_windows_ini = {
                 left_margin = 0,
                 materials = {
                     MAT_NAME_CHECKED = {
-                        material_preset = "caret",
+                        color = {
+                            a = 150,
+                            b = 120,
+                            g = 120,
+                            r = 120,
+                        },
+                        load_textures_from_game_save = false,
+                        material_template = "ui_color",
+                        pos = {
+                            [1] = 0,
+                            [2] = 0,
+                        },
+                        precache_enable = true,
+                        size = {
+                            [1] = 1,
+                            [2] = 1,
+                        },
                     },
                     MAT_NAME_NORMAL = {},
                 },
@@ -1463,7 +1623,23 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                material_preset = "panel",
+                color = {
+                    a = 255,
+                    b = 48,
+                    g = 36,
+                    r = 30,
+                },
+                load_textures_from_game_save = false,
+                material_template = "ui_color",
+                pos = {
+                    [1] = 0,
+                    [2] = 0,
+                },
+                precache_enable = true,
+                size = {
+                    [1] = 1,
+                    [2] = 1,
+                },
             },
         },
         name = "controls",
@@ -1526,7 +1702,23 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    material_preset = "title_bar",
+                    color = {
+                        a = 255,
+                        b = 150,
+                        g = 70,
+                        r = 90,
+                    },
+                    load_textures_from_game_save = false,
+                    material_template = "ui_color",
+                    pos = {
+                        [1] = 0,
+                        [2] = 0,
+                    },
+                    precache_enable = true,
+                    size = {
+                        [1] = 1,
+                        [2] = 1,
+                    },
                 },
             },
             name = "title bar",
@@ -3109,7 +3301,23 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                material_preset = "panel",
+                color = {
+                    a = 255,
+                    b = 48,
+                    g = 36,
+                    r = 30,
+                },
+                load_textures_from_game_save = false,
+                material_template = "ui_color",
+                pos = {
+                    [1] = 0,
+                    [2] = 0,
+                },
+                precache_enable = true,
+                size = {
+                    [1] = 1,
+                    [2] = 1,
+                },
             },
         },
         name = "options",
@@ -3190,7 +3398,23 @@ ui_windows_ini = {
             material_preset = "arrow_up_pushed",
         },
         MAT_NAME_NORMAL = {
-            material_preset = "desktop",
+            color = {
+                a = 255,
+                b = 34,
+                g = 26,
+                r = 22,
+            },
+            load_textures_from_game_save = false,
+            material_template = "ui_color",
+            pos = {
+                [1] = 0,
+                [2] = 0,
+            },
+            precache_enable = true,
+            size = {
+                [1] = 1,
+                [2] = 1,
+            },
         },
     },
     name = "desktop",

@@ -42,11 +42,12 @@ ui_material_presets = {
     -- Lists: the row under the pointer and the chosen row.
     row_under_pointer = { material_template = "ui_color", color = { r = 78, g = 100, b = 140, a = 160 } },
     row_chosen = { material_template = "ui_color", color = { r = 236, g = 186, b = 84, a = 110 } },
-    -- The desktop, the bar along its top, the dialogs' bodies and their title bars and frames, the
-    -- text fields on them and the caret of an edit box.
-    desktop = { material_template = "ui_color", color = { r = 22, g = 26, b = 34, a = 255 } },
+    -- The bar along the desktop's top, the dialogs' bodies (opaque, and the framed dialog's slightly
+    -- translucent) and their title bars and frames, the text fields on them and the caret of an
+    -- edit box.
     top_bar = { material_template = "ui_color", color = { r = 40, g = 48, b = 66, a = 255 } },
-    panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 235 } },
+    panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 255 } },
+    framed_panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 235 } },
     title_bar = { material_template = "ui_color", color = { r = 90, g = 70, b = 150, a = 255 } },
     text_field = { material_template = "ui_color", color = { r = 15, g = 15, b = 15, a = 150 } },
     caret = { material_template = "ui_color", color = { r = 120, g = 120, b = 120, a = 150 } },

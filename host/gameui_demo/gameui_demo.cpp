@@ -81,6 +81,15 @@ private:
 
 CWindowRegistrar<CDemoText> const s_demo_text_registrar("DemoText");
 
+// The configured background picture, as an imported layout shows it.
+CMaterial *background(CDesktop *_p_desktop) {
+    CMaterial *p_material = _p_desktop->create_material();
+    if (!p_material) return nullptr;
+    char const *p_picture = qorbase::get_config_string("ui", "background", "_back.tga");
+    p_material->init("ui_image", p_picture, nullptr, nullptr, nullptr, nullptr, true, false);
+    return p_material;
+}
+
 // A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
 // by name. Every material of the scene is one, so an export writes every preset back.
 CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
@@ -228,7 +237,7 @@ void ask(CDesktop *_p_desktop, CStaticText *_p_answer) {
 // opens a message box, and the answer stands below the text.
 void make_question_dialog(CDesktop *_p_desktop, char const *_name, char const *_caption, int _x, int _y) {
     CDialog *p_dialog = place(_p_desktop, new CDialog(_p_desktop, _name), _x, _y, 360, 200);
-    p_dialog->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "panel"));
+    p_dialog->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "framed_panel"));
     for (char const *p_edge : {"border left", "border right", "border top", "border bottom"})
         if (CBorder *p_border = class_cast<CBorder>(p_dialog->get_child(p_edge, "Border", true)))
             p_border->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "title_bar"));
@@ -422,7 +431,7 @@ void cmd_gameui_demo_scene(char const *, void *) {
     CDesktop *p_desktop = p_ui ? p_ui->get_desktop() : nullptr;
     if (!p_desktop) return;
     lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
-    p_desktop->add_material(MAT_NAME_NORMAL, preset(p_desktop, "desktop"));
+    p_desktop->add_material(MAT_NAME_NORMAL, background(p_desktop));
     CWindowVisual *p_bar = place(p_desktop, new CWindowVisual(p_desktop, "top bar"), 0, 0, 1024, 36);
     p_bar->set_alignment(ALIGNMENT_TOP);
     p_bar->add_material(MAT_NAME_NORMAL, preset(p_desktop, "top_bar"));

@@ -6,6 +6,7 @@
 #include "host_test_support.h"
 #include "qorbase.h"
 #include "sdl_audio.h"
+#include "sdl_renderer.h"
 #include "window_host.h"
 
 #include <gtest/gtest.h>
@@ -105,12 +106,9 @@ protected:
         ASSERT_TRUE(mp_window->open(error)) << error;
     }
     static void push(SDL_Event _event) { ASSERT_EQ(1, SDL_PushEvent(&_event)); }
-    rgba_t shown_pixel(int _x, int _y) const {
-        SDL_Rect const rect = {_x, _y, 1, 1};
-        uint8_t rgba[4] = {0, 0, 0, 0};
-        EXPECT_EQ(0, SDL_RenderReadPixels(mp_window->renderer(), &rect, SDL_PIXELFORMAT_RGBA32, rgba, 4))
-            << SDL_GetError();
-        return rgba_t(rgba[0], rgba[1], rgba[2], rgba[3]);
+    static rgba_t pixel(SImage const &_image, int _x, int _y) {
+        uint8_t const *p = _image.pixel(_x, _y);
+        return rgba_t(p[0], p[1], p[2], p[3]);
     }
 
     CTempDir m_dir;
@@ -225,21 +223,30 @@ TEST_F(WindowHostTest, RunsShowTheRenderersPictureUntilTheWindowCloses) {
     EXPECT_FALSE(mp_window->step()); // not open: nothing
     EXPECT_EQ(0u, mp_window->run(3));
     open();
-    // Without the UI library a frame draws nothing, so the picture drawn here is the one shown.
-    CSoftwareRenderer &renderer = mp_host->renderer();
+    // The host draws with the window's renderer while it is open; its frame sink sees what is
+    // shown. Without the UI library a frame draws nothing.
+    CHostRenderer &renderer = mp_host->active_renderer();
+    ASSERT_EQ(mp_window->screen(), &renderer);
+    SImage shown;
+    renderer.set_frame_sink([&](SImage const &_frame, unsigned) { shown = _frame; });
     renderer.begin_frame(rgba_t(10, 20, 30, 255));
     rgba_t const red(200, 0, 0, 255);
     renderer.draw_quad(vec2_t{-1, 1}, vec2_t{0, 0}, red, vec2_t{0, 1}, vec2_t{1, 0}, red, vec2_t{0, -1},
                        vec2_t{1, 1}, red, vec2_t{-1, -1}, vec2_t{0, 1}, red);
+    renderer.present();
+    ASSERT_EQ(512, shown.m_w);
+    EXPECT_EQ(red, pixel(shown, 10, 10));
+    EXPECT_EQ(red, pixel(shown, 255, 383));
+    EXPECT_EQ(rgba_t(10, 20, 30, 255), pixel(shown, 256, 0));
     EXPECT_EQ(3u, mp_window->run(3));
-    EXPECT_EQ(red, shown_pixel(10, 10));
-    EXPECT_EQ(red, shown_pixel(255, 383));
-    EXPECT_EQ(rgba_t(10, 20, 30, 255), shown_pixel(256, 0));
     push(event_of(SDL_QUIT));
     EXPECT_EQ(0u, mp_window->run(0)); // 0: until the window is closed
     EXPECT_TRUE(mp_window->is_closed());
     EXPECT_FALSE(mp_window->step());
     EXPECT_EQ(3u, mp_window->get_presented());
+    mp_window.reset(); // headless again
+    EXPECT_EQ(&mp_host->renderer(), &mp_host->active_renderer());
+    EXPECT_EQ(&mp_host->renderer(), mp_host->server().query_interface(qor_uid::RENDER, 1));
 }
 
 TEST_F(WindowHostTest, SoundGoesToTheAudioDeviceWhileTheWindowIsOpen) {

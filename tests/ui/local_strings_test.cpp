@@ -168,12 +168,15 @@ protected:
     }
     // Init with "strings_filename = _name" (none for null) and a strings file of those bytes.
     void init(char const *_name, std::string const &_bytes = "") {
+        // What the running service writes back (the console's place) goes to the old file first.
+        if (m_started) service().shutdown();
+        m_started = false;
+        qorbase::set_gdf_path(nullptr);
         qortest::write_file(m_dir + "/test.lang", _bytes);
         std::string gdf = "[ui]\n";
         if (_name) gdf += std::string("strings_filename = ") + _name + "\n";
         qortest::write_file(m_dir + "/qor.gdf", gdf + "[ui_libraries]\ngameui_library = libgameui_demo.so\n");
         qorbase::set_gdf_path((m_dir + "/qor.gdf").c_str());
-        if (m_started) service().shutdown();
         service().init(true);
         m_started = true;
     }
