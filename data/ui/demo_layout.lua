@@ -42,23 +42,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 66,
-                    g = 48,
-                    r = 40,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "top_bar",
             },
         },
         name = "top bar",
@@ -121,23 +105,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -313,23 +281,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "dialog",
@@ -364,23 +316,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border left",
@@ -415,23 +351,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border right",
@@ -466,23 +386,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border top",
@@ -517,23 +421,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "border bottom",
@@ -697,23 +585,7 @@ ui_windows_ini = {
         left_margin = 16,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "framed_panel",
             },
         },
         name = "second dialog",
@@ -776,23 +648,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -1494,23 +1350,7 @@ ui_windows_ini = {
                 left_margin = 0,
                 materials = {
                     MAT_NAME_CHECKED = {
-                        color = {
-                            a = 150,
-                            b = 120,
-                            g = 120,
-                            r = 120,
-                        },
-                        load_textures_from_game_save = false,
-                        material_template = "ui_color",
-                        pos = {
-                            [1] = 0,
-                            [2] = 0,
-                        },
-                        precache_enable = true,
-                        size = {
-                            [1] = 1,
-                            [2] = 1,
-                        },
+                        material_preset = "caret",
                     },
                     MAT_NAME_NORMAL = {},
                 },
@@ -1623,23 +1463,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "controls",
@@ -1702,23 +1526,7 @@ ui_windows_ini = {
             left_margin = 0,
             materials = {
                 MAT_NAME_NORMAL = {
-                    color = {
-                        a = 255,
-                        b = 150,
-                        g = 70,
-                        r = 90,
-                    },
-                    load_textures_from_game_save = false,
-                    material_template = "ui_color",
-                    pos = {
-                        [1] = 0,
-                        [2] = 0,
-                    },
-                    precache_enable = true,
-                    size = {
-                        [1] = 1,
-                        [2] = 1,
-                    },
+                    material_preset = "title_bar",
                 },
             },
             name = "title bar",
@@ -3301,23 +3109,7 @@ ui_windows_ini = {
         left_margin = 0,
         materials = {
             MAT_NAME_NORMAL = {
-                color = {
-                    a = 255,
-                    b = 48,
-                    g = 36,
-                    r = 30,
-                },
-                load_textures_from_game_save = false,
-                material_template = "ui_color",
-                pos = {
-                    [1] = 0,
-                    [2] = 0,
-                },
-                precache_enable = true,
-                size = {
-                    [1] = 1,
-                    [2] = 1,
-                },
+                material_preset = "panel",
             },
         },
         name = "options",
@@ -3400,12 +3192,13 @@ ui_windows_ini = {
         MAT_NAME_NORMAL = {
             color = {
                 a = 255,
-                b = 34,
-                g = 26,
-                r = 22,
+                b = 255,
+                g = 255,
+                r = 255,
             },
+            diffuse_texture = "_back.tga",
             load_textures_from_game_save = false,
-            material_template = "ui_color",
+            material_template = "ui_image",
             pos = {
                 [1] = 0,
                 [2] = 0,
