@@ -12,6 +12,7 @@
 #include "qor_commands.h"
 #include "qor_input.h"
 #include "qor_interfaces.h"
+#include "qor_log.h"
 #include "qor_platform.h"
 #include "qor_render.h"
 #include "qorbase.h"
@@ -23,6 +24,7 @@
 #include <cstdio>
 #include <dlfcn.h>
 #include <map>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -180,6 +182,59 @@ private:
 };
 
 // ---------------------------------------------------------------------------------------------
+// The log: named loggers whose lines are printed and kept; the console reads them back
+// ---------------------------------------------------------------------------------------------
+
+class CLog : public CInterface<ILogManager, qor_uid::LOG_MANAGER> {
+public:
+    ILogger *create_logger(char const *_name, char const *_prefix) override {
+        m_loggers.push_back(std::make_unique<CLogger>(*this, _name, _prefix ? _prefix : ""));
+        return m_loggers.back().get();
+    }
+    ILogger *find_logger(char const *_name) override {
+        for (auto const &p_logger : m_loggers)
+            if (p_logger->m_name == _name) return p_logger.get();
+        return nullptr;
+    }
+    void get_messages(ILogMessageVisitor &_visitor, unsigned _first, int _count) override {
+        for (unsigned i = _first; i < m_messages.size() && (_count < 0 || i < _first + unsigned(_count)); ++i)
+            _visitor.on_message(SLogMessage{m_messages[i].first.c_str(), m_messages[i].second, i});
+    }
+
+private:
+    class CLogger : public ILogger {
+    public:
+        CLogger(CLog &_log, std::string const &_name, std::string const &_prefix)
+            : m_name(_name), m_prefix(_prefix), m_log(_log) {}
+        char const *get_name() const override { return m_name.c_str(); }
+        void set_active(bool _active) override { m_active = _active; }
+        // 16-bit text as the log keeps it; only ASCII is printed here.
+        void write(unsigned short const *_text, int _level) override {
+            std::string narrow;
+            for (unsigned short const *p = _text; p && *p; ++p)
+                narrow += *p < 128 ? char(*p) : '?';
+            write(narrow.c_str(), _level);
+        }
+        void write(char const *_text, int _level) override {
+            if (!m_active || !_text) return;
+            std::string const line = m_prefix + _text;
+            printf("%s\n", line.c_str());
+            m_log.m_messages.emplace_back(std::basic_string<unsigned short>(line.begin(), line.end()),
+                                          unsigned(_level));
+        }
+
+        std::string m_name, m_prefix;
+
+    private:
+        CLog &m_log;
+        bool m_active = true;
+    };
+
+    std::vector<std::unique_ptr<CLogger>> m_loggers;
+    std::vector<std::pair<std::basic_string<unsigned short>, unsigned>> m_messages;
+};
+
+// ---------------------------------------------------------------------------------------------
 // The renderer: materials by handle, quads and lines in device coordinates, clip rectangles
 // ---------------------------------------------------------------------------------------------
 
@@ -222,6 +277,7 @@ CInput g_input;
 CCommands g_commands;
 CVariables g_variables;
 CRenderer g_renderer;
+CLog g_log;
 // Frames 16 ms apart on a clock that only moves between frames, so the example runs in no time
 // and the same way every time (windows fade in over 150 ms before they take the pointer). A real
 // engine leaves the system clock in place.
@@ -246,7 +302,7 @@ int main(int _argc, char **_argv) {
 
     gp_server = new CServer(data);
     for (IInterfaceBase *p_interface :
-         std::initializer_list<IInterfaceBase *>{&g_input, &g_commands, &g_variables, &g_renderer})
+         std::initializer_list<IInterfaceBase *>{&g_input, &g_commands, &g_variables, &g_renderer, &g_log})
         gp_server->register_interface(p_interface);
     // The library is linked to this program; an engine may as well load it with dlopen.
     RegisterInterface(gp_server);
@@ -265,8 +321,8 @@ int main(int _argc, char **_argv) {
     }
     qorui::CStaticText *p_counter = qorui::class_cast<qorui::CStaticText>(
         p_ui->get_desktop()->get_child("counter", "ClickCounter", false));
-    printf("%u frames presented, %u quads and %u lines in the last; the counter shows \"%s\"\n", g_renderer.m_frames,
-           g_renderer.m_quads, g_renderer.m_lines,
+    printf("%u frames presented, %u quads and %u lines in the last; the counter shows \"%s\"\n",
+           g_renderer.m_frames, g_renderer.m_quads, g_renderer.m_lines,
            p_counter ? p_counter->get_text().get_c() : "(no counter)");
     p_ui->shutdown();
     gp_server->withdraw_all();
