@@ -86,11 +86,18 @@ TEST_F(ButtonsTest, TheCaptionIsCentredInTheClientAreaAndSinksWhilePressedUnderT
 // Without a font a button with a caption is logged, a check box draws no label quietly and a
 // static text reports the broken contract.
 TEST_F(ButtonsTest, WithoutAFontOnlyAButtonWithACaptionIsLoggedAndAStaticTextReports) {
-    qorhost::CInterfaceServer server;
-    qorhost::CLogManager log;
-    log.set_quiet(true);
-    server.register_interface(&log);
-    engine_interfaces().set_server(&server);
+    // A log of the test's own behind the library, dropped before it goes.
+    struct SOwnLog {
+        qorhost::CInterfaceServer m_server;
+        qorhost::CLogManager m_log;
+        SOwnLog() {
+            m_log.set_quiet(true);
+            m_server.register_interface(&m_log);
+            engine_interfaces().set_server(&m_server);
+        }
+        ~SOwnLog() { engine_interfaces().set_server(nullptr); }
+    } own;
+    qorhost::CLogManager &log = own.m_log;
     button("silent", 0, "");
     button("named", 120, "X");
     m_world.desktop().add_font(FNT_NAME_DEFAULT, nullptr);
