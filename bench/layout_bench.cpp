@@ -10,6 +10,7 @@
 #include <benchmark/benchmark.h>
 
 #include <cstdlib>
+#include <filesystem>
 #include <string>
 
 using namespace qorui;
@@ -39,6 +40,11 @@ struct SSetup {
         m_dir = mkdtemp(dir);
         qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, m_dir.c_str());
         qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_dir.c_str());
+    }
+    // The exports go with the folder when the program ends.
+    ~SSetup() {
+        std::error_code ignored;
+        std::filesystem::remove_all(m_dir, ignored);
     }
     std::string m_dir;
 };

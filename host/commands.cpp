@@ -22,18 +22,27 @@ bool starts_with(std::string const &_text, std::string const &_prefix) {
 
 template <class Map>
 char const *CNameCompletion<Map>::first(Map const &_names, char const *_prefix) {
-    m_prefix = _prefix ? _prefix : "";
-    auto found = _names.lower_bound(m_prefix);
-    return found != _names.end() && starts_with(found->first, m_prefix) ? found->first.c_str() : nullptr;
+    std::string const prefix = _prefix ? _prefix : "";
+    bool const continues = !m_offered.empty() && prefix == m_offered && starts_with(m_offered, m_prefix);
+    if (!continues) m_prefix = prefix;
+    auto found = _names.lower_bound(prefix);
+    return offer(found != _names.end() && starts_with(found->first, prefix) ? found->first.c_str() : nullptr);
 }
 
 template <class Map>
 char const *CNameCompletion<Map>::next(Map const &_names, char const *_name, bool _wrap) {
     auto found = _names.upper_bound(_name ? _name : "");
-    if (found != _names.end() && starts_with(found->first, m_prefix)) return found->first.c_str();
-    if (!_wrap) return nullptr;
+    if (found != _names.end() && starts_with(found->first, m_prefix)) return offer(found->first.c_str());
+    if (!_wrap) return offer(nullptr);
     std::string const prefix = m_prefix;
+    m_offered.clear(); // a new round of the same prefix
     return first(_names, prefix.c_str());
+}
+
+template <class Map>
+char const *CNameCompletion<Map>::offer(char const *_name) {
+    m_offered = _name ? _name : "";
+    return _name;
 }
 
 // ---------------------------------------------------------------------------------------------

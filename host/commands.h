@@ -1,6 +1,9 @@
 // The host's console commands and variables. Names are case-sensitive and kept in name order,
 // which is the order of completion: find_first_... gives the first name with a prefix,
-// find_next_... the one after a name among the names with that same prefix.
+// find_next_... the one after a name among the names with that same prefix. Asked for the name
+// that it offered last, find_first_... keeps the prefix that led to it, so that a console which
+// completes a line and asks again with the whole name goes on through the names of the prefix
+// typed first.
 #pragma once
 #include "qor_commands.h"
 
@@ -20,7 +23,10 @@ public:
     char const *next(Map const &_names, char const *_name, bool _wrap);
 
 private:
+    char const *offer(char const *_name);
+
     std::string m_prefix;
+    std::string m_offered; // the name given out last, "" after none
 };
 
 class CCmdManager : public ICmdManagerBase {

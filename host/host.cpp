@@ -18,22 +18,9 @@ namespace qorhost {
 namespace {
 unsigned const k_frame_ms = 16;
 
-bool file_exists(std::string const &_path) {
+bool folder_exists(std::string const &_path) {
     struct stat info;
-    return stat(_path.c_str(), &info) == 0;
-}
-
-void copy_file(std::string const &_from, std::string const &_to) {
-    std::string text;
-    FILE *in = fopen(_from.c_str(), "rb");
-    if (!in) return;
-    char buffer[8192];
-    size_t count;
-    while ((count = fread(buffer, 1, sizeof(buffer), in)) > 0)
-        text.append(buffer, count);
-    fclose(in);
-    if (!qorbase::write_file_atomically(_to, text.data(), text.size()))
-        qordebug::warning("Cannot write the configuration copy '%s'", _to.c_str());
+    return stat(_path.c_str(), &info) == 0 && S_ISDIR(info.st_mode);
 }
 } // namespace
 
@@ -52,8 +39,8 @@ CInterfaceServer &new_server() {
 
 CHost::CHost(SHostOptions const &_options)
     : m_options(_options), m_server(new_server()), m_commands(&m_vars), mp_engine_logger(nullptr),
-      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_ui(nullptr), m_frame_time(0),
-      m_start_tick(qorplatform::get_tick_count()) {
+      m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_active_renderer(&m_renderer),
+      mp_ui(nullptr), m_frame_time(0), m_start_tick(qorplatform::get_tick_count()) {
     m_log.set_quiet(m_options.m_quiet);
     mp_engine_logger = m_log.create_logger("Engine", "");
     qorbase::set_log_sink(log_sink, this);
@@ -64,7 +51,10 @@ CHost::CHost(SHostOptions const &_options)
     m_vars.set_var("scr_resy", std::to_string(m_options.m_h).c_str());
     m_renderer.set_texture_folders({m_options.m_data + "/textures", m_options.m_data});
     m_renderer.set_frame_sink([this](SImage const &_frame, unsigned _index) { write_frame(_frame, _index); });
-    m_server.set_modules_folder(executable_folder());
+    // A game ships its interface library with its data; the host's own modules lie beside it, or
+    // in the library folder of an installed host.
+    m_server.set_modules_folders(
+        {m_options.m_data, executable_folder(), executable_folder() + "/" + QORHOST_LIBDIR_FROM_BIN});
 
     m_server.register_interface(&m_input);
     m_server.register_interface(&m_vars);
@@ -72,10 +62,21 @@ CHost::CHost(SHostOptions const &_options)
     m_server.register_interface(&m_level);
     m_server.register_interface(&m_log);
     m_server.register_interface(&m_sound);
-    if (m_options.m_record)
-        m_server.register_interface(&m_recorder);
-    else
-        m_server.register_interface(&m_renderer);
+    m_server.register_interface(served(&m_renderer));
+}
+
+// The software renderer goes on the server behind the recorder when there is one.
+IRenderQOR *CHost::served(CHostRenderer *_p_renderer) {
+    return _p_renderer == &m_renderer && m_options.m_record ? static_cast<IRenderQOR *>(&m_recorder)
+                                                            : _p_renderer;
+}
+
+void CHost::use_renderer(CHostRenderer &_renderer) {
+    if (&_renderer == mp_active_renderer) return;
+    m_server.withdraw_interface(served(mp_active_renderer));
+    _renderer.set_texture_folders(m_renderer.get_texture_folders());
+    m_server.register_interface(served(&_renderer));
+    mp_active_renderer = &_renderer;
 }
 
 // Every interface is withdrawn before it goes, so no module keeps a pointer to it; then the
@@ -87,22 +88,26 @@ CHost::~CHost() {
     if (m_options.m_manual_clock) qorplatform::set_clock(nullptr);
 }
 
-// The configuration is worked on as a copy in the output folder, made from the data folder's on
-// the first run: what the interface writes back stays out of the data.
+// The configuration is read from the data folder on every run, so an edit there always takes
+// effect; what the interface writes back goes to the output folder's qor.gdf (the configuration
+// with the changed values), never into the data. Without an output folder it goes nowhere.
 void CHost::configure_files() {
     std::string const data = m_options.m_data;
     qorbase::set_category_root(qorbase::FILE_CATEGORY_CONFIG, data.c_str());
     qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (data + "/ui").c_str());
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, (data + "/fonts").c_str());
-    std::string gdf = data + "/qor.gdf";
+    std::string written_back;
     if (!m_options.m_out.empty()) {
         mkdir(m_options.m_out.c_str(), 0755);
         qorbase::set_category_root(qorbase::FILE_CATEGORY_STATS, m_options.m_out.c_str());
-        std::string const copy = m_options.m_out + "/qor.gdf";
-        if (!file_exists(copy)) copy_file(gdf, copy);
-        if (file_exists(copy)) gdf = copy;
+        written_back = m_options.m_out + "/qor.gdf";
     }
-    qorbase::set_gdf_path(gdf.c_str());
+    qorbase::set_gdf_path((data + "/qor.gdf").c_str(), written_back.c_str());
+}
+
+std::string default_data_folder() {
+    std::string const installed = executable_folder() + "/" + QORHOST_DATA_FROM_BIN;
+    return folder_exists(installed) ? installed : "data";
 }
 
 void CHost::log_sink(char const *_line, void *_user) {
@@ -131,10 +136,10 @@ void CHost::write_frame(SImage const &_frame, unsigned _index) {
 
 void CHost::frame() {
     if (!mp_ui) return;
-    m_renderer.begin_frame(rgba_t(0, 0, 0, 255));
+    mp_active_renderer->begin_frame(rgba_t(0, 0, 0, 255));
     mp_ui->update(static_cast<int>(m_frame_time));
     mp_ui->draw();
-    m_renderer.present();
+    mp_active_renderer->present();
     if (m_options.m_manual_clock) {
         m_clock.advance_ms(k_frame_ms);
         m_frame_time += k_frame_ms;
@@ -176,16 +181,18 @@ int CHost::run() {
 
 bool CHost::start() {
     if (!mp_ui && !load_ui()) return false;
-    mp_ui->init(false);
+    mp_ui->init(true); // the console starts closed; its key opens it
     run_startup_commands();
     for (std::string const &line : m_options.m_commands)
         m_commands.run_line(line.c_str());
+    // The library puts its pointer where the pointer is at the first movement; one of nothing tells
+    // it at once, so that the pointer isn't drawn in the corner until the mouse moves.
+    m_input.pointer_move(vec2_t{0.0f, 0.0f});
     return true;
 }
 
 void CHost::finish() {
-    if (!mp_ui) return;
-    mp_ui->shutdown();
+    if (mp_ui) mp_ui->shutdown();
     qorbase::flush_gdf();
 }
 

@@ -24,15 +24,19 @@ class IUserInterface;
 
 namespace qorhost {
 
+// The data folder a host runs on when none is given: the installed data of an installed host,
+// else "data" in the current folder.
+std::string default_data_folder();
+
 struct SHostOptions {
-    std::string m_data = "data"; // the data folder
-    int m_w = 1024;              // screen size in pixels
+    std::string m_data = default_data_folder(); // the data folder
+    int m_w = 1024;                             // screen size in pixels
     int m_h = 768;
-    unsigned m_frames = 12;     // in a window, 0 runs until the window is closed
-    std::string m_out = "out";  // frames, stats and the working copy of the configuration; "" for none
-    bool m_quiet = false;       // the log isn't printed
-    bool m_record = false;      // a recorder stands in front of the renderer
-    bool m_manual_clock = true; // time moves 16 ms a frame, so runs repeat exactly
+    unsigned m_frames = 12;              // in a window, 0 runs until the window is closed
+    std::string m_out = "out";           // frames, stats and the configuration written back; "" for none
+    bool m_quiet = false;                // the log isn't printed
+    bool m_record = false;               // a recorder stands in front of the renderer
+    bool m_manual_clock = true;          // time moves 16 ms a frame, so runs repeat exactly
     std::vector<std::string> m_commands; // run after init, "name arguments"
     std::string m_script;                // an input script played instead of the frames; "" for none
     bool m_window = false; // frames are shown in a window that gives the input; none are written
@@ -53,7 +57,7 @@ public:
     // service, 2 for a script that doesn't load.
     int run();
     // The two ends of a run, for a host that runs the frames itself: init and the commands
-    // (false without a service), and shutdown.
+    // (false without a service), and shutdown with the configuration written back.
     bool start();
     void finish();
     // One frame: clear, update, draw, present.
@@ -65,7 +69,13 @@ public:
     CVarManager &vars() { return m_vars; }
     CLogManager &log() { return m_log; }
     CSoundSystem &sound() { return m_sound; }
+    // The software renderer, which draws headless; and the renderer that the frames are drawn with.
     CSoftwareRenderer &renderer() { return m_renderer; }
+    CHostRenderer &active_renderer() { return *mp_active_renderer; }
+    // Frames are drawn with _renderer from now on, in place of the one on the server (the software
+    // renderer, or the recorder in front of it), with the host's texture folders; before start,
+    // since the library keeps the renderer it finds at init.
+    void use_renderer(CHostRenderer &_renderer);
     CRecordingRenderer &recorder() { return m_recorder; }
     CLevelDescription &level() { return m_level; }
     qorplatform::CManualClock &clock() { return m_clock; }
@@ -77,6 +87,7 @@ public:
 private:
     void run_startup_commands();
     void configure_files();
+    IRenderQOR *served(CHostRenderer *_p_renderer);
     void write_frame(SImage const &_frame, unsigned _index);
     static void log_sink(char const *_line, void *_user);
 
@@ -91,6 +102,7 @@ private:
     CSoundSystem m_sound;
     CSoftwareRenderer m_renderer;
     CRecordingRenderer m_recorder;
+    CHostRenderer *mp_active_renderer; // the one on the server, or the recorder's target
     qorplatform::CManualClock m_clock;
     qorui::IUserInterface *mp_ui;
     unsigned m_frame_time; // handed to update, ms: 16 a frame on the manual clock, else since m_start_tick

@@ -1,6 +1,6 @@
-// Input scripts: their lines read into steps (moves, buttons, wheel, keys, characters, waits,
-// screenshots, commands), with the line of the first bad one in the message, and the steps played
-// on the host.
+// Input scripts: their lines read into steps (moves, buttons, wheel, keys, characters, typed text,
+// waits, screenshots, commands), with the line of the first bad one in the message, and the steps
+// played on the host.
 #include "input_script.h"
 #include "host.h"
 #include "image_io.h"
@@ -102,10 +102,13 @@ bool CInputScript::parse(std::string const &_text, std::string const &_name, std
 bool CInputScript::parse_line(std::string const &_line, SStep &_step, std::string &_error) {
     std::istringstream in(_line);
     in >> _step.m_verb;
-    if (_step.m_verb == "screenshot" || _step.m_verb == "command") {
+    static std::map<std::string, char const *> const s_text_verbs = {
+        {"screenshot", "a file"}, {"command", "a line"}, {"type", "a text"}};
+    auto const text_verb = s_text_verbs.find(_step.m_verb);
+    if (text_verb != s_text_verbs.end()) {
         _step.m_text = rest_of(in);
         if (_step.m_text.empty())
-            _error = "'" + _step.m_verb + "' needs " + (_step.m_verb == "command" ? "a line" : "a file");
+            _error = "'" + _step.m_verb + "' needs " + text_verb->second;
         else if (_step.m_verb == "screenshot" && !stays_inside(_step.m_text))
             _error = "'" + _step.m_text + "' lies outside the output folder";
         return _error.empty();
@@ -177,6 +180,9 @@ void CInputScript::play_step(CHost &_host, SStep const &_step) const {
         input.key_up(whole(0));
     } else if (verb == "char") {
         input.char_input(whole(0));
+    } else if (verb == "type") {
+        for (char const c : _step.m_text)
+            input.char_input(static_cast<unsigned char>(c));
     } else if (verb == "wait" && _step.m_milliseconds) {
         _host.clock().advance_ms(whole(0));
     } else if (verb == "wait") {

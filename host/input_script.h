@@ -7,6 +7,7 @@
 //   key_down VK [EXTRA] a key as a Windows virtual-key code (0xC0 is the console key)
 //   key_up VK
 //   char CODE           a character code
+//   type TEXT           one character a byte of TEXT, the rest of the line (no '#')
 //   wait N              N frames (update, draw, present; the clock moves 16 ms each)
 //   wait Nms            the host's clock moves N ms without a frame
 //   screenshot FILE     the last presented frame as PNG, FILE relative to the output folder
@@ -37,7 +38,7 @@ private:
     struct SStep {
         std::string m_verb;
         std::vector<float> m_numbers;
-        std::string m_text; // screenshot file, command line
+        std::string m_text; // screenshot file, command line, typed text
         bool m_milliseconds = false;
         unsigned m_line = 0;
     };

@@ -45,8 +45,9 @@ void *CInterfaceServer::open_module(char const *_library_name) {
     if (!_library_name || !*_library_name) return nullptr;
     void *module = nullptr;
     std::string const name = _library_name;
-    if (!m_modules_folder.empty() && name.find('/') == std::string::npos)
-        module = qorplatform::load_library((m_modules_folder + "/" + name).c_str());
+    if (name.find('/') == std::string::npos)
+        for (size_t i = 0; !module && i < m_modules_folders.size(); ++i)
+            module = qorplatform::load_library((m_modules_folders[i] + "/" + name).c_str());
     if (!module) module = qorplatform::load_library(_library_name);
     if (!module) {
         qordebug::warning("Cannot load module '%s': %s", _library_name, qorplatform::last_module_error());

@@ -20,8 +20,9 @@ public:
     void remove_listener(IInterfaceServerListener *_p_listener) override;
     void withdraw_interface(IInterfaceBase *_p_interface) override;
 
-    // Where modules are looked for first (the folder of the host's executable).
-    void set_modules_folder(std::string const &_folder) { m_modules_folder = _folder; }
+    // Where a module named without a folder is looked for, in this order, before the system's
+    // library search.
+    void set_modules_folders(std::vector<std::string> const &_folders) { m_modules_folders = _folders; }
     // Opens a module and calls its RegisterInterface with this server; null on failure, with a
     // warning that names the module.
     void *open_module(char const *_library_name);
@@ -40,7 +41,7 @@ private:
     std::vector<IInterfaceBase *> m_interfaces;
     std::vector<IInterfaceServerListener *> m_listeners;
     std::vector<void *> m_modules;
-    std::string m_modules_folder;
+    std::vector<std::string> m_modules_folders;
 };
 
 // The folder of the running executable.

@@ -4,6 +4,7 @@
 
 #include "host.h"
 #include "sdl_audio.h"
+#include "sdl_renderer.h"
 
 #include "qordebug.h"
 
@@ -17,7 +18,7 @@ namespace {
 // The library's desktop, whatever the screen's size.
 float const k_desktop_w = 1024.0f;
 float const k_desktop_h = 768.0f;
-Uint32 const k_frame_ms = 16;
+unsigned const k_frames_per_second = 60;
 
 struct SKeyCode {
     int m_sdl; // SDL_Keycode or SDL_Scancode
@@ -181,15 +182,15 @@ bool CWindowHost::open(std::string &_error) {
     if (mp_window) mp_renderer = SDL_CreateRenderer(mp_window, -1, SDL_RENDERER_PRESENTVSYNC);
     // Without an accelerated renderer, SDL's own draws into the window's surface.
     if (mp_window && !mp_renderer) mp_renderer = SDL_CreateRenderer(mp_window, -1, SDL_RENDERER_SOFTWARE);
-    if (mp_renderer)
-        mp_texture = SDL_CreateTexture(mp_renderer, SDL_PIXELFORMAT_RGBA32, SDL_TEXTUREACCESS_STREAMING,
-                                       options.m_w, options.m_h);
-    if (!mp_texture) {
+    if (!mp_renderer) {
         _error = SDL_GetError();
         close();
         return false;
     }
-    SDL_SetTextureBlendMode(mp_texture, SDL_BLENDMODE_NONE);
+    mp_screen = std::make_unique<CSdlRenderer>(mp_renderer, options.m_w, options.m_h);
+    m_host.use_renderer(*mp_screen);
+    std::string const driver = "Window renderer: " + mp_screen->get_driver();
+    m_host.log().create_logger("Window", "")->write(driver.c_str(), 0);
     m_scale =
         vec2_t{k_desktop_w / static_cast<float>(options.m_w), k_desktop_h / static_cast<float>(options.m_h)};
     // Relative mode hides the cursor and keeps the mouse in the window, so every movement arrives;
@@ -226,10 +227,11 @@ void CWindowHost::close() {
     mp_audio.reset();
     if (m_audio) SDL_QuitSubSystem(SDL_INIT_AUDIO);
     m_audio = false;
-    if (mp_texture) SDL_DestroyTexture(mp_texture);
+    // The host draws headless again before the renderer goes.
+    if (mp_screen) m_host.use_renderer(m_host.renderer());
+    mp_screen.reset();
     if (mp_renderer) SDL_DestroyRenderer(mp_renderer);
     if (mp_window) SDL_DestroyWindow(mp_window);
-    mp_texture = nullptr;
     mp_renderer = nullptr;
     mp_window = nullptr;
     if (m_video) SDL_QuitSubSystem(SDL_INIT_VIDEO);
@@ -248,31 +250,29 @@ void CWindowHost::poll_events() {
     }
 }
 
-void CWindowHost::present() {
-    SImage const &frame = m_host.renderer().get_frame();
-    SDL_UpdateTexture(mp_texture, nullptr, frame.m_pixels.data(), frame.m_w * 4);
-    SDL_RenderClear(mp_renderer);
-    SDL_RenderCopy(mp_renderer, mp_texture, nullptr, nullptr);
-    SDL_RenderPresent(mp_renderer);
-    ++m_presented;
-}
-
 bool CWindowHost::step() {
     if (!mp_window || m_closed) return false;
     poll_events();
     if (m_closed) return false;
-    m_host.frame();
-    present();
+    m_host.frame(); // the renderer shows it
+    ++m_presented;
     return true;
 }
 
+// Frames are due at a steady rate; a frame that comes early waits for its time, and a run that
+// falls behind by more than a frame starts its count again rather than rushing to catch up.
 unsigned CWindowHost::run(unsigned _frames) {
     unsigned const first = m_presented;
+    Uint64 const period = SDL_GetPerformanceFrequency() / k_frames_per_second;
+    Uint64 due = SDL_GetPerformanceCounter();
     while (_frames == 0 || m_presented - first < _frames) {
-        Uint32 const begin = SDL_GetTicks();
         if (!step()) break;
-        Uint32 const spent = SDL_GetTicks() - begin;
-        if (spent < k_frame_ms) SDL_Delay(k_frame_ms - spent);
+        due += period;
+        Uint64 const now = SDL_GetPerformanceCounter();
+        if (now < due)
+            SDL_Delay(static_cast<Uint32>((due - now) * 1000 / SDL_GetPerformanceFrequency()));
+        else if (now - due > period)
+            due = now;
     }
     return m_presented - first;
 }

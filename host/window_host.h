@@ -1,6 +1,6 @@
-// The host in an SDL2 window: each frame the window's events go to the host's input system, the
-// host runs its frame, and the software renderer's picture is shown; the sound system plays
-// through the audio device.
+// The host in an SDL2 window: each frame the window's events go to the host's input system and
+// the host runs its frame, drawn by SDL's renderer (on the GPU where there is one) in place of the
+// software renderer; the sound system plays through the audio device.
 //
 // Input as the library expects it: pointer movement as relative deltas in desktop pixels (the
 // library's desktop is 1024 by 768, so the window's pixels are scaled to it), buttons 0 left,
@@ -21,6 +21,7 @@ namespace qorhost {
 class CAudioDevice;
 class CHost;
 class CInputSystem;
+class CSdlRenderer;
 
 // The Windows virtual-key code of a key, 0 for a key without one. A key is taken by its meaning
 // (_key); a punctuation key whose symbol has no code is taken by its place (_place) on a US
@@ -42,12 +43,13 @@ public:
     CWindowHost(CWindowHost const &) = delete;
     CWindowHost &operator=(CWindowHost const &) = delete;
 
-    // SDL's video, a window of the host's screen size, its renderer and texture; false, with
-    // SDL's reason in _error, when any fails. Sound goes to the audio device when one opens,
-    // otherwise the sources stay silent and a warning says why.
+    // SDL's video, a window of the host's screen size and its renderer, which the host draws with
+    // from now on; false, with SDL's reason in _error, when any fails. The log names SDL's driver.
+    // Sound goes to the audio device when one opens, otherwise the sources stay silent and a
+    // warning says why.
     bool open(std::string &_error);
-    // Frames until the window is closed or, when _frames isn't 0, _frames of them, about 60 a
-    // second. Result the number presented.
+    // Frames until the window is closed or, when _frames isn't 0, _frames of them, 60 a second
+    // while they are drawn in time. Result the number presented.
     unsigned run(unsigned _frames);
     // The events, then a frame shown; false, with nothing shown, once the window is closed.
     bool step();
@@ -57,11 +59,11 @@ public:
     bool has_audio() const;
     SDL_Window *window() const { return mp_window; }
     SDL_Renderer *renderer() const { return mp_renderer; }
+    CSdlRenderer *screen() const { return mp_screen.get(); }
 
 private:
     void open_audio();
     void poll_events();
-    void present();
     void close();
 
     CHost &m_host;
@@ -69,7 +71,7 @@ private:
     bool m_audio = false; // and its audio subsystem
     SDL_Window *mp_window = nullptr;
     SDL_Renderer *mp_renderer = nullptr;
-    SDL_Texture *mp_texture = nullptr;
+    std::unique_ptr<CSdlRenderer> mp_screen; // the host's renderer while the window is open
     std::unique_ptr<CAudioDevice> mp_audio;
     vec2_t m_scale = {1.0f, 1.0f}; // window pixels to desktop pixels
     unsigned m_presented = 0;

@@ -1,6 +1,6 @@
 // The user-interface service: the one object the engine talks to. It owns the desktop and the
 // stats pages, receives the engine's input through two listeners and forwards it to the desktop,
-// and draws the start-up plaque.
+// keeps the console key for itself, and draws the start-up plaque.
 //
 //   construction        RegisterInterface makes one static CUserInterface
 //   lifecycle           init, update, draw, shutdown
@@ -14,10 +14,13 @@
 
 #include "qor_input.h"
 
+class IConfigValue;
+
 namespace qorui {
 
 class CStatsPage;
 
+// The user-interface service: owns the desktop and the stats pages and forwards the engine's input.
 class CUserInterface : public IUserInterface, public IPointerListener, public IKeyListener {
 public:
     CUserInterface();
@@ -79,11 +82,16 @@ private:
     // missing breaks a contract.
     static char const *config_string(char const *_section, char const *_key, char const *_default,
                                      bool _required);
+    // A key of the console's geometry in the section "ui"; _contract names it in the report when
+    // it can't be had.
+    static IConfigValue *console_config(char const *_key, char const *_contract);
     void draw_plaque();
     void read_screen_size();
     void load_game_library();
     void load_local_strings();
     void init_desktop();
+    void init_console();
+    void toggle_console();
     void register_commands();
     void register_event_names();
     void unregister_commands();

@@ -13,6 +13,7 @@
 
 namespace qorui {
 
+// A push button: its caption centred over the material of its state; a click is EVENT_CLICK.
 class CButton : public CWindowVisual {
 public:
     // Passive: a press on the button activates the window that holds it.
@@ -39,6 +40,7 @@ private:
     CFont *choose_font();
 };
 
+// A checker picture with a label beside it; a click toggles the checked state.
 class CCheckBox : public CWindowVisual {
 public:
     // A 16 by 16 checker; not passive, so a check box can be the active window.
@@ -72,6 +74,7 @@ private:
     CMaterial *choose_checker_material();
 };
 
+// A check box whose group is every radio button among its parent's children.
 class CRadioButton : public CCheckBox {
 public:
     CRadioButton(CDesktop *_p_desktop, char const *_name);

@@ -30,6 +30,7 @@ protected:
     ~ICanvasOwner() {}
 };
 
+// Draws for one visual window, in pixels relative to it: rectangles of materials, lines and text.
 class CCanvas {
 public:
     explicit CCanvas(ICanvasOwner *_p_owner);

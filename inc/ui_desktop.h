@@ -11,6 +11,7 @@ namespace qorui {
 
 class IStatsPage;
 
+// The root of the window tree: the engine's input, the pointer, activation, modality and materials.
 class CDesktop : public CWindowVisual {
 public:
     static int const MAX_ACTIVE_WINDOWS_STACK_SIZE = 32;

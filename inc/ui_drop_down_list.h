@@ -16,6 +16,7 @@ namespace qorui {
 class CItems;
 class CListBox;
 
+// The text of the chosen row over a list box that opens below it; EVENT_CHANGED on a new choice.
 class CDropDownList : public CWindowVisual {
 public:
     // Closed, with the list passive, so that a press in the open list keeps the control active.

@@ -18,6 +18,7 @@ namespace qorui {
 
 class CScrollBar;
 
+// The blinking caret of an edit box; its checked flag is the visible phase.
 class CCaret : public CWindowVisual {
 public:
     // Passive; no material in the hidden phase, a translucent grey rectangle in the visible one.
@@ -38,6 +39,7 @@ protected:
     unsigned m_blink_time; // ms
 };
 
+// Shows and edits a CText with a caret, scrolling the text to keep the caret inside.
 class CEditBox : public CWindowVisual {
 public:
     CEditBox(CDesktop *_p_desktop, char const *_name);

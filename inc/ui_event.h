@@ -62,6 +62,7 @@ enum EEventType : int {
     EVENT_RESOURCE_INVALIDATE = 43 //
 };
 
+// One event: its type, how it is dispatched, the windows that sent it, and its typed data.
 class CWndEvent : public CWindowDataStream {
 public:
     // Where an event goes behind its receiver.

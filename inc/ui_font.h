@@ -19,6 +19,7 @@ class CMaterial;
 class CDesktop;
 class CFontsFactory;
 
+// The metrics of a grid of character cells in one texture, read from a "nehe" font file.
 class CCharset {
 public:
     struct SChar {
@@ -50,6 +51,7 @@ private:
     float m_height; // of every character, in texture space
 };
 
+// A charset, the material that shows its texture and a size in pixels per texture unit.
 class CFont {
 public:
     virtual ~CFont();
@@ -73,6 +75,7 @@ private:
     qor_vector<CMaterial *> m_materials; // owned
 };
 
+// Makes charsets and fonts from the tables of "fonts.lua".
 class CFontsFactory {
 public:
     CFontsFactory() {}

@@ -11,6 +11,7 @@ struct point_t {
     int y;
 };
 
+// A position in whole desktop pixels.
 class CPoint {
 public:
     CPoint() : x(0), y(0) {}

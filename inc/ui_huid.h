@@ -10,6 +10,7 @@
 
 namespace qorui {
 
+// A name with a 64-bit hash of it; equal exactly when the hashes are.
 class HUID {
 public:
     // Copies the name with its terminator and hashes it. A name of 120 bytes or more breaks the

@@ -5,7 +5,7 @@
 //   CItems    the rows in display order, the selected and the checked row, stepping, sorting
 //
 // Both are kept in Lua as a list writes them under its key "items":
-//   items = { item_0 = { icon = { <material> }, column_0 = "Name", column_1 = "12" }, item_1 = ... }
+//   items = { item_0 = { icon = { ...a material... }, column_0 = "Name", column_1 = "12" }, item_1 = ... }
 // Rows and columns are numbered from 0 with no count; the first missing number ends the list.
 // Only the first line of a column is kept, and the marks aren't kept at all.
 #pragma once

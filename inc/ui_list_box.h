@@ -20,6 +20,7 @@ namespace qorui {
 
 class CScrollBar;
 
+// Rows of a CItems list in columns under an optional header, with a scroll bar when they overflow.
 class CListBox : public CWindowVisual {
 public:
     // Margins of 4, one column without title or width, and a hidden vertical scroll bar as the child

@@ -11,6 +11,7 @@ class ILogManager;
 
 namespace qorui {
 
+// A named client of the engine's log manager, found again when the manager changes.
 class CLogger {
 public:
     // The prefix is cut to four characters, followed by a colon and blanks to six.

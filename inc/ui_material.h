@@ -17,8 +17,8 @@ namespace qorui {
 
 class IRender;
 class CDesktop;
-class CDesktop;
 
+// The description of a material: colour, texture rectangle, texture names, nine-patch borders.
 class CMaterialBase {
 public:
     CMaterialBase();
@@ -37,6 +37,7 @@ protected:
     bool m_load_textures_from_game_save;
 };
 
+// How a rectangle is painted, owning one handle of a material in the engine's renderer.
 class CMaterial : public CPooled<CMaterial, 128>, public CMaterialBase {
 public:
     virtual ~CMaterial();
@@ -94,5 +95,10 @@ private:
 // A new "ui_color" material of the desktop in one colour: the built-in look of a control. The caller
 // owns it; null without a desktop.
 CMaterial *create_color_material(CDesktop *_p_desktop, rgba_t const &_color);
+// A new material of the desktop that refers to the preset _preset of the global
+// ui_material_presets (run "ui_material_presets.lua" into the library's Lua state first), so an
+// export writes the preset back; a missing preset is reported as load_state reports it. The
+// caller owns it; null without a desktop.
+CMaterial *create_preset_material(CDesktop *_p_desktop, char const *_preset);
 
 } // namespace qorui

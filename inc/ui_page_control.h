@@ -18,6 +18,7 @@ namespace qorui {
 
 class CButton;
 
+// Tabbed pages: one page shown at a time, its tab button checked.
 class CPageControl : public CWindowVisual {
 public:
     enum ETabsOrientation : int32_t {

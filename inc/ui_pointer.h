@@ -23,6 +23,7 @@ protected:
     virtual point_t reference_offset() const = 0;
 };
 
+// The on-screen pointer; its position is its hot spot.
 class CPointer : public CReferencePointWindow {
 public:
     // Appears and vanishes at once: no fades.
@@ -42,6 +43,7 @@ private:
     point_t m_hotspot;
 };
 
+// The text cursor; its position is its lower left corner.
 class CCursor : public CReferencePointWindow {
 public:
     using CReferencePointWindow::CReferencePointWindow;

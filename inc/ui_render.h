@@ -14,6 +14,7 @@ struct SRenderFigures {
     unsigned m_lines;
 };
 
+// What windows draw through: materials, clip rectangles, quads and lines in desktop pixels.
 class IRender {
 public:
     virtual ~IRender() {}
@@ -42,6 +43,7 @@ public:
     virtual SRenderFigures get_frame_figures() const = 0;
 };
 
+// The render bridge to the engine's IRenderQOR: desktop pixels to device coordinates.
 class CRender : public IRender {
 public:
     CRender();

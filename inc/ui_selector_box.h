@@ -13,6 +13,7 @@ namespace qorui {
 
 class CButton;
 
+// One row of a CItems list between two step buttons that step back and on.
 class CSelectorBox : public CWindowVisual {
 public:
     // Makes the two buttons as children, dressed in the desktop's left and right button materials.

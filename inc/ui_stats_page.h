@@ -12,6 +12,7 @@ class CCanvas;
 class CFont;
 class CUserInterface;
 
+// A named sheet of 75 numbered lines that any module prints to by line number.
 class CStatsPage : public IStatsPage {
 public:
     enum { MAX_STRINGS = 75 }; // lines of a page, and the bound on a line number

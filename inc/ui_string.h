@@ -7,6 +7,7 @@
 
 namespace qorui {
 
+// Text of 16-bit code units, converted from and to UTF-8.
 class CString : public CPooled<CString, 1024>, public wstring {
 public:
     // The capacity in units of the one conversion buffer of str2wcs.

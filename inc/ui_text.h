@@ -13,6 +13,7 @@ class CFont;
 class CWindow;
 enum EEventType : int;
 
+// Lines of text with one caret: the model behind every text control.
 class CText {
 public:
     struct SLine {

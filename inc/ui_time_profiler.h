@@ -17,6 +17,7 @@ int64_t profiler_frequency();
 class CTimeProfilerNode;
 typedef std::list<CTimeProfilerNode, qor_allocator<CTimeProfilerNode>> CTimeProfilerNodes;
 
+// One named timer of the profiler's tree: its children, count, and mean and total times.
 class CTimeProfilerNode {
 public:
     explicit CTimeProfilerNode(char const *_name);
@@ -38,6 +39,7 @@ public:
     void add_sample(int64_t _ticks);
 };
 
+// The engine-wide hierarchical timer, put on the interface server by the library.
 class CTimeProfiler : public ITimeProfiler {
 public:
     CTimeProfiler();

@@ -13,6 +13,7 @@ namespace qorui {
 
 class CButton;
 
+// A float position kept inside a range, horizontal or vertical; EVENT_CHANGED on each change.
 class CValueBar : public CWindowVisual {
 public:
     CValueBar(CDesktop *_p_desktop, char const *_name);
@@ -55,6 +56,7 @@ protected:
     bool m_horizontal;
 };
 
+// A value bar that fills its rectangle from the left as the position grows.
 class CProgressBar : public CValueBar {
 public:
     CProgressBar(CDesktop *_p_desktop, char const *_name);
@@ -66,6 +68,7 @@ protected:
     virtual void on_event_draw(CWndEvent const *_p_event) override;
 };
 
+// A value bar with a step button at each end and a scroller dragged between them.
 class CScrollBar : public CValueBar {
 public:
     CScrollBar(CDesktop *_p_desktop, char const *_name);

@@ -26,6 +26,7 @@ class CDesktop;
 class CMaterial;
 class IRender;
 
+// A node of the window tree: links, position and size, behaviour flags and the routing of events.
 class CWindow : public CEventDispatcher {
 public:
     CWindow(CDesktop *_p_desktop, char const *_name);

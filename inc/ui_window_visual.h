@@ -15,6 +15,7 @@ class CStaticText;
 class CString;
 class CText;
 
+// A window that can be seen: materials and fonts by name, margins, states, a canvas, fades and sounds.
 class CWindowVisual : public CWindow, public ICanvasOwner {
 public:
     CWindowVisual(CDesktop *_p_desktop, char const *_name);
@@ -62,6 +63,9 @@ public:
     virtual void on_child_attached() override;
     // A new static text child named _name, placed on _area, showing _text.
     CStaticText *make_static_text(CString const &_text, CRectArea const &_area, char const *_name);
+    // A border child (CBorder) for each edge flag of EBorderType set in _flags, _size pixels thick:
+    // "border left", "border right", "border top" and "border bottom", in this order.
+    void make_borders(int _size, unsigned int _flags);
 
     // Drawing: the canvas and what it needs of its window
     CCanvas &get_canvas() { return m_canvas; }

@@ -18,6 +18,7 @@
 #include "ui_debug.h"
 #include "ui_logger.h"
 #include "ui_text.h"
+#include "ui_console.h"
 #include "ui_desktop.h"
 #include "ui_font.h"
 #include "ui_material.h"
@@ -32,7 +33,8 @@ namespace qorui {
 
 namespace {
 
-// The two characters that the console key types.
+// The console key, and the two characters that it types.
+unsigned const k_console_key = 0xC0;
 unsigned const k_console_char = 0x60;
 unsigned const k_console_char_shifted = 0x7E;
 
@@ -148,6 +150,7 @@ void CUserInterface::init(bool _hide_console) {
     }
     load_local_strings();
     init_desktop();
+    init_console();
     register_commands();
     register_event_names();
 }
@@ -170,6 +173,18 @@ void CUserInterface::init_desktop() {
     if (p_material) p_material->init("ui_image", cursor, nullptr, nullptr, nullptr, nullptr, true, false);
     pointer.add_material(MAT_NAME_NORMAL, p_material);
     pointer.set_hotspot(point_t{3, 3});
+}
+
+// The console, a child of the desktop: hidden when init was asked to, otherwise the active window.
+void CUserInterface::init_console() {
+    if (!mp_desktop || mp_console) return;
+    mp_console = new CConsole(mp_desktop, "console");
+    mp_desktop->attach_child(mp_console);
+    if (m_hide_console)
+        mp_desktop->send_event(mp_console, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
+    else
+        mp_desktop->set_active_window(mp_console);
+    mp_console->set_caption(CString("Console"));
 }
 
 // The names that layouts may give events, for the sounds of windows.
@@ -260,10 +275,20 @@ void CUserInterface::draw() {
     draw_build_version();
 }
 
-// The desktop goes, and every window with it; then the listeners and the commands.
+// The console's geometry goes to the configuration; then the desktop goes, and every window with
+// it, the console too; then the listeners and the commands.
 void CUserInterface::shutdown() {
+    if (mp_console) {
+        if (IConfigValue *p_pos = console_config("console_pos", "p_pos"))
+            p_pos->set_vec2(static_cast<float>(mp_console->get_pos().x),
+                            static_cast<float>(mp_console->get_pos().y));
+        if (IConfigValue *p_size = console_config("console_size", "p_size"))
+            p_size->set_vec2(static_cast<float>(mp_console->get_w()),
+                             static_cast<float>(mp_console->get_h()));
+    }
     delete mp_desktop;
     mp_desktop = nullptr;
+    mp_console = nullptr;
     IInputSystem *p_input = engine_interfaces().get_input_system(true);
     if (p_input) {
         p_input->remove_pointer_listener(this);
@@ -273,7 +298,7 @@ void CUserInterface::shutdown() {
 }
 
 IConsole *CUserInterface::get_console() {
-    return nullptr;
+    return mp_console;
 }
 
 void CUserInterface::on_app_activate(bool _active) {
@@ -312,9 +337,20 @@ void CUserInterface::on_wheel(float _rotation) {
     if (mp_desktop) mp_desktop->on_wheel_rotated(_rotation);
 }
 
-// The console key toggles the console once there is one.
+// The desktop has the key first; then the console key toggles the console.
 void CUserInterface::on_key_down(unsigned _key, unsigned _extra) {
     if (mp_desktop) mp_desktop->on_key_down(_key, _extra);
+    if (_key == k_console_key && mp_desktop && mp_console) toggle_console();
+}
+
+// A console that is shown but not active is activated, not hidden.
+void CUserInterface::toggle_console() {
+    if (!mp_console->is_hidden() && mp_desktop->get_active_window() == mp_console) {
+        mp_desktop->send_event(mp_console, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
+        return;
+    }
+    mp_desktop->send_event(mp_console, EVENT_SHOW, CWndEvent::DISPATCH_NONE);
+    mp_desktop->set_active_window(mp_console);
 }
 
 void CUserInterface::on_key_up(unsigned _key) {
@@ -374,6 +410,15 @@ char const *CUserInterface::config_string(char const *_section, char const *_key
     return qorbase::get_config_string(_section, _key, _default);
 }
 
+// A key of the console's geometry in the section "ui", made when it is missing.
+IConfigValue *CUserInterface::console_config(char const *_key, char const *_contract) {
+    IConfigSection *p_sect = qorbase::find_config_section("ui");
+    if (!QOR_CHECK_AS(p_sect, "p_sect")) return nullptr;
+    IConfigValue *p_value = p_sect->get_value(_key, true);
+    QOR_CHECK_AS(p_value, _contract);
+    return p_value;
+}
+
 // ---------------------------------------------------------------------------------------------
 // The commands' work
 // ---------------------------------------------------------------------------------------------
@@ -390,7 +435,15 @@ void CUserInterface::import_layout(char const *_file) {
     CMaterial *p_material = mp_desktop->create_material();
     if (p_material) p_material->init("ui_image", background, nullptr, nullptr, nullptr, nullptr, true, false);
     mp_desktop->add_material(MAT_NAME_NORMAL, p_material);
-    // The console takes its place and size here once it exists.
+    if (!mp_console) return;
+    if (IConfigValue *p_pos = console_config("console_pos", "p_pos")) {
+        vec2_t const pos = p_pos->get_vec2(20.0f, 30.0f);
+        mp_console->set_pos(trunc_to_int(pos.x), trunc_to_int(pos.y));
+    }
+    if (IConfigValue *p_size = console_config("console_size", "p_size")) {
+        vec2_t const size = p_size->get_vec2(400.0f, 500.0f);
+        mp_console->set_size(trunc_to_int(size.x), trunc_to_int(size.y));
+    }
 }
 
 namespace {

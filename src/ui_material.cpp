@@ -93,6 +93,16 @@ CMaterial *create_color_material(CDesktop *_p_desktop, rgba_t const &_color) {
     return p_material;
 }
 
+CMaterial *create_preset_material(CDesktop *_p_desktop, char const *_preset) {
+    CMaterial *p_material = _p_desktop ? _p_desktop->create_material() : nullptr;
+    if (!p_material || !_preset) return p_material;
+    LuaPlus::LuaObject table;
+    table.AssignNewTable(&lua_machine());
+    table.SetString("material_preset", _preset);
+    p_material->load_state(table);
+    return p_material;
+}
+
 // ---------------------------------------------------------------------------------------------
 // Persistence
 // ---------------------------------------------------------------------------------------------

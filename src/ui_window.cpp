@@ -518,7 +518,11 @@ void CWindow::load_child(LuaPlus::LuaObject &_lo_child) {
     CWindow *p_child = get_child(p_name, p_class_name, true);
     if (!p_child) {
         p_child = get_windows_factory().Create(HUID(p_class_name), mp_desktop, p_name);
-        if (!p_child) return; // an unknown class: the entry and its subtree are skipped
+        if (!p_child) { // an unknown class: the entry and its subtree are left out, and the log says so
+            if (IFileSystem *p_file_system = GetFileSystem())
+                p_file_system->log("Window class not registered: %s ('%s' left out)\n", p_class_name, p_name);
+            return;
+        }
         attach_child(p_child);
         send_event(p_child, EVENT_ENABLE, CWndEvent::DISPATCH_NONE);
         send_event(p_child, EVENT_SHOW, CWndEvent::DISPATCH_NONE);

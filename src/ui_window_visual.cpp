@@ -14,6 +14,7 @@
 #include "qor_sound.h"
 #include "qorscriptsystem.h"
 #include "ui_debug.h"
+#include "ui_dialog.h"
 #include "ui_font.h"
 #include "ui_interfaces.h"
 #include "ui_local_strings.h"
@@ -204,6 +205,23 @@ CStaticText *CWindowVisual::make_static_text(CString const &_text, CRectArea con
     p_text->set_size(_area.w, _area.h);
     p_text->set_text(_text);
     return p_text;
+}
+
+void CWindowVisual::make_borders(int _size, unsigned int _flags) {
+    static struct {
+        EBorderType m_type;
+        char const *m_name;
+    } const borders[] = {{BORDER_LEFT, "border left"},
+                         {BORDER_RIGHT, "border right"},
+                         {BORDER_TOP, "border top"},
+                         {BORDER_BOTTOM, "border bottom"}};
+    for (auto const &border : borders) {
+        if (!(_flags & border.m_type)) continue;
+        CBorder *p_border = new CBorder(mp_desktop, border.m_name);
+        attach_child(p_border);
+        p_border->set_border_type(border.m_type);
+        p_border->set_border_size(_size);
+    }
 }
 
 // ---------------------------------------------------------------------------------------------

@@ -15,11 +15,11 @@ fonts["arial_white"] = {
 charsets["courier"] = { file_type = "nehe", file_name = "courier.fnt" }
 fonts["courier"] = {
     charset_name = "courier",
-    size = 512,
+    size = 300,
     material = {
         material_template = "ui_image",
         diffuse_texture = "courier.tga",
-        tex_size = { 512, 512 },
+        tex_size = { 300, 300 },
         color = { r = 255, g = 255, b = 255, a = 255 },
     },
 }

@@ -1,5 +1,6 @@
 -- Named materials that a layout refers to by "material_preset" instead of a table of its own.
--- Run before each layout is imported; each export of a layout writes this file anew.
+-- Run before each layout is imported; each export of a layout writes this file anew with the
+-- presets that the exported windows use (the demo scene uses them all).
 -- The pictures of the controls are made by scripts/make_control_textures.py.
 ui_material_presets = {
     -- Buttons, by state: nine-patches with corners of 4 pixels.
@@ -41,8 +42,13 @@ ui_material_presets = {
     -- Lists: the row under the pointer and the chosen row.
     row_under_pointer = { material_template = "ui_color", color = { r = 78, g = 100, b = 140, a = 160 } },
     row_chosen = { material_template = "ui_color", color = { r = 236, g = 186, b = 84, a = 110 } },
-    -- Panels and the text fields on them, as the console's.
-    panel = { material_template = "ui_color", color = { r = 100, g = 100, b = 100, a = 150 } },
+    -- The bar along the desktop's top, the dialogs' bodies (opaque, and the framed dialog's slightly
+    -- translucent) and their title bars and frames, the text fields on them and the caret of an
+    -- edit box.
+    top_bar = { material_template = "ui_color", color = { r = 40, g = 48, b = 66, a = 255 } },
+    panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 255 } },
+    framed_panel = { material_template = "ui_color", color = { r = 30, g = 36, b = 48, a = 235 } },
+    title_bar = { material_template = "ui_color", color = { r = 90, g = 70, b = 150, a = 255 } },
     text_field = { material_template = "ui_color", color = { r = 15, g = 15, b = 15, a = 150 } },
-    caret = { material_template = "ui_color", color = { r = 220, g = 226, b = 240, a = 200 } },
+    caret = { material_template = "ui_color", color = { r = 120, g = 120, b = 120, a = 150 } },
 }

@@ -32,12 +32,13 @@ namespace {
 class CGDFRegistry : public IGDFRegistry {
 public:
     // A missing file gives an empty registry: every section is missing and getters give defaults.
-    explicit CGDFRegistry(std::string const &_path) : m_path(_path) {
+    // Changes go to _write_path ("" for nowhere).
+    CGDFRegistry(std::string const &_path, std::string const &_write_path) : m_write_path(_write_path) {
         std::string text;
-        if (read_text_file(m_path, text))
+        if (read_text_file(_path, text))
             m_file.parse(text);
         else
-            qordebug::warning("Cannot read the configuration file '%s'", m_path.c_str());
+            qordebug::warning("Cannot read the configuration file '%s'", _path.c_str());
     }
     ~CGDFRegistry() { flush(); }
 
@@ -45,12 +46,12 @@ public:
 
     // Pending changes go to the file at once, or not at all.
     void flush() {
-        if (!m_file.is_dirty()) return;
+        if (!m_file.is_dirty() || m_write_path.empty()) return;
         std::string const text = m_file.write();
-        if (write_file_atomically(m_path, text.data(), text.size()))
+        if (write_file_atomically(m_write_path, text.data(), text.size()))
             m_file.clear_dirty();
         else
-            qordebug::warning("Cannot write the configuration file '%s': %s", m_path.c_str(),
+            qordebug::warning("Cannot write the configuration file '%s': %s", m_write_path.c_str(),
                               strerror(errno));
     }
 
@@ -61,12 +62,14 @@ private:
         void close(bool) override {}
     };
 
-    std::string m_path;
+    std::string m_write_path;
     CRegistryFile m_file;
 };
 
 std::string g_gdf_path;
 bool g_gdf_path_set = false;
+std::string g_gdf_write_path;
+bool g_gdf_write_path_set = false;
 CGDFRegistry *gp_registry = nullptr;
 
 // Deleting the registry at process end writes back what was set. Defined after g_gdf_path, so
@@ -229,11 +232,13 @@ unsigned const k_cache_size = 64 * 1024;
 // Entry points
 // ---------------------------------------------------------------------------------------------
 
-void set_gdf_path(char const *_path) {
+void set_gdf_path(char const *_path, char const *_write_path) {
     delete gp_registry; // writes back what is pending
     gp_registry = nullptr;
     g_gdf_path = _path ? _path : "";
     g_gdf_path_set = _path != nullptr;
+    g_gdf_write_path = _write_path ? _write_path : "";
+    g_gdf_write_path_set = _write_path != nullptr;
 }
 
 void flush_gdf() {
@@ -277,7 +282,10 @@ void set_log_sink(log_sink_t _sink, void *_user) {
 
 IGDFRegistry *GetGDFRegistry() {
     using namespace qorbase;
-    if (!gp_registry) gp_registry = new CGDFRegistry(gdf_path());
+    if (!gp_registry) {
+        std::string const path = gdf_path();
+        gp_registry = new CGDFRegistry(path, g_gdf_write_path_set ? g_gdf_write_path : path);
+    }
     return gp_registry;
 }
 

@@ -4,6 +4,7 @@
 
 typedef void (*command_callback_t)(char const *_arguments, void *_user);
 
+// The engine's console commands, by name.
 class ICmdManagerBase : public IInterfaceBase {
 public:
     // A second registration of a name replaces the first.
@@ -25,6 +26,7 @@ struct SVariable {
     float m_float_value;
 };
 
+// The engine's console variables, by name, as text with its number values.
 class IVarManagerBase : public IInterfaceBase {
 public:
     virtual SVariable const *find_var(char const *_name) = 0;

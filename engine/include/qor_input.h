@@ -4,6 +4,7 @@
 #include "qor_interfaces.h"
 #include "qor_math.h"
 
+// Hears the pointer: movement, buttons and the wheel.
 class IPointerListener {
 public:
     virtual void on_button_down(unsigned /*_button*/) {} // 0 left, 1 right, 2 middle
@@ -16,6 +17,7 @@ protected:
     virtual ~IPointerListener() {}
 };
 
+// Hears the keyboard: keys as Windows virtual-key codes, and characters.
 class IKeyListener {
 public:
     virtual void on_key_down(unsigned /*_key*/, unsigned /*_extra*/) {}
@@ -27,6 +29,7 @@ protected:
     virtual ~IKeyListener() {}
 };
 
+// The engine's input: it calls the listeners added to it.
 class IInputSystem : public IInterfaceBase {
 public:
     virtual void add_pointer_listener(IPointerListener *_p_listener) = 0;

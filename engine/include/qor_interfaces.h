@@ -14,6 +14,7 @@ struct SInterfaceUID {
     bool operator!=(SInterfaceUID const &_o) const { return !(*this == _o); }
 };
 
+// What every interface on the server is: an identifier and a version.
 class IInterfaceBase {
 public:
     virtual ~IInterfaceBase() {}
@@ -26,6 +27,7 @@ enum EInterfaceServerAction : int32_t {
     ISA_WITHDRAWN = 1,  // the interface is being withdrawn; drop every pointer to it
 };
 
+// Hears of interfaces registered on the server and withdrawn from it.
 class IInterfaceServerListener {
 public:
     virtual void _isv_action(EInterfaceServerAction _action, IInterfaceBase *_p_interface) = 0;
@@ -34,6 +36,7 @@ protected:
     virtual ~IInterfaceServerListener() {}
 };
 
+// The engine's registry of interfaces, and its loader of modules.
 class IInterfaceServer {
 public:
     // The live interface with that identifier and version, or null.

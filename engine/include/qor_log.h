@@ -3,6 +3,7 @@
 #pragma once
 #include "qor_interfaces.h"
 
+// One named logger of the log manager.
 class ILogger {
 public:
     virtual char const *get_name() const = 0;
@@ -33,6 +34,7 @@ protected:
     virtual ~ILogMessageVisitor() {}
 };
 
+// The engine's log: named loggers, and the messages of them all.
 class ILogManager : public IInterfaceBase {
 public:
     virtual ILogger *create_logger(char const *_name, char const *_prefix) = 0;

@@ -10,6 +10,7 @@ public:
     virtual ~IAviTexture() {}
 };
 
+// A view of the 3D scene.
 class IRenderCamera {
 public:
     virtual ~IRenderCamera() {}
@@ -19,6 +20,7 @@ public:
     virtual void set_viewport(int _x, int _y, int _w, int _h) = 0;
 };
 
+// The engine's renderer: materials, 2D quads and lines in device coordinates, clip rectangles.
 class IRenderQOR : public IInterfaceBase {
 public:
     virtual void render_view(IRenderCamera *_p_camera) = 0;

@@ -25,6 +25,7 @@ int const SOUND_FLAGS_INTERFACE = 2;
 int const SOUND_OPTION_INTERFACE = 1;
 int const SOUND_VOLUME_OWN = 1;
 
+// One playing sound, owned by whoever made it.
 class ISoundSource {
 public:
     // Releases the source.
@@ -38,6 +39,7 @@ public:
     virtual bool is_looping() = 0;
 };
 
+// The engine's sound: sources made from WAV files, in groups.
 class ISoundSystem : public IInterfaceBase {
 public:
     // A source playing the file (WAV); null when the file can't be loaded. The caller owns it.

@@ -14,6 +14,7 @@
 #include <cstddef>
 #include <string>
 
+// One value of a configuration file.
 class IConfigValue {
 public:
     virtual vec2_t get_vec2(float _default_x, float _default_y) = 0;
@@ -29,6 +30,7 @@ protected:
     virtual ~IConfigValue() {}
 };
 
+// One "[section]" of a configuration file.
 class IConfigSection {
 public:
     // With _create true a missing key is added without content; otherwise null.
@@ -38,6 +40,7 @@ protected:
     virtual ~IConfigSection() {}
 };
 
+// A configuration file of the GDF format.
 class IConfigFile {
 public:
     // Null when there's no section of that name.
@@ -49,6 +52,7 @@ protected:
     virtual ~IConfigFile() {}
 };
 
+// The engine's configuration file.
 class IGDFRegistry {
 public:
     virtual IConfigFile *get_config() = 0;
@@ -76,6 +80,7 @@ struct SFileToSave {
     unsigned m_size;
 };
 
+// The engine's files by category, and its log.
 class IFileSystem {
 public:
     // Result: the file's size, 0 when there's none. *_pp_content takes the content, allocated
@@ -135,9 +140,10 @@ namespace qorbase {
 
 enum { FILE_CATEGORY_STATS = 2, FILE_CATEGORY_CONFIG = 5, FILE_CATEGORY_FONTS = 8, FILE_CATEGORY_UI = 16 };
 
-// The GDF file that GetGDFRegistry reads at its first use, and from then on writes back.
-// Setting a new path drops the loaded registry (after writing back pending changes).
-void set_gdf_path(char const *_path);
+// The GDF file that GetGDFRegistry reads at its first use, and the file that its changes are
+// written back to: null _write_path for the same file, "" for none. Setting a new path drops the
+// loaded registry (after writing back pending changes).
+void set_gdf_path(char const *_path, char const *_write_path = nullptr);
 // Writes pending set_vec2 changes now, atomically. Also runs at process end.
 void flush_gdf();
 

@@ -1,14 +1,17 @@
 // The demo game's interface library: the engine loads it beside the UI library, named by
-// "gameui_library" in the configuration. It announces itself in the log and adds two commands:
+// "gameui_library" in the configuration. It announces itself in the log and adds three commands:
 // "gameui_demo" echoes its arguments to the log, "gameui_demo_scene" builds the demo's windows on
-// the desktop (the host runs it at start from its configuration), "gameui_show_stats NAME" shows
-// one stats page.
+// the desktop and places the console (the host runs it at start from its configuration),
+// "gameui_show_stats NAME" shows one stats page. In the scene, the button "Ask" of the second
+// dialog opens a modal message box and shows its answer.
 #include "qor_commands.h"
 #include "qor_interfaces.h"
 #include "qor_log.h"
 #include "qorbase.h"
 #include "engine_interfaces.h"
 #include "ui_button.h"
+#include "ui_console.h"
+#include "ui_dialog.h"
 #include "ui_desktop.h"
 #include "ui_drop_down_list.h"
 #include "ui_edit_box.h"
@@ -77,25 +80,19 @@ private:
 
 CWindowRegistrar<CDemoText> const s_demo_text_registrar("DemoText");
 
-CMaterial *colour(CDesktop *_p_desktop, unsigned char _r, unsigned char _g, unsigned char _b,
-                  unsigned char _a = 255) {
+// The configured background picture, as an imported layout shows it.
+CMaterial *background(CDesktop *_p_desktop) {
     CMaterial *p_material = _p_desktop->create_material();
     if (!p_material) return nullptr;
-    p_material->init("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false);
-    p_material->set_color(rgba_t(_r, _g, _b, _a));
+    char const *p_picture = qorbase::get_config_string("ui", "background", "_back.tga");
+    p_material->init("ui_image", p_picture, nullptr, nullptr, nullptr, nullptr, true, false);
     return p_material;
 }
 
 // A material of data/ui/ui_material_presets.lua; a layout exported from the scene refers to it
-// by name.
+// by name. Every material of the scene is one, so an export writes every preset back.
 CMaterial *preset(CDesktop *_p_desktop, char const *_name) {
-    CMaterial *p_material = _p_desktop->create_material();
-    if (!p_material) return nullptr;
-    LuaPlus::LuaObject table;
-    table.AssignNewTable(&lua_machine());
-    table.SetString("material_preset", _name);
-    p_material->load_state(table);
-    return p_material;
+    return create_preset_material(_p_desktop, _name);
 }
 
 // Materials of a window by state, from presets; null names are skipped.
@@ -113,14 +110,18 @@ TWindow *place(CWindow *_p_parent, TWindow *_p_wnd, int _x, int _y, int _w, int 
     return _p_wnd;
 }
 
-CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
-                     int _x, int _y) {
-    CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
-    dress(_p_desktop, p_button,
+void dress_button(CDesktop *_p_desktop, CButton *_p_button) {
+    dress(_p_desktop, _p_button,
           {{MAT_NAME_NORMAL, "button_normal"},
            {MAT_NAME_HIGHLIGHTED, "button_highlighted"},
            {MAT_NAME_PUSHED, "button_pushed"},
            {MAT_NAME_DISABLED, "button_disabled"}});
+}
+
+CButton *make_button(CDesktop *_p_desktop, CWindow *_p_parent, char const *_name, char const *_caption,
+                     int _x, int _y) {
+    CButton *p_button = place(_p_parent, new CButton(_p_desktop, _name), _x, _y, 110, 30);
+    dress_button(_p_desktop, p_button);
     p_button->m_text = CString(_caption);
     return p_button;
 }
@@ -171,10 +172,10 @@ CWindowVisual *make_dialog(CDesktop *_p_desktop, char const *_name, char const *
                            int _w, int _h) {
     CWindowVisual *p_dialog = place(_p_desktop, new CWindowVisual(_p_desktop, _name), _x, _y, _w, _h);
     p_dialog->set_can_drag(true);
-    p_dialog->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 30, 36, 48, 235));
+    p_dialog->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "panel"));
     CWindowVisual *p_title = place(p_dialog, new CWindowVisual(_p_desktop, "title bar"), 0, 0, _w, 26);
     p_title->set_passive(true);
-    p_title->add_material(MAT_NAME_NORMAL, colour(_p_desktop, 90, 70, 150));
+    p_title->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "title_bar"));
     place(p_title, new CDemoText(_p_desktop, "title", _title), 10, 4, _w - 20, 20);
     return p_dialog;
 }
@@ -192,6 +193,65 @@ void make_message_dialog(CDesktop *_p_desktop, char const *_name, char const *_t
           16, 70, 330, 20);
     make_button(_p_desktop, p_dialog, "ok", "OK", 110, 150);
     make_button(_p_desktop, p_dialog, "cancel", "Cancel", 234, 150);
+}
+
+// A dialog's buttons in the scene's button look, 110 by 30, on a bottom margin of 20.
+void dress_dialog_buttons(CDesktop *_p_desktop, CDialog *_p_dialog) {
+    _p_dialog->set_button_size(110, 30);
+    _p_dialog->set_bottom_margin(20);
+    for (unsigned i = 0; i < _p_dialog->get_buttons_count(); ++i)
+        dress_button(_p_desktop, _p_dialog->get_button(i));
+}
+
+// A modal message box in the middle of the desktop: a click on "Yes" or "No" writes the answer into
+// _p_answer and the log, and closes the box, which deletes itself when it has faded out.
+void ask(CDesktop *_p_desktop, CStaticText *_p_answer) {
+    CMessageBox *p_box = new CMessageBox(_p_desktop, "question");
+    // Placed as a plain window: GCC folds the identical instantiations of place and then warns of
+    // the largest class's size against the smaller objects of the others.
+    place<CWindow>(_p_desktop, p_box, _p_desktop->get_w() / 2 - 180, _p_desktop->get_h() / 2 - 80, 360, 160);
+    // The box comes and goes, so its colour is its own rather than a preset's that an export of the
+    // scene without it would leave out.
+    p_box->add_material(MAT_NAME_NORMAL, create_color_material(_p_desktop, rgba_t(48, 40, 72, 245)));
+    p_box->set_uniform_margins(8);
+    p_box->set_caption_h(30);
+    p_box->set_caption(CString("Question"));
+    p_box->set_caption_alignment(ALIGNMENT_CENTER);
+    p_box->set_message_text(CString("Do you like the demo?"));
+    p_box->set_auto_delete(true);
+    for (char const *p_choice : {"Yes", "No"})
+        p_box->add_button(CString(p_choice))
+            ->register_callback(EVENT_CLICK, CEventCallback([p_box, _p_answer, p_choice](CWndEvent const *) {
+                                    _p_answer->set_text(
+                                        CString((std::string("Answer: ") + p_choice).c_str()));
+                                    if (ILogger *p_logger = demo_logger())
+                                        p_logger->write((std::string("answer ") + p_choice).c_str(), 0);
+                                    p_box->send_event(p_box, EVENT_HIDE, CWndEvent::DISPATCH_NONE);
+                                }));
+    dress_dialog_buttons(_p_desktop, p_box);
+    _p_desktop->set_active_window(p_box);
+}
+
+// A dialog of the library, framed by its borders, by which it can be resized; its button "Ask"
+// opens a message box, and the answer stands below the text.
+void make_question_dialog(CDesktop *_p_desktop, char const *_name, char const *_caption, int _x, int _y) {
+    CDialog *p_dialog = place(_p_desktop, new CDialog(_p_desktop, _name), _x, _y, 360, 200);
+    p_dialog->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "framed_panel"));
+    for (char const *p_edge : {"border left", "border right", "border top", "border bottom"})
+        if (CBorder *p_border = class_cast<CBorder>(p_dialog->get_child(p_edge, "Border", true)))
+            p_border->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "title_bar"));
+    p_dialog->set_left_margin(16);
+    p_dialog->set_top_margin(8);
+    p_dialog->set_caption_h(30);
+    p_dialog->set_caption(CString(_caption));
+    place(p_dialog, new CDemoText(_p_desktop, "line 1", "Drag my frame to resize me."), 16, 44, 330, 20);
+    CStaticText *p_answer =
+        p_dialog->make_static_text(CString("Not asked yet."), CRectArea(16, 70, 330, 20), "answer");
+    p_dialog->add_button(CString("Ask"))
+        ->register_callback(EVENT_CLICK, CEventCallback([_p_desktop, p_answer](CWndEvent const *) {
+                                ask(_p_desktop, p_answer);
+                            }));
+    dress_dialog_buttons(_p_desktop, p_dialog);
 }
 
 // A scroll bar made by code has parts of no size: square step buttons as thick as the bar and a
@@ -246,6 +306,7 @@ void make_controls_dialog(CDesktop *_p_desktop, int _x, int _y) {
     CEditBox *p_notes = place(p_dialog, new CEditBox(_p_desktop, "notes"), 16, 166, 388, 110);
     p_notes->add_material(MAT_NAME_NORMAL, preset(_p_desktop, "text_field"));
     p_notes->set_uniform_margins(4);
+    p_notes->get_caret()->add_material(MAT_NAME_CHECKED, preset(_p_desktop, "caret"));
 
     make_button(_p_desktop, p_dialog, "apply", "Apply", 294, 288);
 }
@@ -349,24 +410,39 @@ void cmd_gameui_show_stats(char const *_arguments, void *) {
     }
 }
 
+// The console, closed until its key opens it, where the configuration keeps it: as the import of
+// a game's layout would place it.
+void place_console(IUserInterface *_p_ui) {
+    IConsole *p_console = _p_ui->get_console();
+    IConfigSection *p_section = qorbase::find_config_section("ui");
+    if (!p_console || !p_section) return;
+    IConfigValue *p_pos = p_section->get_value("console_pos", false);
+    IConfigValue *p_size = p_section->get_value("console_size", false);
+    vec2_t const pos = p_pos ? p_pos->get_vec2(20.0f, 30.0f) : vec2_t{20.0f, 30.0f};
+    vec2_t const size = p_size ? p_size->get_vec2(400.0f, 500.0f) : vec2_t{400.0f, 500.0f};
+    p_console->get_console()->set_pos(static_cast<int>(pos.x), static_cast<int>(pos.y));
+    p_console->get_console()->set_size(static_cast<int>(size.x), static_cast<int>(size.y));
+}
+
 void cmd_gameui_demo_scene(char const *, void *) {
     IUserInterface *p_ui =
         static_cast<IUserInterface *>(gp_server->query_interface(qor_uid::USER_INTERFACE, 1));
     CDesktop *p_desktop = p_ui ? p_ui->get_desktop() : nullptr;
     if (!p_desktop) return;
-    p_desktop->add_material(MAT_NAME_NORMAL, colour(p_desktop, 22, 26, 34));
+    lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
+    p_desktop->add_material(MAT_NAME_NORMAL, background(p_desktop));
     CWindowVisual *p_bar = place(p_desktop, new CWindowVisual(p_desktop, "top bar"), 0, 0, 1024, 36);
     p_bar->set_alignment(ALIGNMENT_TOP);
-    p_bar->add_material(MAT_NAME_NORMAL, colour(p_desktop, 40, 48, 66));
+    p_bar->add_material(MAT_NAME_NORMAL, preset(p_desktop, "top_bar"));
     place(p_bar, new CDemoText(p_desktop, "heading", "qorui - demo scene"), 16, 8, 400, 20);
-    lua_machine().DoFile(qorbase::FILE_CATEGORY_UI, "ui_material_presets.lua");
     dress_desktop_for_step_buttons(p_desktop);
     make_message_dialog(p_desktop, "dialog", "A dialog you can drag", 120, 120);
-    make_message_dialog(p_desktop, "second dialog",
-                        "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
-                        120, 420);
+    make_question_dialog(p_desktop, "second dialog",
+                         "\xD0\x92\xD1\x82\xD0\xBE\xD1\x80\xD0\xBE\xD0\xB5 \xD0\xBE\xD0\xBA\xD0\xBD\xD0\xBE",
+                         120, 420);
     make_controls_dialog(p_desktop, 540, 80);
     make_options_dialog(p_desktop, 540, 430);
+    place_console(p_ui);
     if (ILogger *p_logger = demo_logger()) p_logger->write("Demo scene built", 0);
 }
 

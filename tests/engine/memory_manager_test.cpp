@@ -3,6 +3,7 @@
 // QOR_MM_BACKEND names for this process; one test runs the backend-neutral suites again in a child
 // process with the other backend.
 #include "qorMemoryManager.h"
+#include "test_common.h"
 
 #include <gtest/gtest.h>
 
@@ -10,10 +11,9 @@
 #include <cstdlib>
 #include <cstring>
 #include <dlfcn.h>
-#include <fstream>
 #include <malloc.h>
-#include <sstream>
 #include <spawn.h>
+#include <sstream>
 #include <string>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -43,8 +43,10 @@ std::vector<SMMHeapStats> all_heap_stats() {
     return stats;
 }
 
-SMMHeapStats heap_stats(int _heap) {
-    return all_heap_stats().at(_heap);
+// A heap's allocations, deallocations and live bytes.
+std::vector<uint64_t> counts(int _heap) {
+    SMMHeapStats const stats = all_heap_stats().at(_heap);
+    return {stats.m_allocations, stats.m_deallocations, stats.m_live_bytes};
 }
 
 SMMHeapStats totals() {
@@ -53,19 +55,10 @@ SMMHeapStats totals() {
     return total;
 }
 
-std::string read_file(std::string const &_path) {
-    std::ifstream in(_path);
-    std::stringstream text;
-    text << in.rdbuf();
-    return text.str();
-}
-
 std::string dump_text() {
-    std::string const path = testing::TempDir() + "mm_dump_" + std::to_string(getpid()) + ".txt";
+    std::string const path = qortest::make_temp_dir() + "/dump.txt";
     MMDumpMemoryStats(path.c_str());
-    std::string text = read_file(path);
-    remove(path.c_str());
-    return text;
+    return qortest::read_file(path);
 }
 
 // The pool line of the dump for element size and count, or "" when there is no such pool.
@@ -77,26 +70,15 @@ std::string pool_line(uint32_t _element_size, uint32_t _block_elements) {
     return at == std::string::npos ? "" : text.substr(at, text.find('\n', at) - at);
 }
 
-// Allocates a block as the pool's client does and links it into the record.
-void add_client_block(SFixedPool &_pool, int _heap) {
-    size_t const bytes = size_t(_pool.m_element_size) * _pool.m_block_elements + sizeof(void *);
-    void *p_block = allocate_on(_heap, bytes);
-    *static_cast<void **>(p_block) = _pool.mp_blocks;
-    _pool.mp_blocks = p_block;
-    ++_pool.m_blocks;
-    _pool.m_total_bytes += static_cast<uint32_t>(bytes);
-}
-
 // Runs this test program again with the other backend and a filter; true when the child ran at
 // least one test and all of them passed.
 bool child_passes(char const *_filter, char const *_backend) {
     char self[4096] = {};
     if (readlink("/proc/self/exe", self, sizeof(self) - 1) <= 0) return false;
-    std::string const report = testing::TempDir() + "mm_child_" + std::to_string(getpid()) + ".json";
+    std::string const report = qortest::make_temp_dir() + "/child.json";
     std::string filter_arg = std::string("--gtest_filter=") + _filter;
     std::string output_arg = "--gtest_output=json:" + report;
     char *argv[] = {self, &filter_arg[0], &output_arg[0], nullptr};
-
     std::vector<std::string> env_text;
     for (char **p_entry = environ; *p_entry; ++p_entry)
         if (strncmp(*p_entry, "QOR_MM_BACKEND=", 15) != 0) env_text.push_back(*p_entry);
@@ -105,13 +87,11 @@ bool child_passes(char const *_filter, char const *_backend) {
     for (std::string &entry : env_text)
         envp.push_back(&entry[0]);
     envp.push_back(nullptr);
-
     pid_t child = 0;
     if (posix_spawn(&child, self, nullptr, nullptr, argv, envp.data()) != 0) return false;
     int status = 0;
     waitpid(child, &status, 0);
-    std::string const json = read_file(report);
-    remove(report.c_str());
+    std::string const json = qortest::read_file(report);
     size_t const count_at = json.find("\"tests\": "); // the first one is the whole run's
     int const tests_run = count_at == std::string::npos ? 0 : atoi(json.c_str() + count_at + 9);
     return WIFEXITED(status) && WEXITSTATUS(status) == 0 && tests_run > 0;
@@ -126,25 +106,15 @@ bool child_passes(char const *_filter, char const *_backend) {
 TEST(MemoryManagerEntryPoints, AllSeventeenAreFoundByTheirCNames) {
     void *module = dlopen("libqorMemoryManager.so", RTLD_NOW | RTLD_LOCAL);
     ASSERT_NE(nullptr, module) << dlerror();
-    char const *const names[] = {"MMHeapCreate",
-                                 "MMHeapSelect",
-                                 "MMAllocate",
-                                 "MMDeallocate",
-                                 "MMExpand",
-                                 "MMGetBlockSize",
-                                 "MMGetMemoryStatus",
-                                 "MMGetStatsForModules",
-                                 "MMCheckMemoryCorrupt",
-                                 "MMGetMemoryBlockStatus",
-                                 "MMDumpMemoryStats",
-                                 "MMSmallAlloc",
-                                 "MMSmallRealloc",
-                                 "MMSmallFree",
-                                 "MMSmallMsize",
-                                 "MMGetFixedPool",
-                                 "MMReleaseFixedPool"};
-    for (char const *name : names)
-        EXPECT_NE(nullptr, dlsym(module, name)) << name;
+    std::istringstream names(
+        "MMHeapCreate MMHeapSelect MMAllocate MMDeallocate MMExpand MMGetBlockSize "
+        "MMGetMemoryStatus MMGetStatsForModules MMCheckMemoryCorrupt MMGetMemoryBlockStatus "
+        "MMDumpMemoryStats MMSmallAlloc MMSmallRealloc MMSmallFree MMSmallMsize "
+        "MMGetFixedPool MMReleaseFixedPool");
+    int found = 0;
+    for (std::string name; names >> name; ++found)
+        EXPECT_NE(nullptr, dlsym(module, name.c_str())) << name;
+    EXPECT_EQ(17, found);
     EXPECT_EQ(reinterpret_cast<void *>(&MMAllocate), dlsym(module, "MMAllocate"));
     dlclose(module);
 }
@@ -164,42 +134,40 @@ TEST(MemoryManagerBackend, OtherBackendPassesTheSameSuitesInAChildProcess) {
 // Heaps
 // ---------------------------------------------------------------------------------------------
 
-TEST(MemoryManagerHeaps, CreateGivesConsecutiveIdsWithARecordEach) {
-    int const first = new_heap();
-    int const second = new_heap();
-    ASSERT_GE(first, 0);
-    EXPECT_EQ(first + 1, second);
-    EXPECT_EQ(second + 1, MMGetStatsForModules(nullptr, 0));
-    SMMHeapStats const stats = heap_stats(second);
-    EXPECT_EQ(second, stats.m_heap);
-    EXPECT_EQ(0u, stats.m_allocations);
-    EXPECT_EQ(0u, stats.m_live_bytes);
-}
-
-TEST(MemoryManagerHeaps, BlocksAreCountedOnTheHeapThatMadeThemWhicheverIsSelected) {
-    int const a = new_heap();
-    int const b = new_heap();
-    void *p_a = allocate_on(a, 100);
-    void *p_b1 = allocate_on(b, 40);
-    void *p_b2 = allocate_on(b, 40);
+// Consecutive ids with a record each; blocks are counted on the heap that made them, whichever is
+// selected when they are freed; the status is the sum of the records.
+TEST(MemoryManagerHeaps, BlocksAreCountedOnTheHeapThatMadeThem) {
+    int const a = new_heap(), b = new_heap();
+    ASSERT_GE(a, 0);
+    EXPECT_EQ(a + 1, b);
+    EXPECT_EQ(b + 1, MMGetStatsForModules(nullptr, 0));
+    EXPECT_EQ(b, all_heap_stats().at(b).m_heap);
+    EXPECT_EQ((std::vector<uint64_t>{0, 0, 0}), counts(b));
+    void *p_a = allocate_on(a, 100), *p_b1 = allocate_on(b, 40), *p_b2 = allocate_on(b, 40);
     ASSERT_TRUE(p_a && p_b1 && p_b2);
-
-    EXPECT_EQ(1u, heap_stats(a).m_allocations);
-    EXPECT_EQ(MMGetBlockSize(p_a), heap_stats(a).m_live_bytes);
-    EXPECT_EQ(2u, heap_stats(b).m_allocations);
-    if (is_system_backend()) {
-        EXPECT_EQ(80u, heap_stats(b).m_live_bytes); // requested sizes
+    EXPECT_EQ((std::vector<uint64_t>{1, 0, MMGetBlockSize(p_a)}), counts(a));
+    EXPECT_EQ((std::vector<uint64_t>{2, 0, is_system_backend() ? 80 : counts(b)[2]}), counts(b));
+    SMMHeapStats sum = {};
+    for (SMMHeapStats const &stats : all_heap_stats()) {
+        sum.m_allocations += stats.m_allocations;
+        sum.m_deallocations += stats.m_deallocations;
+        sum.m_live_bytes += stats.m_live_bytes;
     }
+    SMMHeapStats const total = totals();
+    EXPECT_EQ((std::vector<uint64_t>{sum.m_allocations, sum.m_deallocations, sum.m_live_bytes}),
+              (std::vector<uint64_t>{total.m_allocations, total.m_deallocations, total.m_live_bytes}));
+    EXPECT_EQ(-1, total.m_heap);
+    EXPECT_EQ(0, MMGetMemoryStatus(nullptr));
 
     MMHeapSelect(b); // freeing doesn't depend on the selection
     MMDeallocate(p_a);
-    EXPECT_EQ(1u, heap_stats(a).m_deallocations);
-    EXPECT_EQ(0u, heap_stats(a).m_live_bytes);
-    EXPECT_EQ(0u, heap_stats(b).m_deallocations);
+    EXPECT_EQ((std::vector<uint64_t>{1, 1, 0}), counts(a));
+    EXPECT_EQ(0u, counts(b)[1]);
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_b1));
     MMDeallocate(p_b1);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_b1));
     MMDeallocate(p_b2);
-    EXPECT_EQ(2u, heap_stats(b).m_deallocations);
-    EXPECT_EQ(0u, heap_stats(b).m_live_bytes);
+    EXPECT_EQ((std::vector<uint64_t>{2, 2, 0}), counts(b));
 }
 
 TEST(MemoryManagerHeaps, AllocationWithoutAValidSelectionUsesOneDefaultHeap) {
@@ -211,99 +179,65 @@ TEST(MemoryManagerHeaps, AllocationWithoutAValidSelectionUsesOneDefaultHeap) {
     void *p_second = MMAllocate(16, 0);
     MMHeapSelect(-1);
     void *p_third = MMAllocate(16, 0);
-
     ASSERT_TRUE(p_first && p_second && p_third);
     EXPECT_LE(heaps_after_first, heaps_before + 1);
     EXPECT_EQ(heaps_after_first, MMGetStatsForModules(nullptr, 0));
     EXPECT_EQ(1, MMGetMemoryBlockStatus(p_second));
-    MMDeallocate(p_first);
-    MMDeallocate(p_second);
-    MMDeallocate(p_third);
+    for (void *p : {p_first, p_second, p_third})
+        MMDeallocate(p);
 }
 
-TEST(MemoryManagerHeaps, BlockSizeCoversTheRequestAndEveryByteIsUsable) {
+// Block sizes cover the request and every byte is usable; a block grows only into room it already
+// has and never shrinks. Bigger than a heap's pages, mimalloc gives a block a segment of its own.
+TEST(MemoryManagerHeaps, BlockSizesAndExpand) {
     int const heap = new_heap();
-    for (size_t size : {size_t(1), size_t(24), size_t(100), size_t(4096), size_t(100000)}) {
+    for (size_t size : {size_t(1), size_t(24), size_t(100), size_t(4096), size_t(100000), size_t(40) << 20}) {
         char *p = static_cast<char *>(allocate_on(heap, size));
         ASSERT_NE(nullptr, p) << size;
         size_t const block_size = MMGetBlockSize(p);
         EXPECT_GE(block_size, size);
+        EXPECT_GE(counts(heap)[2], size);
         if (is_system_backend()) {
             EXPECT_EQ(size, block_size);
         }
         memset(p, 0x5a, block_size);
+        EXPECT_NE(0, MMCheckMemoryCorrupt());
         MMDeallocate(p);
+        EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
     }
-    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
-}
+    EXPECT_EQ(0u, counts(heap)[2]);
 
-TEST(MemoryManagerHeaps, ExpandSucceedsWithinTheBlockAndFailsBeyondWithoutChangingIt) {
-    int const heap = new_heap();
     char *p = static_cast<char *>(allocate_on(heap, 100));
     size_t const size = MMGetBlockSize(p);
-    EXPECT_EQ(1, MMExpand(p, 50)); // no shrinking: the block stays as it is
+    size_t const room = is_system_backend() ? malloc_usable_size(p) : size; // 100 under the sanitizers
+    EXPECT_EQ(1, MMExpand(p, 50));
     EXPECT_EQ(size, MMGetBlockSize(p));
+    EXPECT_EQ(1, MMExpand(p, room));
+    EXPECT_EQ(0, MMExpand(p, room + 1));
     EXPECT_EQ(0, MMExpand(p, 1 << 20));
-    EXPECT_EQ(size, MMGetBlockSize(p));
-    EXPECT_EQ(size, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ(room, MMGetBlockSize(p));
+    EXPECT_EQ(room, counts(heap)[2]);
     EXPECT_EQ(0, MMExpand(nullptr, 10));
     MMDeallocate(p);
-}
-
-TEST(MemoryManagerHeaps, ExpandOnTheCHeapGrowsIntoRoomTheBlockAlreadyHas) {
-    if (!is_system_backend()) GTEST_SKIP() << "C heap only";
-    int const heap = new_heap();
-    void *p = allocate_on(heap, 100);
-    size_t const room = malloc_usable_size(p); // 100 under the sanitizers, a little more without
-    EXPECT_EQ(1, MMExpand(p, room));
-    EXPECT_EQ(room, MMGetBlockSize(p));
-    EXPECT_EQ(room, heap_stats(heap).m_live_bytes);
-    EXPECT_EQ(0, MMExpand(p, room + 1));
-    MMDeallocate(p);
-    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
-}
-
-// Bigger than a heap's pages: mimalloc gives such a block a segment of its own.
-TEST(MemoryManagerHeaps, BigBlocksAreCountedAndFreedOnTheirHeap) {
-    int const heap = new_heap();
-    size_t const size = size_t(40) << 20;
-    void *p = allocate_on(heap, size);
-    ASSERT_NE(nullptr, p);
-    EXPECT_GE(heap_stats(heap).m_live_bytes, size);
-    EXPECT_EQ(1, MMGetMemoryBlockStatus(p));
-    EXPECT_NE(0, MMCheckMemoryCorrupt());
-    MMDeallocate(p);
-    EXPECT_EQ(1u, heap_stats(heap).m_deallocations);
-    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
-    EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
-    EXPECT_NE(0, MMCheckMemoryCorrupt());
+    EXPECT_EQ(0u, counts(heap)[2]);
 }
 
 // ---------------------------------------------------------------------------------------------
 // Blocks the manager didn't make
 // ---------------------------------------------------------------------------------------------
 
-TEST(MemoryManagerForeignBlocks, DeallocateGivesACHeapBlockBackWithoutCountingIt) {
+TEST(MemoryManagerForeignBlocks, AreGivenBackToTheirAllocatorWithoutCounting) {
     SMMHeapStats const before = totals();
     void *p = malloc(64);
     memset(p, 1, 64);
     EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
     EXPECT_EQ(0, MMExpand(p, 32));
     MMDeallocate(p); // the sanitizers see a wrong allocator here; mimalloc would crash
-    SMMHeapStats const after = totals();
-    EXPECT_EQ(before.m_deallocations, after.m_deallocations);
-    EXPECT_EQ(before.m_live_bytes, after.m_live_bytes);
-}
-
-TEST(MemoryManagerForeignBlocks, DeallocateGivesASmallBlockBackToItsAllocator) {
-    SMMHeapStats const before = totals();
-    void *p = MMSmallAlloc(48);
-    EXPECT_EQ(0, MMGetMemoryBlockStatus(p));
-    MMDeallocate(p);
+    void *p_small = MMSmallAlloc(48);
+    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_small));
+    MMDeallocate(p_small);
     EXPECT_EQ(before.m_deallocations, totals().m_deallocations);
-}
-
-TEST(MemoryManagerForeignBlocks, NullAndStackAddressesAreNoBlocks) {
+    EXPECT_EQ(before.m_live_bytes, totals().m_live_bytes);
     int on_stack = 0;
     MMDeallocate(nullptr);
     EXPECT_EQ(0, MMGetMemoryBlockStatus(nullptr));
@@ -314,24 +248,6 @@ TEST(MemoryManagerForeignBlocks, NullAndStackAddressesAreNoBlocks) {
 // ---------------------------------------------------------------------------------------------
 // Statistics and checks
 // ---------------------------------------------------------------------------------------------
-
-TEST(MemoryManagerChecks, StatusIsTheSumOfTheHeapRecords) {
-    int const heap = new_heap();
-    void *p = allocate_on(heap, 200);
-    SMMHeapStats sum = {};
-    for (SMMHeapStats const &stats : all_heap_stats()) {
-        sum.m_allocations += stats.m_allocations;
-        sum.m_deallocations += stats.m_deallocations;
-        sum.m_live_bytes += stats.m_live_bytes;
-    }
-    SMMHeapStats const total = totals();
-    EXPECT_EQ(-1, total.m_heap);
-    EXPECT_EQ(sum.m_allocations, total.m_allocations);
-    EXPECT_EQ(sum.m_deallocations, total.m_deallocations);
-    EXPECT_EQ(sum.m_live_bytes, total.m_live_bytes);
-    EXPECT_EQ(0, MMGetMemoryStatus(nullptr));
-    MMDeallocate(p);
-}
 
 TEST(MemoryManagerChecks, StatsForModulesWritesAtMostMaxRecordsAndRejectsBadArguments) {
     new_heap();
@@ -350,32 +266,25 @@ TEST(MemoryManagerChecks, StatsForModulesWritesAtMostMaxRecordsAndRejectsBadArgu
 TEST(MemoryManagerChecks, SmallAllocationsAreCountedProcessWideAndKeepTheirContent) {
     uint64_t const before = totals().m_small_allocations;
     char *p_a = static_cast<char *>(MMSmallAlloc(10));
-    void *p_b = MMSmallAlloc(0);
-    void *p_c = MMSmallAlloc(300);
+    void *p_b = MMSmallAlloc(0), *p_c = MMSmallAlloc(300);
     ASSERT_TRUE(p_a && p_b && p_c);
-    EXPECT_EQ(before + 3, totals().m_small_allocations);
     for (SMMHeapStats const &stats : all_heap_stats())
         EXPECT_EQ(before + 3, stats.m_small_allocations);
     EXPECT_GE(MMSmallMsize(p_a), 10u);
     EXPECT_GE(MMSmallMsize(p_c), 300u);
-
     memcpy(p_a, "ten bytes", 10);
     p_a = static_cast<char *>(MMSmallRealloc(p_a, 5000));
     ASSERT_NE(nullptr, p_a);
     EXPECT_STREQ("ten bytes", p_a);
     EXPECT_GE(MMSmallMsize(p_a), 5000u);
     EXPECT_EQ(before + 3, totals().m_small_allocations); // realloc isn't an MMSmallAlloc call
-
-    MMSmallFree(p_a);
-    MMSmallFree(p_b);
-    MMSmallFree(p_c);
-    MMSmallFree(nullptr);
+    for (void *p : {static_cast<void *>(p_a), p_b, p_c, static_cast<void *>(nullptr)})
+        MMSmallFree(p);
     EXPECT_EQ(0u, MMSmallMsize(nullptr));
 }
 
 TEST(MemoryManagerChecks, NothingIsCorruptAfterOrdinaryUse) {
-    int const a = new_heap();
-    int const b = new_heap();
+    int const a = new_heap(), b = new_heap();
     std::vector<void *> blocks;
     for (int i = 0; i < 200; ++i)
         blocks.push_back(allocate_on(i % 2 ? a : b, size_t(16 + i * 8)));
@@ -399,28 +308,15 @@ TEST(MemoryManagerChecks, BlockFreedBehindTheManagersBackIsFound) {
         testing::ExitedWithCode(0), "");
 }
 
-TEST(MemoryManagerChecks, BlockStatusTellsLiveBlocksFromFreedOnes) {
-    int const heap = new_heap();
-    void *p_kept = allocate_on(heap, 32);
-    void *p_freed = allocate_on(heap, 32);
-    MMDeallocate(p_freed);
-    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_kept));
-    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_freed));
-    MMDeallocate(p_kept);
-    EXPECT_EQ(0, MMGetMemoryBlockStatus(p_kept));
-}
-
 TEST(MemoryManagerChecks, DumpWritesALinePerHeap) {
     int const heap = new_heap();
     void *p = allocate_on(heap, 64);
-    void *p_gone = allocate_on(heap, 64);
-    MMDeallocate(p_gone);
+    MMDeallocate(allocate_on(heap, 64));
     std::string const text = dump_text();
     std::string const line = "heap " + std::to_string(heap) + ": 2 allocations, 1 deallocations, " +
                              std::to_string(MMGetBlockSize(p)) + " live bytes\n";
     EXPECT_NE(std::string::npos, text.find(line)) << text;
-    std::string const heaps = std::to_string(MMGetStatsForModules(nullptr, 0)) + " heaps, ";
-    EXPECT_NE(std::string::npos, text.find(heaps)) << text;
+    EXPECT_NE(std::string::npos, text.find(std::to_string(MMGetStatsForModules(nullptr, 0)) + " heaps, "));
     MMDeallocate(p);
 }
 
@@ -428,30 +324,25 @@ TEST(MemoryManagerChecks, DumpWritesALinePerHeap) {
 // Fixed pools
 // ---------------------------------------------------------------------------------------------
 
-TEST(MemoryManagerFixedPools, NewRecordIsEmptyWithAtLeastAPointerPerElement) {
-    SFixedPool *p_pool = MMGetFixedPool(3, 50);
-    ASSERT_NE(nullptr, p_pool);
-    EXPECT_EQ(sizeof(void *), p_pool->m_element_size);
-    EXPECT_EQ(50u, p_pool->m_block_elements);
-    EXPECT_EQ(0u, p_pool->m_blocks);
-    EXPECT_EQ(0u, p_pool->m_used);
-    EXPECT_EQ(0u, p_pool->m_total_bytes);
-    EXPECT_EQ(nullptr, p_pool->mp_free);
-    EXPECT_EQ(nullptr, p_pool->mp_blocks);
-    MMReleaseFixedPool(p_pool);
-}
-
+// A new record is empty with at least a pointer per element; equal size and count share one.
 TEST(MemoryManagerFixedPools, EqualSizeAndCountShareOneRecord) {
-    SFixedPool *p_a = MMGetFixedPool(24, 77);
-    SFixedPool *p_b = MMGetFixedPool(24, 77);
-    SFixedPool *p_other_count = MMGetFixedPool(24, 78);
-    SFixedPool *p_other_size = MMGetFixedPool(32, 77);
-    SFixedPool *p_small = MMGetFixedPool(2, 77); // both come to one pointer per element
-    SFixedPool *p_word = MMGetFixedPool(sizeof(void *), 77);
+    SFixedPool *p_small = MMGetFixedPool(3, 50);
+    ASSERT_NE(nullptr, p_small);
+    EXPECT_EQ(sizeof(void *), p_small->m_element_size);
+    EXPECT_EQ(50u, p_small->m_block_elements);
+    EXPECT_TRUE(!p_small->m_blocks && !p_small->m_used && !p_small->m_total_bytes && !p_small->mp_free &&
+                !p_small->mp_blocks);
+    SFixedPool *p_a = MMGetFixedPool(24, 77), *p_b = MMGetFixedPool(24, 77);
+    SFixedPool *p_other_count = MMGetFixedPool(24, 78), *p_other_size = MMGetFixedPool(32, 77);
+    SFixedPool *p_word = MMGetFixedPool(sizeof(void *), 50);
     EXPECT_EQ(p_a, p_b);
     EXPECT_NE(p_a, p_other_count);
     EXPECT_NE(p_a, p_other_size);
     EXPECT_EQ(p_small, p_word);
+    EXPECT_EQ("pool 24 x 77: 2 references, 0 blocks, 0 used, 0 bytes", pool_line(24, 77));
+    SFixedPool stranger = *p_a; // a record the manager doesn't know changes nothing
+    MMReleaseFixedPool(&stranger);
+    MMReleaseFixedPool(nullptr);
     EXPECT_EQ("pool 24 x 77: 2 references, 0 blocks, 0 used, 0 bytes", pool_line(24, 77));
     for (SFixedPool *p : {p_a, p_b, p_other_count, p_other_size, p_small, p_word})
         MMReleaseFixedPool(p);
@@ -460,28 +351,20 @@ TEST(MemoryManagerFixedPools, EqualSizeAndCountShareOneRecord) {
 
 TEST(MemoryManagerFixedPools, LastReleaseGivesTheClientsBlocksBackToTheirHeap) {
     int const heap = new_heap();
-    SFixedPool *p_pool = MMGetFixedPool(40, 4);
-    SFixedPool *p_shared = MMGetFixedPool(40, 4);
-    add_client_block(*p_pool, heap);
-    add_client_block(*p_pool, heap);
-    void *p_block = p_pool->mp_blocks;
-    EXPECT_EQ(2u, heap_stats(heap).m_allocations);
-
+    SFixedPool *p_pool = MMGetFixedPool(40, 4), *p_shared = MMGetFixedPool(40, 4);
+    for (int i = 0; i < 2; ++i) { // blocks allocated and linked into the record as the client does
+        size_t const bytes = size_t(p_pool->m_element_size) * p_pool->m_block_elements + sizeof(void *);
+        void *p_block = allocate_on(heap, bytes);
+        *static_cast<void **>(p_block) = p_pool->mp_blocks;
+        p_pool->mp_blocks = p_block;
+        ++p_pool->m_blocks;
+        p_pool->m_total_bytes += static_cast<uint32_t>(bytes);
+    }
     MMReleaseFixedPool(p_shared);
-    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_block));
-    EXPECT_EQ(0u, heap_stats(heap).m_deallocations);
-
+    EXPECT_EQ(1, MMGetMemoryBlockStatus(p_pool->mp_blocks));
+    EXPECT_EQ(2u, counts(heap)[0]);
+    EXPECT_EQ(0u, counts(heap)[1]);
     MMReleaseFixedPool(p_pool);
-    EXPECT_EQ(2u, heap_stats(heap).m_deallocations);
-    EXPECT_EQ(0u, heap_stats(heap).m_live_bytes);
+    EXPECT_EQ((std::vector<uint64_t>{2, 2, 0}), counts(heap));
     EXPECT_EQ("", pool_line(40, 4));
-}
-
-TEST(MemoryManagerFixedPools, ReleaseOfAnUnknownRecordChangesNothing) {
-    SFixedPool *p_pool = MMGetFixedPool(56, 9);
-    SFixedPool stranger = *p_pool;
-    MMReleaseFixedPool(&stranger);
-    MMReleaseFixedPool(nullptr);
-    EXPECT_EQ("pool 56 x 9: 1 references, 0 blocks, 0 used, 0 bytes", pool_line(56, 9));
-    MMReleaseFixedPool(p_pool);
 }

@@ -27,57 +27,43 @@ protected:
 
 } // namespace
 
-TEST_F(PlatformClockTest, SystemClocksAreTheMonotonicClock) {
+// The system clocks are the monotonic clock; an installed clock replaces both counters until it
+// is removed.
+TEST_F(PlatformClockTest, SystemClocksAreTheMonotonicClockUnlessOneIsInstalled) {
     int64_t const before = monotonic_ns();
     int64_t const counter = query_performance_counter();
     uint32_t const ticks = get_tick_count();
     int64_t const after = monotonic_ns();
-
     EXPECT_EQ(1000000000, query_performance_frequency());
     EXPECT_LE(before, counter);
     EXPECT_LE(counter, after);
     // Tick counts wrap, so they compare by their distance modulo 2^32.
     EXPECT_LE(uint32_t(ticks - uint32_t(before / 1000000)), uint32_t((after - before) / 1000000 + 1));
-}
 
-TEST_F(PlatformClockTest, InstalledClockReplacesBothCountersUntilRemoved) {
     CManualClock clock(5000);
     set_clock(&clock);
     EXPECT_EQ(5000u, get_tick_count());
-    EXPECT_EQ(int64_t(5000) * 1000000, query_performance_counter());
     clock.advance_ms(16);
     EXPECT_EQ(5016u, get_tick_count());
     EXPECT_EQ(int64_t(5016) * 1000000, query_performance_counter());
-
     set_clock(nullptr);
-    int64_t const before = monotonic_ns();
-    EXPECT_GE(query_performance_counter(), before);
+    int64_t const now = monotonic_ns();
+    EXPECT_GE(query_performance_counter(), now);
 }
 
+// A module and its entry point are found; a missing file, symbol or argument fails with a message.
 TEST(PlatformModules, LoadsTheMemoryManagerAndFindsItsEntryPoint) {
     void *module = load_library("libqorMemoryManager.so");
     ASSERT_NE(nullptr, module) << last_module_error();
     // The module is already a neighbour of this program, so it is the same code.
     EXPECT_EQ(reinterpret_cast<void *>(&MMAllocate), get_proc_address(module, "MMAllocate"));
-    free_library(module);
-}
-
-TEST(PlatformModules, MissingFileFailsWithTheLoadersMessage) {
-    EXPECT_EQ(nullptr, load_library("libqorNoSuchModule.so"));
-    EXPECT_NE(std::string::npos, std::string(last_module_error()).find("libqorNoSuchModule.so"))
-        << last_module_error();
-}
-
-TEST(PlatformModules, MissingSymbolFailsWithTheLoadersMessage) {
-    void *module = load_library("libqorMemoryManager.so");
-    ASSERT_NE(nullptr, module);
     EXPECT_EQ(nullptr, get_proc_address(module, "MMNoSuchEntry"));
     EXPECT_NE(std::string::npos, std::string(last_module_error()).find("MMNoSuchEntry"))
         << last_module_error();
     free_library(module);
-}
-
-TEST(PlatformModules, NullArgumentsFailWithAMessage) {
+    EXPECT_EQ(nullptr, load_library("libqorNoSuchModule.so"));
+    EXPECT_NE(std::string::npos, std::string(last_module_error()).find("libqorNoSuchModule.so"))
+        << last_module_error();
     EXPECT_EQ(nullptr, load_library(nullptr));
     EXPECT_STREQ("no file name", last_module_error());
     EXPECT_EQ(nullptr, get_proc_address(nullptr, "MMAllocate"));

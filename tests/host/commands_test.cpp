@@ -96,6 +96,13 @@ TEST_F(CommandsTest, CompletionGoesThroughTheNamesWithAPrefixInNameOrderAndMayWr
     EXPECT_STREQ("showfps", m_commands.find_next_command("showa", false)); // on from where it would stand
     EXPECT_EQ(nullptr, m_commands.find_first_command("x"));
     EXPECT_EQ(nullptr, m_commands.find_next_command("x", true)); // nothing of the prefix to wrap to
+    // Asked again for the name it gave out last, the first name keeps the prefix that led there:
+    // a console that completes a line and asks with the whole name goes round the names of "sh".
+    EXPECT_STREQ("show", m_commands.find_first_command("sh"));
+    EXPECT_STREQ("show", m_commands.find_first_command("show"));
+    EXPECT_STREQ("showfps", m_commands.find_next_command("show", true));
+    EXPECT_STREQ("showfps", m_commands.find_first_command("showfps"));
+    EXPECT_STREQ("show", m_commands.find_next_command("showfps", true));
 
     for (char const *name : {"scr_resy", "scr_resx", "sv_cheats", "scr_bpp", "volume"})
         m_vars.set_var(name, "1");

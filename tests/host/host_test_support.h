@@ -1,10 +1,13 @@
 // What the host's tests share: a temporary folder for the files a test makes, little-endian
-// byte writers for those files, WAV files, and a readable print of colours.
+// byte writers for those files, WAV files, a record of input, and a readable print of colours.
 #pragma once
+#include "input_system.h"
 #include "qor_math.h"
 #include "test_common.h"
 
 #include <cstdint>
+#include <cstdio>
+#include <functional>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -32,6 +35,36 @@ public:
 
 private:
     std::string m_path = qortest::make_temp_dir();
+};
+
+// Every input a listener hears, as a line of text ("<name> key_down 0xC0 0", codes of keys and
+// characters in hexadecimal) in a list that the listeners of a test may share; then its action.
+class CInputRecord : public IPointerListener, public IKeyListener {
+public:
+    explicit CInputRecord(std::vector<std::string> &_lines, std::string const &_name = std::string())
+        : m_lines(_lines), m_prefix(_name.empty() ? _name : _name + " ") {}
+
+    void on_button_down(unsigned _button) override { add("down %u", _button); }
+    void on_button_up(unsigned _button) override { add("up %u", _button); }
+    void on_pointer_move(vec2_t const &_movement) override { add("move %g %g", _movement.x, _movement.y); }
+    void on_wheel(float _rotation) override { add("wheel %g", _rotation); }
+    void on_key_down(unsigned _key, unsigned _extra) override { add("key_down 0x%X %u", _key, _extra); }
+    void on_key_up(unsigned _key) override { add("key_up 0x%X", _key); }
+    void on_char(unsigned _code) override { add("char 0x%X", _code); }
+
+    std::function<void()> m_action;
+
+private:
+    template <class... Args>
+    void add(char const *_format, Args... _args) {
+        char line[64];
+        snprintf(line, sizeof(line), _format, _args...);
+        m_lines.push_back(m_prefix + line);
+        if (m_action) m_action();
+    }
+
+    std::vector<std::string> &m_lines;
+    std::string m_prefix;
 };
 
 inline bytes_t read_bytes(std::string const &_path) {

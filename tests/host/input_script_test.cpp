@@ -21,10 +21,10 @@ TEST(InputScript, EveryStepParsesWithCommentsAndBlankLines) {
     std::string error;
     ASSERT_TRUE(script.parse("# a replay\n\nmove 1.5 -2\npress\npress 1\nrelease 1 # comment\nwheel -0.5\n"
                              "key_down 0xC0\nkey_down 65 3\nkey_up 0x41\nchar 97\nwait 3\nwait 250ms\n"
-                             "screenshot shot.png\ncommand set scr_gamma 2\n",
+                             "screenshot shot.png\ncommand set scr_gamma 2\ntype ui_export a b.lua\n",
                              "test.script", error))
         << error;
-    EXPECT_EQ(13u, script.get_steps_count());
+    EXPECT_EQ(14u, script.get_steps_count());
 }
 
 TEST(InputScript, BadLinesNameTheirFileAndLine) {
@@ -36,6 +36,7 @@ TEST(InputScript, BadLinesNameTheirFileAndLine) {
     EXPECT_EQ("test.script:1: 'ms' is no number", error_of("wait ms\n"));
     EXPECT_EQ("test.script:3: 'screenshot' needs a file", error_of("\n\nscreenshot\n"));
     EXPECT_EQ("test.script:1: 'command' needs a line", error_of("command   \n"));
+    EXPECT_EQ("test.script:1: 'type' needs a text", error_of("type\n"));
 }
 
 TEST(InputScript, AMissingFileIsReportedAndAFailedLoadKeepsNothing) {

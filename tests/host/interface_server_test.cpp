@@ -57,43 +57,43 @@ private:
 
 } // namespace
 
-TEST(InterfaceServer, RegistrationIsNewOnceAndTellsTheListeners) {
+// A registration is new once and tells the listeners (each added once); a query finds the
+// interface by every word of its identifier and its version.
+TEST(InterfaceServer, RegistrationIsNewOnceAndQueriesFindItByIdentifierAndVersion) {
     CInterfaceServer server;
     notice_list_t notices;
     CListener listener("L", notices);
     server.add_listener(&listener);
-    server.add_listener(&listener); // once is enough
-    CTestInterface a(k_uid_a, 1);
-
-    EXPECT_EQ(1, server.register_interface(&a));
-    EXPECT_EQ(0, server.register_interface(&a));
-    EXPECT_EQ(-1, server.register_interface(nullptr));
-    EXPECT_EQ(1u, server.get_interfaces_count());
-    EXPECT_EQ(1u, server.get_listeners_count());
-    EXPECT_EQ((notice_list_t{{"L registered", &a}}), notices);
-}
-
-TEST(InterfaceServer, QueryFindsTheInterfaceByIdentifierAndVersion) {
-    CInterfaceServer server;
+    server.add_listener(&listener);
     CTestInterface a1(k_uid_a, 1), a2(k_uid_a, 2), b1(k_uid_b, 1);
-    for (IInterfaceBase *p : {static_cast<IInterfaceBase *>(&a1), static_cast<IInterfaceBase *>(&a2),
-                              static_cast<IInterfaceBase *>(&b1)})
-        server.register_interface(p);
+    EXPECT_EQ(1, server.register_interface(&a1));
+    EXPECT_EQ(0, server.register_interface(&a1));
+    EXPECT_EQ(-1, server.register_interface(nullptr));
+    EXPECT_EQ(1u, server.get_listeners_count());
+    EXPECT_EQ((notice_list_t{{"L registered", &a1}}), notices);
+    server.register_interface(&a2);
+    server.register_interface(&b1);
     CLogManager log;
     server.register_interface(&log);
+    EXPECT_EQ(4u, server.get_interfaces_count());
 
-    EXPECT_EQ(&a1, server.query_interface(k_uid_a, 1));
-    EXPECT_EQ(&a2, server.query_interface(k_uid_a, 2));
-    EXPECT_EQ(&b1, server.query_interface(k_uid_b, 1));
-    EXPECT_EQ(&log, server.query_interface(qor_uid::LOG_MANAGER, 1));
-    EXPECT_EQ(nullptr, server.query_interface(k_uid_b, 2));
-    EXPECT_EQ(nullptr, server.query_interface(SInterfaceUID{{1, 2, 3, 6}}, 1));
-    // A word in any place makes another identifier.
-    EXPECT_EQ(nullptr, server.query_interface(SInterfaceUID{{0, 2, 3, 4}}, 1));
-    EXPECT_EQ(nullptr, server.query_interface(qor_uid::INPUT_SYSTEM, 1));
+    struct {
+        SInterfaceUID m_uid;
+        int m_version;
+        IInterfaceBase *mp_found;
+    } const rows[] = {{k_uid_a, 1, &a1},
+                      {k_uid_a, 2, &a2},
+                      {k_uid_b, 1, &b1},
+                      {qor_uid::LOG_MANAGER, 1, &log},
+                      {k_uid_b, 2, nullptr},
+                      {SInterfaceUID{{1, 2, 3, 6}}, 1, nullptr},
+                      {SInterfaceUID{{0, 2, 3, 4}}, 1, nullptr}, // a word in any place makes another one
+                      {qor_uid::INPUT_SYSTEM, 1, nullptr}};
+    for (size_t i = 0; i < sizeof(rows) / sizeof(rows[0]); ++i)
+        EXPECT_EQ(rows[i].mp_found, server.query_interface(rows[i].m_uid, rows[i].m_version)) << "row " << i;
 }
 
-TEST(InterfaceServer, WithdrawalTellsListenersWhileTheInterfaceIsStillThere) {
+TEST(InterfaceServer, WithdrawalTellsListenersWhileTheInterfaceIsStillThereNewestFirst) {
     CInterfaceServer server;
     CTestInterface a(k_uid_a, 1), b(k_uid_b, 1);
     server.register_interface(&a);
@@ -122,6 +122,16 @@ TEST(InterfaceServer, WithdrawalTellsListenersWhileTheInterfaceIsStillThere) {
     server.remove_listener(&first);
     server.withdraw_interface(&b);
     EXPECT_EQ((notice_list_t{{"second withdrawn", &b}}), notices);
+    EXPECT_EQ(0u, server.get_interfaces_count());
+
+    // Withdrawing everything goes newest first.
+    CTestInterface c(k_uid_b, 2);
+    for (IInterfaceBase *p : std::vector<IInterfaceBase *>{&a, &b, &c})
+        server.register_interface(p);
+    notices.clear();
+    server.withdraw_all();
+    EXPECT_EQ((notice_list_t{{"second withdrawn", &c}, {"second withdrawn", &b}, {"second withdrawn", &a}}),
+              notices);
     EXPECT_EQ(0u, server.get_interfaces_count());
 }
 
@@ -155,30 +165,26 @@ TEST(InterfaceServer, ListenerRemovedDuringANoticeHearsNothingMore) {
     EXPECT_EQ(1u, server.get_listeners_count());
 }
 
-TEST(InterfaceServer, WithdrawAllGoesNewestFirst) {
-    CInterfaceServer server;
-    CTestInterface a(k_uid_a, 1), b(k_uid_b, 1), c(k_uid_b, 2);
-    server.register_interface(&a);
-    server.register_interface(&b);
-    server.register_interface(&c);
-    notice_list_t notices;
-    CListener listener("L", notices);
-    server.add_listener(&listener);
-
-    server.withdraw_all();
-    EXPECT_EQ((notice_list_t{{"L withdrawn", &c}, {"L withdrawn", &b}, {"L withdrawn", &a}}), notices);
-    EXPECT_EQ(0u, server.get_interfaces_count());
-}
-
-TEST(InterfaceServerModules, MissingLibraryIsReportedByName) {
+TEST(InterfaceServerModules, LoadedModuleRegistersThroughItsEntryPointAndMissingOnesAreReported) {
+    // The demo game library, built beside the tests, finds the log and the commands on the server.
     CReportCapture reports;
+    CLogManager log;
+    log.set_quiet(true);
+    CVarManager vars;
+    CCmdManager commands(&vars);
     CInterfaceServer server;
-    server.set_modules_folder(executable_folder());
+    server.set_modules_folders({executable_folder()});
+    server.register_interface(&log);
+    server.register_interface(&commands);
+
+    server.load_module(1, "libgameui_demo.so");
+    EXPECT_TRUE(reports.reports().empty());
+    // A library that is missing is reported by its name; no name loads nothing.
+    unsigned const interfaces = server.get_interfaces_count();
     server.load_module(1, "libqorhost_no_such_module.so");
     EXPECT_EQ(nullptr, server.open_module("/nowhere/libqorhost_no_such_module.so"));
     server.load_module(1, nullptr);
     server.load_module(1, "");
-
     std::vector<std::string> const warnings = reports.warnings();
     ASSERT_EQ(2u, warnings.size());
     EXPECT_EQ(0u, warnings[0].find("Cannot load module 'libqorhost_no_such_module.so': ")) << warnings[0];
@@ -187,23 +193,7 @@ TEST(InterfaceServerModules, MissingLibraryIsReportedByName) {
         << warnings[0];
     EXPECT_EQ(0u, warnings[1].find("Cannot load module '/nowhere/libqorhost_no_such_module.so': "))
         << warnings[1];
-    EXPECT_EQ(0u, server.get_interfaces_count());
-}
-
-TEST(InterfaceServerModules, LoadedModuleRegistersThroughItsEntryPoint) {
-    // The demo game library, built beside the tests, finds the log and the commands on the server.
-    CReportCapture reports;
-    CLogManager log;
-    log.set_quiet(true);
-    CVarManager vars;
-    CCmdManager commands(&vars);
-    CInterfaceServer server;
-    server.set_modules_folder(executable_folder());
-    server.register_interface(&log);
-    server.register_interface(&commands);
-
-    server.load_module(1, "libgameui_demo.so");
-    EXPECT_TRUE(reports.reports().empty());
+    EXPECT_EQ(interfaces, server.get_interfaces_count());
     ILogger *p_logger = log.find_logger("GameUI");
     ASSERT_NE(nullptr, p_logger);
     ASSERT_EQ(1u, log.get_next_index());

@@ -59,30 +59,30 @@ protected:
 
 } // namespace
 
-TEST_F(LogManagerTest, LoggersAreFoundByTheirName) {
-    ILogger *p_game = m_log.create_logger("Game", "Game: ");
-    ASSERT_NE(nullptr, p_game);
-    EXPECT_STREQ("Game", p_game->get_name());
-    EXPECT_EQ(p_game, m_log.create_logger("Game", "Other: ")); // the first one stays
-    EXPECT_EQ("Game: ", static_cast<CHostLogger *>(p_game)->get_prefix());
-    ILogger *p_ui = m_log.create_logger("UI", nullptr);
-    EXPECT_NE(p_game, p_ui);
-    EXPECT_EQ(p_ui, m_log.find_logger("UI"));
-    EXPECT_EQ(p_game, m_log.find_logger("Game"));
-    EXPECT_EQ(nullptr, m_log.find_logger("game")); // names are case-sensitive
+// Loggers are found by their name (case-sensitive; the first of a name stays); the messages of all
+// of them get running indices, an inactive logger keeps nothing.
+TEST_F(LogManagerTest, LoggersByNameAndMessagesWithRunningIndices) {
+    ILogger *p_a = m_log.create_logger("A", "A: ");
+    ASSERT_NE(nullptr, p_a);
+    EXPECT_STREQ("A", p_a->get_name());
+    EXPECT_EQ(p_a, m_log.create_logger("A", "Other: "));
+    EXPECT_EQ("A: ", static_cast<CHostLogger *>(p_a)->get_prefix());
+    ILogger *p_b = m_log.create_logger("B", nullptr);
+    EXPECT_NE(p_a, p_b);
+    EXPECT_EQ(p_b, m_log.find_logger("B"));
+    EXPECT_EQ(p_a, m_log.find_logger("A"));
+    EXPECT_EQ(nullptr, m_log.find_logger("a"));
     EXPECT_EQ(nullptr, m_log.find_logger(nullptr));
-}
 
-TEST_F(LogManagerTest, MessagesOfAllLoggersGetRunningIndices) {
-    ILogger *p_a = m_log.create_logger("A", "");
-    ILogger *p_b = m_log.create_logger("B", "");
     p_a->write("first", 0);
     unsigned short const wide[] = {'s', 'e', 'c', 0x00E9, 0};
     p_b->write(wide, 1);
+    p_b->set_active(false);
+    p_b->write("lost", 0);
+    p_b->set_active(true);
     p_a->write("", 2);
     p_a->write(static_cast<char const *>(nullptr), 0); // nothing
     p_b->write(static_cast<unsigned short const *>(nullptr), 0);
-
     EXPECT_EQ(3u, m_log.get_next_index());
     EXPECT_EQ((std::vector<SCopiedMessage>{{u"first", 0, 0}, {u"sec\u00E9", 1, 1}, {u"", 2, 2}}),
               read(m_log, 0, -1));
@@ -90,36 +90,19 @@ TEST_F(LogManagerTest, MessagesOfAllLoggersGetRunningIndices) {
     EXPECT_EQ("", m_log.get_message_text(3));
 }
 
-TEST_F(LogManagerTest, InactiveLoggerKeepsNothing) {
-    ILogger *p_a = m_log.create_logger("A", "");
-    p_a->set_active(false);
-    p_a->write("lost", 0);
-    p_a->set_active(true);
-    p_a->write("kept", 0);
-    EXPECT_EQ((std::vector<SCopiedMessage>{{u"kept", 0, 0}}), read(m_log, 0, -1));
-}
-
-TEST_F(LogManagerTest, GetMessagesStartsAtAnIndexAndStopsAfterACount) {
-    ILogger *p_a = m_log.create_logger("A", "");
-    for (int i = 0; i < 6; ++i)
-        p_a->write(("m" + std::to_string(i)).c_str(), i % 3);
-
-    EXPECT_EQ((std::vector<uint32_t>{2, 3, 4, 5}), indices(read(m_log, 2, -1)));
-    EXPECT_EQ((std::vector<uint32_t>{2, 3}), indices(read(m_log, 2, 2)));
-    EXPECT_EQ((std::vector<SCopiedMessage>{{u"m5", 2, 5}}), read(m_log, 5, 10));
-    EXPECT_TRUE(read(m_log, 6, -1).empty());
-    EXPECT_TRUE(read(m_log, 0, 0).empty());
-}
-
-TEST_F(LogManagerTest, OnlyTheNewestMessagesAreKept) {
+// get_messages starts at an index and stops after a count; only the newest messages are kept.
+TEST_F(LogManagerTest, OnlyTheNewestMessagesAreKeptAndReadFromAnIndex) {
     ILogger *p_a = m_log.create_logger("A", "");
     unsigned const total = CLogManager::MAX_MESSAGES + 5;
     for (unsigned i = 0; i < total; ++i)
-        p_a->write(std::to_string(i).c_str(), 0);
-
+        p_a->write(std::to_string(i).c_str(), i % 3);
     EXPECT_EQ(total, m_log.get_next_index());
-    std::vector<SCopiedMessage> const oldest = read(m_log, 0, 2);
-    EXPECT_EQ((std::vector<SCopiedMessage>{{u"5", 0, 5}, {u"6", 0, 6}}), oldest);
+    EXPECT_EQ((std::vector<SCopiedMessage>{{u"5", 2, 5}, {u"6", 0, 6}}), read(m_log, 0, 2));
+    EXPECT_EQ((std::vector<uint32_t>{total - 3, total - 2, total - 1}), indices(read(m_log, total - 3, -1)));
+    EXPECT_EQ((std::vector<uint32_t>{7, 8}), indices(read(m_log, 7, 2)));
+    EXPECT_EQ(size_t(1), read(m_log, total - 1, 10).size());
+    EXPECT_TRUE(read(m_log, total, -1).empty());
+    EXPECT_TRUE(read(m_log, 7, 0).empty());
     EXPECT_EQ(size_t(CLogManager::MAX_MESSAGES), read(m_log, 0, -1).size());
     EXPECT_EQ("", m_log.get_message_text(4));
     EXPECT_EQ(std::to_string(total - 1), m_log.get_message_text(total - 1));
@@ -142,15 +125,14 @@ TEST(LogManagerPrint, MessagesArePrintedWithTheLoggersPrefixUnlessQuiet) {
 // Text conversion
 // ---------------------------------------------------------------------------------------------
 
+// UTF-8 and UTF-16 round trip every plane; invalid bytes and lone surrogates become replacement
+// characters.
 TEST(LogText, Utf8AndUtf16RoundTripEveryPlane) {
     char const *const text = "a\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80z"; // a, e acute, euro, a smiley, z
     std::u16string const wide = utf8_to_utf16(text);
     EXPECT_EQ((std::u16string{u'a', 0x00E9, 0x20AC, 0xD83D, 0xDE00, u'z'}), wide);
     EXPECT_EQ(text, utf16_to_utf8(wide));
     EXPECT_EQ(u"", utf8_to_utf16(nullptr));
-}
-
-TEST(LogText, InvalidBytesAndLoneSurrogatesBecomeReplacementCharacters) {
     // A stray continuation byte, a lead byte cut short, a byte that never starts a character.
     EXPECT_EQ((std::u16string{0xFFFD, u'x', 0xFFFD, u'y', 0xFFFD}), utf8_to_utf16("\x80x\xC3y\xFF"));
     // A lead byte of a code above U+10FFFF, with its continuation bytes.

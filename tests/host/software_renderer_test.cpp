@@ -1,6 +1,6 @@
 // The host's software renderer in frames of 8 by 8: exact pixels of coloured and textured quads,
 // the shared-edge rule, alpha blending, the clip rectangle with push and pop, lines, materials with
-// missing textures, and presented frames.
+// missing textures, and presented frames; and rectangles filled by spans against their triangles.
 #include "host_test_support.h"
 #include "software_renderer.h"
 
@@ -241,4 +241,59 @@ TEST_F(SoftwareRendererTest, PresentedFramesReachTheSinkInOrder) {
     ASSERT_EQ(2u, m_renderer.get_presented());
     EXPECT_NE(presented[0].m_pixels, presented[1].m_pixels);
     EXPECT_EQ(presented[1].m_pixels, m_renderer.get_frame().m_pixels);
+}
+
+// Rectangles are filled by spans; the same rectangles drawn as two quads of one triangle each go
+// the triangles' way. Both give the same bytes for rectangles of fractional edges, colours opaque
+// and translucent, pictures at their size, stretched and shrunk by odd ratios, tinted and faded.
+TEST(SoftwareRendererRects, SpansGiveTheBytesOfTheTriangles) {
+    hosttest::CTempDir dir;
+    SImage picture; // texels of every kind of alpha and colour
+    picture.m_w = 13, picture.m_h = 7;
+    for (int i = 0; i < 13 * 7; ++i)
+        picture.m_pixels.insert(picture.m_pixels.end(),
+                                {uint8_t(i * 37), uint8_t(255 - i * 11), uint8_t(i % 3 * 127),
+                                 uint8_t(i % 4 == 0   ? 255
+                                         : i % 4 == 1 ? 0
+                                                      : i * 29)});
+    ASSERT_TRUE(write_png(dir.file("picture.png"), picture));
+    CSoftwareRenderer spans(96, 64), triangles(96, 64);
+    int materials[2] = {};
+    for (CSoftwareRenderer *p_renderer : {&spans, &triangles}) {
+        p_renderer->set_texture_folders({dir.path()});
+        p_renderer->begin_frame(rgba_t(40, 90, 200, 255));
+        materials[0] = p_renderer->create_material("ui_color", nullptr, 0, 0, 0, 0, false, false);
+        materials[1] = p_renderer->create_material("ui_image", "picture.png", 0, 0, 0, 0, false, false);
+    }
+    unsigned seed = 12345;
+    auto next = [&seed](unsigned _range) {
+        seed = seed * 1103515245u + 12345u;
+        return (seed >> 16) % _range;
+    };
+    for (int i = 0; i < 300; ++i) {
+        // Edges on 1/8 pixels, sides up to 40 pixels; the picture's part from eighths of it.
+        float const x0 = next(640) / 8.0f - 4, y0 = next(440) / 8.0f - 4;
+        float const x1 = x0 + next(320) / 8.0f + 0.125f, y1 = y0 + next(320) / 8.0f + 0.125f;
+        float const u0 = next(9) / 8.0f, v0 = next(9) / 8.0f, u1 = next(9) / 8.0f, v1 = next(9) / 8.0f;
+        uint8_t const levels[] = {0, 255, 128, 77};
+        rgba_t const colour(levels[next(4)], uint8_t(next(256)), levels[next(4)], levels[next(4)]);
+        auto at = [](float _x, float _y) { return vec2_t{_x / 48 - 1, 1 - _y / 32}; };
+        vec2_t const p[4] = {at(x0, y0), at(x1, y0), at(x1, y1), at(x0, y1)};
+        vec2_t const t[4] = {{u0, v0}, {u1, v0}, {u1, v1}, {u0, v1}};
+        int const material = materials[next(2)];
+        spans.set_material(material);
+        triangles.set_material(material);
+        int const first = static_cast<int>(next(4)), turn = next(2) ? 1 : 3; // any corner first, either way
+        auto c = [&](int _k) { return (first + turn * _k) % 4; };
+        spans.draw_quad(p[c(0)], t[c(0)], colour, p[c(1)], t[c(1)], colour, p[c(2)], t[c(2)], colour, p[c(3)],
+                        t[c(3)], colour);
+        triangles.draw_quad(p[c(0)], t[c(0)], colour, p[c(1)], t[c(1)], colour, p[c(2)], t[c(2)], colour,
+                            p[c(2)], t[c(2)], colour);
+        triangles.draw_quad(p[c(0)], t[c(0)], colour, p[c(2)], t[c(2)], colour, p[c(3)], t[c(3)], colour,
+                            p[c(3)], t[c(3)], colour);
+        if (spans.get_frame().m_pixels != triangles.get_frame().m_pixels) {
+            ADD_FAILURE() << "rectangle " << i << ": " << x0 << ", " << y0 << " to " << x1 << ", " << y1;
+            break;
+        }
+    }
 }

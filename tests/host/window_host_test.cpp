@@ -6,6 +6,7 @@
 #include "host_test_support.h"
 #include "qorbase.h"
 #include "sdl_audio.h"
+#include "sdl_renderer.h"
 #include "window_host.h"
 
 #include <gtest/gtest.h>
@@ -19,6 +20,7 @@
 using namespace qorhost;
 using hosttest::bytes_t;
 using hosttest::chunk;
+using hosttest::CInputRecord;
 using hosttest::CReportCapture;
 using hosttest::CTempDir;
 using hosttest::format_chunk;
@@ -27,32 +29,15 @@ using hosttest::wave16;
 
 namespace {
 
-// Every input a listener hears, as text.
-class CInputRecord : public IPointerListener, public IKeyListener {
-public:
-    void on_button_down(unsigned _button) override { add("down %u", _button); }
-    void on_button_up(unsigned _button) override { add("up %u", _button); }
-    void on_pointer_move(vec2_t const &_movement) override { add("move %g %g", _movement.x, _movement.y); }
-    void on_wheel(float _rotation) override { add("wheel %g", _rotation); }
-    void on_key_down(unsigned _key, unsigned _extra) override { add("key_down 0x%X %u", _key, _extra); }
-    void on_key_up(unsigned _key) override { add("key_up 0x%X", _key); }
-    void on_char(unsigned _code) override { add("char 0x%X", _code); }
-
-    std::vector<std::string> m_lines;
-
-private:
-    template <class... Args>
-    void add(char const *_format, Args... _args) {
-        char line[64];
-        snprintf(line, sizeof(line), _format, _args...);
-        m_lines.push_back(line);
-    }
-};
-
-SDL_Event key_event(Uint32 _type, SDL_Keycode _key, SDL_Scancode _place, Uint8 _repeat = 0) {
+SDL_Event event_of(Uint32 _type) {
     SDL_Event event;
     SDL_zero(event);
     event.type = _type;
+    return event;
+}
+
+SDL_Event key_event(Uint32 _type, SDL_Keycode _key, SDL_Scancode _place, Uint8 _repeat = 0) {
+    SDL_Event event = event_of(_type);
     event.key.state = _type == SDL_KEYDOWN ? SDL_PRESSED : SDL_RELEASED;
     event.key.repeat = _repeat;
     event.key.keysym.sym = _key;
@@ -61,27 +46,21 @@ SDL_Event key_event(Uint32 _type, SDL_Keycode _key, SDL_Scancode _place, Uint8 _
 }
 
 SDL_Event motion_event(int _dx, int _dy) {
-    SDL_Event event;
-    SDL_zero(event);
-    event.type = SDL_MOUSEMOTION;
+    SDL_Event event = event_of(SDL_MOUSEMOTION);
     event.motion.xrel = _dx;
     event.motion.yrel = _dy;
     return event;
 }
 
 SDL_Event button_event(Uint32 _type, Uint8 _button) {
-    SDL_Event event;
-    SDL_zero(event);
-    event.type = _type;
+    SDL_Event event = event_of(_type);
     event.button.button = _button;
     event.button.state = _type == SDL_MOUSEBUTTONDOWN ? SDL_PRESSED : SDL_RELEASED;
     return event;
 }
 
 SDL_Event wheel_event(float _y, Uint32 _direction) {
-    SDL_Event event;
-    SDL_zero(event);
-    event.type = SDL_MOUSEWHEEL;
+    SDL_Event event = event_of(SDL_MOUSEWHEEL);
     event.wheel.y = static_cast<Sint32>(_y);
     event.wheel.preciseY = _y;
     event.wheel.direction = _direction;
@@ -89,9 +68,7 @@ SDL_Event wheel_event(float _y, Uint32 _direction) {
 }
 
 SDL_Event text_event(char const *_utf8) {
-    SDL_Event event;
-    SDL_zero(event);
-    event.type = SDL_TEXTINPUT;
+    SDL_Event event = event_of(SDL_TEXTINPUT);
     snprintf(event.text.text, sizeof(event.text.text), "%s", _utf8);
     return event;
 }
@@ -129,17 +106,15 @@ protected:
         ASSERT_TRUE(mp_window->open(error)) << error;
     }
     static void push(SDL_Event _event) { ASSERT_EQ(1, SDL_PushEvent(&_event)); }
-    rgba_t shown_pixel(int _x, int _y) const {
-        SDL_Rect const rect = {_x, _y, 1, 1};
-        uint8_t rgba[4] = {0, 0, 0, 0};
-        EXPECT_EQ(0, SDL_RenderReadPixels(mp_window->renderer(), &rect, SDL_PIXELFORMAT_RGBA32, rgba, 4))
-            << SDL_GetError();
-        return rgba_t(rgba[0], rgba[1], rgba[2], rgba[3]);
+    static rgba_t pixel(SImage const &_image, int _x, int _y) {
+        uint8_t const *p = _image.pixel(_x, _y);
+        return rgba_t(p[0], p[1], p[2], p[3]);
     }
 
     CTempDir m_dir;
     CReportCapture m_reports;
-    CInputRecord m_record;
+    std::vector<std::string> m_lines;
+    CInputRecord m_record{m_lines};
     std::unique_ptr<CHost> mp_host;
     std::unique_ptr<CWindowHost> mp_window;
 };
@@ -229,43 +204,49 @@ TEST_F(WindowHostTest, EventsReachTheListenersAsTheLibrarysInputAtTheNextFrame) 
     push(key_event(SDL_KEYDOWN, SDLK_AUDIOPLAY, SDL_SCANCODE_AUDIOPLAY)); // no code: not delivered
     push(text_event("h\xC3\xA9"));
     push(motion_event(0, 0));
-    EXPECT_TRUE(m_record.m_lines.empty()); // nothing before the frame's events are polled
+    EXPECT_TRUE(m_lines.empty()); // nothing before the frame's events are polled
     EXPECT_TRUE(mp_window->step());
     EXPECT_EQ((std::vector<std::string>{"move 6 -4", "down 0", "up 0", "down 1", "down 2", "wheel 1",
                                         "wheel -2", "key_down 0xC0 0", "key_up 0xC0", "key_down 0x8 1",
                                         "char 0x68", "char 0xE9"}),
-              m_record.m_lines);
-    m_record.m_lines.clear();
+              m_lines);
+    m_lines.clear();
     vec2_t const scale = {2.0f, 0.5f}; // delivering tells whether anything was input
     EXPECT_TRUE(deliver_input(motion_event(-4, 8), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(motion_event(0, 0), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(wheel_event(0.0f, SDL_MOUSEWHEEL_NORMAL), mp_host->input(), scale));
     EXPECT_FALSE(deliver_input(text_event("\xF0\x9F\x98\x80"), mp_host->input(), scale));
-    EXPECT_EQ((std::vector<std::string>{"move -8 4"}), m_record.m_lines);
+    EXPECT_EQ((std::vector<std::string>{"move -8 4"}), m_lines);
 }
 
 TEST_F(WindowHostTest, RunsShowTheRenderersPictureUntilTheWindowCloses) {
     EXPECT_FALSE(mp_window->step()); // not open: nothing
     EXPECT_EQ(0u, mp_window->run(3));
     open();
-    // Without the UI library a frame draws nothing, so the picture drawn here is the one shown.
-    CSoftwareRenderer &renderer = mp_host->renderer();
+    // The host draws with the window's renderer while it is open; its frame sink sees what is
+    // shown. Without the UI library a frame draws nothing.
+    CHostRenderer &renderer = mp_host->active_renderer();
+    ASSERT_EQ(mp_window->screen(), &renderer);
+    SImage shown;
+    renderer.set_frame_sink([&](SImage const &_frame, unsigned) { shown = _frame; });
     renderer.begin_frame(rgba_t(10, 20, 30, 255));
     rgba_t const red(200, 0, 0, 255);
     renderer.draw_quad(vec2_t{-1, 1}, vec2_t{0, 0}, red, vec2_t{0, 1}, vec2_t{1, 0}, red, vec2_t{0, -1},
                        vec2_t{1, 1}, red, vec2_t{-1, -1}, vec2_t{0, 1}, red);
+    renderer.present();
+    ASSERT_EQ(512, shown.m_w);
+    EXPECT_EQ(red, pixel(shown, 10, 10));
+    EXPECT_EQ(red, pixel(shown, 255, 383));
+    EXPECT_EQ(rgba_t(10, 20, 30, 255), pixel(shown, 256, 0));
     EXPECT_EQ(3u, mp_window->run(3));
-    EXPECT_EQ(red, shown_pixel(10, 10));
-    EXPECT_EQ(red, shown_pixel(255, 383));
-    EXPECT_EQ(rgba_t(10, 20, 30, 255), shown_pixel(256, 0));
-    SDL_Event quit;
-    SDL_zero(quit);
-    quit.type = SDL_QUIT;
-    push(quit);
+    push(event_of(SDL_QUIT));
     EXPECT_EQ(0u, mp_window->run(0)); // 0: until the window is closed
     EXPECT_TRUE(mp_window->is_closed());
     EXPECT_FALSE(mp_window->step());
     EXPECT_EQ(3u, mp_window->get_presented());
+    mp_window.reset(); // headless again
+    EXPECT_EQ(&mp_host->renderer(), &mp_host->active_renderer());
+    EXPECT_EQ(&mp_host->renderer(), mp_host->server().query_interface(qor_uid::RENDER, 1));
 }
 
 TEST_F(WindowHostTest, SoundGoesToTheAudioDeviceWhileTheWindowIsOpen) {
@@ -336,28 +317,11 @@ TEST_F(SoundMixerTest, LoopsFadesStopsAndResets) {
     EXPECT_EQ((std::vector<int>{1000, 750}), mix(2));
     m_mixer.start(voice, 2.0f);
     EXPECT_EQ((std::vector<int>{500, 1000}), mix(2));
-}
-
-TEST_F(SoundMixerTest, BadWavesAndUnknownVoicesChangeNothing) {
-    bytes_t const text = {'n', 'o', 't', ' ', 'a', ' ', 'w', 'a', 'v', 'e'};
-    EXPECT_EQ(0u, m_mixer.add_voice(text.data(), static_cast<unsigned>(text.size())));
-    EXPECT_EQ(0u, m_mixer.add_voice(nullptr, 100));
-    bytes_t const no_channels = wave({format_chunk(1, 16, 0, 1000), chunk("data", {1, 2, 3, 4})});
-    EXPECT_EQ(0u, m_mixer.add_voice(no_channels.data(), static_cast<unsigned>(no_channels.size())));
-    unsigned const voice = add({7});
-    for (unsigned unknown : {0u, voice + 1}) {
-        m_mixer.start(unknown, 0.0f);
-        m_mixer.set_volume(unknown, 2.0f);
-        m_mixer.remove_voice(unknown);
-    }
-    EXPECT_EQ(1u, m_mixer.get_voices_count());
-    EXPECT_EQ(0u, m_mixer.get_playing_count());
     m_mixer.set_volume(voice, -1.0f); // no negative volume: silent
-    m_mixer.start(voice, 0.0f);
     EXPECT_EQ((std::vector<int>{0}), mix(1));
 }
 
-TEST(SoundMixerFormat, WavesAreConvertedToTheMixersChannelsRateAndBits) {
+TEST(SoundMixerFormat, WavesAreConvertedToTheMixersChannelsRateAndBitsOrRefused) {
     CSoundMixer mixer(1000, 2);
     // 8-bit samples are unsigned around 128; one channel goes to both.
     bytes_t const eight = wave({format_chunk(1, 8, 1, 1000), chunk("data", {128, 255, 0, 128})});
@@ -375,6 +339,20 @@ TEST(SoundMixerFormat, WavesAreConvertedToTheMixersChannelsRateAndBits) {
     bytes_t const slow = wave16(std::vector<int>(200, 0), 2, 500);
     unsigned const doubled = mixer.add_voice(slow.data(), static_cast<unsigned>(slow.size()));
     EXPECT_NEAR(400.0, static_cast<double>(mixer.get_samples(doubled).size()), 8.0);
+
+    // Bad waves make no voice; unknown voices change nothing.
+    bytes_t const text = {'n', 'o', 't', ' ', 'a', ' ', 'w', 'a', 'v', 'e'};
+    bytes_t const no_channels = wave({format_chunk(1, 16, 0, 1000), chunk("data", {1, 2, 3, 4})});
+    EXPECT_EQ(0u, mixer.add_voice(text.data(), static_cast<unsigned>(text.size())));
+    EXPECT_EQ(0u, mixer.add_voice(nullptr, 100));
+    EXPECT_EQ(0u, mixer.add_voice(no_channels.data(), static_cast<unsigned>(no_channels.size())));
+    for (unsigned unknown : {0u, doubled + 1}) {
+        mixer.start(unknown, 0.0f);
+        mixer.set_volume(unknown, 2.0f);
+        mixer.remove_voice(unknown);
+    }
+    EXPECT_EQ(3u, mixer.get_voices_count());
+    EXPECT_EQ(0u, mixer.get_playing_count());
 }
 
 // Sources of the sound system play through the output with their state, volume and looping; one

@@ -130,16 +130,16 @@ TEST_F(HardeningTest, AChildWithoutAUsableNameOrClassMakesNothing) {
 TEST_F(HardeningTest, ACharsetWithoutCellsIsReported) {
     std::string const dir = qortest::make_temp_dir();
     qorbase::set_category_root(qorbase::FILE_CATEGORY_FONTS, dir.c_str());
-    qortest::write_file(dir + "/broken.fnt", "[common]\ndimension = 0\nfont_h = 16\n[chars]\n65 = 8\n");
-    ASSERT_EQ(
-        0, lua_machine().DoString(
-               "charsets.broken = { file_type = 'nehe', file_name = 'broken.fnt' };"
-               " fonts.broken = { charset_name = 'broken', material = { material_template = 'ui_color' } }"));
+    qortest::write_file(dir + "/cellless.fnt", "[common]\ndimension = 0\nfont_h = 16\n[chars]\n65 = 8\n");
+    ASSERT_EQ(0,
+              lua_machine().DoString("charsets.cellless = { file_type = 'nehe', file_name = 'cellless.fnt' };"
+                                     " fonts.cellless = { charset_name = 'cellless', material = { "
+                                     "material_template = 'ui_color' } }"));
     qortest::CReportCapture capture;
-    CFont *p_font = get_fonts_factory().create("broken", &m_world.desktop());
+    CFont *p_font = get_fonts_factory().create("cellless", &m_world.desktop());
     ASSERT_NE(nullptr, p_font);
     EXPECT_EQ(nullptr, p_font->get_char_description('A'));
-    EXPECT_EQ((std::vector<std::string>{"Cannot load the charset 'broken'\nbad 'dimension' record 0"}),
+    EXPECT_EQ((std::vector<std::string>{"Cannot load the charset 'cellless'\nbad 'dimension' record 0"}),
               capture.warnings());
     EXPECT_TRUE(capture.asserts().empty());
     delete p_font;

@@ -1,5 +1,6 @@
 // qorhost on the default data, as the main job runs it: the plaque, the demo scene, input
-// scripts, layouts exported and imported, the build-version page, and bad arguments.
+// scripts, layouts exported and imported, the build-version page, bad arguments, and the host's
+// files: the configuration, exports over the shipped presets, classes missing from the factory.
 #include "image_io.h"
 #include "test_world.h"
 
@@ -21,11 +22,12 @@ struct SRun {
     }
 };
 
-// qorhost on a data folder, its output to a new folder.
+// qorhost on a data folder, its output to a new folder unless one is given.
 SRun run_host(std::vector<std::string> const &_arguments,
-              std::string const &_data = qortest::source_dir() + "/data") {
+              std::string const &_data = qortest::source_dir() + "/data",
+              std::string const &_out = qortest::make_temp_dir()) {
     SRun run;
-    run.m_out = qortest::make_temp_dir();
+    run.m_out = _out;
     std::vector<std::string> arguments = {"--data", _data, "--out", run.m_out};
     arguments.insert(arguments.end(), _arguments.begin(), _arguments.end());
     run.m_result = qortest::run_child("qorhost", {}, arguments);
@@ -51,21 +53,21 @@ std::string data_copy(bool _startup) {
 
 } // namespace
 
-// The first frame is the start-up picture itself, texel for texel; the frames asked for follow.
-TEST(HostEndToEnd, TheFirstFrameIsThePlaqueAndCommandsRunAfterInit) {
-    SRun const run = run_host({"--frames", "2", "+gameui_demo", "hello", "there", "+no_such_command"});
+// The first frame is the start-up picture itself, texel for texel; by the twelfth the demo scene
+// that the startup line builds has faded in. Commands run after the library's init.
+TEST(HostEndToEnd, TheFirstFrameIsThePlaqueTheDemoSceneFollowsAndCommandsRunAfterInit) {
+    SRun const run = run_host({"--frames", "12", "+gameui_demo", "hello", "there", "+no_such_command"});
     ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
     run.expect_golden("frame_0000.png", "plaque_1024x768");
+    run.expect_golden("frame_0012.png", "demo_scene_1024x768");
     qorhost::SImage frame, picture;
     ASSERT_TRUE(qorhost::load_image(run.m_out + "/frame_0000.png", frame));
     ASSERT_TRUE(qorhost::load_image(qortest::source_dir() + "/data/textures/ui_init_plaque.tga", picture));
     EXPECT_EQ(0, qorhost::compare_images(frame, picture, 0));
-    EXPECT_TRUE(qorhost::load_image(run.m_out + "/frame_0002.png", frame));
-    EXPECT_FALSE(qorhost::load_image(run.m_out + "/frame_0003.png", frame));
-    std::string const &output = run.m_result.m_output;
-    EXPECT_NE(std::string::npos, output.find("GameUI: Demo game interface library attached")) << output;
-    EXPECT_NE(std::string::npos, output.find("GameUI: gameui_demo hello there")) << output;
-    EXPECT_NE(std::string::npos, output.find("Unknown command 'no_such_command'")) << output;
+    EXPECT_FALSE(qorhost::load_image(run.m_out + "/frame_0013.png", frame));
+    for (char const *line : {"GameUI: Demo game interface library attached", "Demo scene built",
+                             "GameUI: gameui_demo hello there", "Unknown command 'no_such_command'"})
+        EXPECT_NE(std::string::npos, run.m_result.m_output.find(line)) << line;
 }
 
 TEST(HostEndToEnd, AMissingPlaqueShowsTheMissingTextureAndBadInputStopsTheHost) {
@@ -88,67 +90,81 @@ TEST(HostEndToEnd, AMissingPlaqueShowsTheMissingTextureAndBadInputStopsTheHost) 
     EXPECT_NE(std::string::npos, bad_script.m_result.m_output.find("test.script:2: unknown step 'jump'"));
 }
 
-// With no arguments but the folders, the startup line builds the demo scene: after twelve frames
-// the desktop has faded in. An input script drags the first dialog by its background: it moves
-// by the second movement behind the press and comes to the front.
-TEST(HostEndToEnd, TheDemoSceneIsDrawnAndAScriptDragsADialog) {
-    SRun const run = run_host({});
-    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
-    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Demo scene built"));
-    run.expect_golden("frame_0012.png", "demo_scene_1024x768");
-
-    SRun const dragged =
-        run_host({"--script", script("move -212 -144   # onto the dialog's background\n"
-                                     "press\nmove 1 0\nmove 99 50\nrelease\nwait 12\n"
-                                     "screenshot dragged.png\ncommand gameui_demo scripted\n")});
-    ASSERT_EQ(0, dragged.m_result.m_exit_code) << dragged.m_result.m_output;
-    EXPECT_NE(std::string::npos, dragged.m_result.m_output.find("gameui_demo scripted"));
-    dragged.expect_golden("dragged.png", "demo_scene_dragged_1024x768");
-}
-
-// The controls of the demo scene: a check box and a radio button clicked, the volume bar's scroller
-// dragged, a line typed into the edit box with a backspace and a caret move.
-TEST(HostEndToEnd, AnInputScriptWorksTheControls) {
-    SRun const run =
-        run_host({"--script", script("wait 12\n"
-                                     "move 52 -254  # from the centre onto the check box (564, 130)\n"
-                                     "press\nrelease\n"
-                                     "move 240 30   # the radio button 'Hard' (804, 160)\n"
-                                     "press\nrelease\nwait 2\nscreenshot clicked.png\n"
-                                     "move 26 34    # the volume bar's scroller (830, 194)\n"
-                                     "press\nmove -1 0\nmove -99 0\nrelease\nwait 2\n"
-                                     "screenshot dragged.png\n"
-                                     "move -130 106 # into the edit box (700, 300)\n"
-                                     "press\nrelease\n"
-                                     "char 72\nchar 101\nchar 108\nchar 108\nchar 111\nchar 33\n"
-                                     "key_down 8\nkey_up 8   # backspace takes the '!'\n"
-                                     "key_down 37\nkey_up 37 # the caret one to the left\n"
-                                     "char 76\nwait 2\nscreenshot typed.png\n")});
-    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
-    run.expect_golden("clicked.png", "controls_clicked_1024x768");
-    run.expect_golden("dragged.png", "controls_dragged_1024x768");
-    run.expect_golden("typed.png", "controls_typed_1024x768");
-}
-
-// The options dialog of the demo scene: the list of display modes scrolled by its scroll bar and
-// the wheel with a row clicked, the second tab chosen, the drop-down opened and a row chosen.
-TEST(HostEndToEnd, AnInputScriptWorksTheLists) {
-    SRun const run =
-        run_host({"--script", script("wait 12\n"
-                                     "move 450 170  # from the centre onto the list's scroller (962, 554)\n"
-                                     "press\nmove 0 1\nmove 0 59\nrelease\n"
-                                     "move -262 40  # a row (700, 654)\n"
-                                     "press\nrelease\nwheel -2\nwait 2\nscreenshot list.png\n"
-                                     "move -7 -177  # the tab 'Game' (693, 477)\n"
-                                     "press\nrelease\nwait 12\n"
-                                     "move 87 79    # the drop-down (780, 556)\n"
-                                     "press\nrelease\nwait 12\nscreenshot opened.png\n"
-                                     "move -60 90   # its row 'Hard' (720, 646)\n"
-                                     "press\nrelease\nwait 12\nscreenshot chosen.png\n")});
-    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
-    run.expect_golden("list.png", "lists_scrolled_1024x768");
-    run.expect_golden("opened.png", "lists_drop_down_opened_1024x768");
-    run.expect_golden("chosen.png", "lists_drop_down_chosen_1024x768");
+// Input scripts on the demo scene, each picture against its golden: the first dialog dragged by
+// its background (it moves by the second movement behind the press and comes to the front); the
+// controls worked (a check box and a radio button clicked, the volume bar's scroller dragged, a line
+// typed with a backspace and a caret move); the options dialog's lists (the display modes scrolled
+// by their bar and the wheel with a row clicked, the second tab chosen, the drop-down opened and a
+// row chosen); the build-version page shown and dumped to the output folder's first numbered file;
+// the second dialog resized by its lower right corner and its message box answered.
+TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
+    struct {
+        char const *m_script;
+        std::vector<std::pair<char const *, char const *>> m_pictures; // the screenshot, its golden
+        char const *m_output, *m_file, *m_content;                     // what the run writes
+    } const runs[] = {
+        {"move -212 -144   # onto the dialog's background\npress\nmove 1 0\nmove 99 50\nrelease\nwait 12\n"
+         "screenshot dragged.png\ncommand gameui_demo scripted\n",
+         {{"dragged.png", "demo_scene_dragged_1024x768"}},
+         "gameui_demo scripted",
+         nullptr,
+         nullptr},
+        {"wait 12\nmove 52 -254  # from the centre onto the check box (564, 130)\npress\nrelease\n"
+         "move 240 30   # the radio button 'Hard' (804, 160)\npress\nrelease\nwait 2\nscreenshot "
+         "clicked.png\n"
+         "move 26 34    # the volume bar's scroller (830, 194)\npress\nmove -1 0\nmove -99 0\nrelease\n"
+         "wait 2\nscreenshot dragged.png\nmove -130 106 # into the edit box (700, 300)\npress\nrelease\n"
+         "char 72\nchar 101\nchar 108\nchar 108\nchar 111\nchar 33\nkey_down 8\nkey_up 8 # backspace\n"
+         "key_down 37\nkey_up 37 # the caret one to the left\nchar 76\nwait 2\nscreenshot typed.png\n",
+         {{"clicked.png", "controls_clicked_1024x768"},
+          {"dragged.png", "controls_dragged_1024x768"},
+          {"typed.png", "controls_typed_1024x768"}},
+         "",
+         nullptr,
+         nullptr},
+        {"wait 12\nmove 450 170  # from the centre onto the list's scroller (962, 554)\n"
+         "press\nmove 0 1\nmove 0 59\nrelease\nmove -262 40  # a row (700, 654)\n"
+         "press\nrelease\nwheel -2\nwait 2\nscreenshot list.png\n"
+         "move -7 -177  # the tab 'Game' (693, 477)\npress\nrelease\nwait 12\n"
+         "move 87 79    # the drop-down (780, 556)\npress\nrelease\nwait 12\nscreenshot opened.png\n"
+         "move -60 90   # its row 'Hard' (720, 646)\npress\nrelease\nwait 12\nscreenshot chosen.png\n",
+         {{"list.png", "lists_scrolled_1024x768"},
+          {"opened.png", "lists_drop_down_opened_1024x768"},
+          {"chosen.png", "lists_drop_down_chosen_1024x768"}},
+         "",
+         nullptr,
+         nullptr},
+        {"wait 1\ncommand gameui_show_stats build_version\ncommand print_stats_page\nwait 12\n"
+         "screenshot version.png\n",
+         {{"version.png", "build_version_page_1024x768"}},
+         "Out file: 'stats_build_version_demo_0000.txt'",
+         "stats_build_version_demo_0000.txt",
+         "qorui 1.0 (demo build)\n203\n"},
+        {"wait 12\nmove -44 231  # from the centre onto the bottom border (468, 615)\n"
+         "press\nmove 1 0\nmove 80 60\nrelease\nwait 2\nscreenshot resized.png\n"
+         "move -209 -30 # the button 'Ask' of the new layout (340, 645)\n"
+         "press\nrelease\nwait 12\nscreenshot asked.png\n"
+         "move 110 -217 # the message box's 'Yes' (450, 428)\n"
+         "press\nrelease\nwait 12\nscreenshot answered.png\n",
+         {{"resized.png", "dialog_resized_1024x768"},
+          {"asked.png", "dialog_asked_1024x768"},
+          {"answered.png", "dialog_answered_1024x768"}},
+         "GameUI: answer Yes",
+         nullptr,
+         nullptr},
+    };
+    for (auto const &run : runs) {
+        SCOPED_TRACE(run.m_pictures[0].second);
+        SRun const result = run_host({"--script", script(run.m_script)});
+        ASSERT_EQ(0, result.m_result.m_exit_code) << result.m_result.m_output;
+        EXPECT_NE(std::string::npos, result.m_result.m_output.find(run.m_output)) << result.m_result.m_output;
+        for (auto const &picture : run.m_pictures)
+            result.expect_golden(picture.first, picture.second);
+        if (run.m_file) {
+            EXPECT_NE(std::string::npos,
+                      qortest::read_file(result.m_out + "/" + run.m_file).find(run.m_content));
+        }
+    }
 }
 
 // The demo's layout imported into an empty desktop makes the demo library's scene with the
@@ -168,15 +184,92 @@ TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     EXPECT_EQ(qortest::read_file(data + "/ui/second.lua"), qortest::read_file(data + "/ui/third.lua"));
 }
 
-// The build-version page, shown, is drawn over the scene and dumped by "print_stats_page" to the
-// first numbered file of the output folder.
-TEST(HostEndToEnd, TheBuildVersionPageIsShownAndDumped) {
-    SRun const run =
-        run_host({"--script", script("wait 1\ncommand gameui_show_stats build_version\n"
-                                     "command print_stats_page\nwait 12\nscreenshot version.png\n")});
+// The console on the demo scene: the console key opens it (its character goes nowhere), a line
+// typed and run exports the layout into the data folder, tab completes a command's name, and the
+// key closes it again onto the scene as it was.
+TEST(HostEndToEnd, TheConsoleOpensRunsACommandCompletesANameAndCloses) {
+    std::string const data = data_copy(true);
+    SRun const run = run_host({"--script", script("wait 12\n"
+                                                  "key_down 0xC0\nchar 0x60\nkey_up 0xC0\nwait 12\n"
+                                                  "screenshot opened.png\n"
+                                                  "type ui_export console_layout.lua\n"
+                                                  "key_down 13\nkey_up 13\nwait 2\nscreenshot exported.png\n"
+                                                  "type print_st\nkey_down 9\nchar 9\nkey_up 9\nwait 2\n"
+                                                  "screenshot completed.png\n"
+                                                  "key_down 0xC0\nchar 0x60\nkey_up 0xC0\nwait 12\n"
+                                                  "screenshot closed.png\n")},
+                              data);
     ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
-    std::string const dump = qortest::read_file(run.m_out + "/stats_build_version_demo_0000.txt");
-    EXPECT_NE(std::string::npos, dump.find("qorui 1.0 (demo build)\n203\n")) << dump;
-    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Out file: 'stats_build_version_demo_0000.txt'"));
-    run.expect_golden("version.png", "build_version_page_1024x768");
+    std::string const layout = qortest::read_file(data + "/ui/console_layout.lua");
+    EXPECT_NE(std::string::npos, layout.find("ui_windows_ini")) << layout;
+    run.expect_golden("opened.png", "console_opened_1024x768");
+    run.expect_golden("exported.png", "console_exported_1024x768");
+    run.expect_golden("completed.png", "console_completed_1024x768");
+    run.expect_golden("closed.png", "demo_scene_1024x768");
+}
+
+// The configuration is read from the data folder on every run: an edit after a first run takes
+// effect on the next, although the first wrote the configuration back into the output folder.
+TEST(HostEndToEnd, AnEditOfTheDataFoldersConfigurationTakesEffect) {
+    std::string const data = data_copy(true), out = qortest::make_temp_dir();
+    SRun const first = run_host({"--frames", "1"}, data, out);
+    ASSERT_EQ(0, first.m_result.m_exit_code) << first.m_result.m_output;
+    EXPECT_NE(std::string::npos, first.m_result.m_output.find("Demo scene built"));
+    std::string const gdf = qortest::read_file(data + "/qor.gdf");
+    std::string const edited = gdf.substr(0, gdf.find("startup = ")) + "startup = gameui_demo edited\n";
+    qortest::write_file(data + "/qor.gdf", edited);
+
+    SRun const second = run_host({"--frames", "1"}, data, out);
+    ASSERT_EQ(0, second.m_result.m_exit_code) << second.m_result.m_output;
+    EXPECT_NE(std::string::npos, second.m_result.m_output.find("GameUI: gameui_demo edited"));
+    EXPECT_EQ(std::string::npos, second.m_result.m_output.find("Demo scene built"));
+    EXPECT_EQ(edited, qortest::read_file(data + "/qor.gdf"));
+}
+
+// The demo's materials are all presets, so its export writes every shipped preset back: the scene
+// built again from the written presets looks as before and exports the same files, and its layout
+// imported into an empty desktop gives the scene of the shipped layout.
+TEST(HostEndToEnd, AnExportOfTheDemoKeepsEveryPresetAndTheLook) {
+    std::string const data = data_copy(true), presets = data + "/ui/ui_material_presets.lua";
+    std::string const shipped = qortest::read_file(presets);
+    SRun const exported = run_host({"+ui_export", "exported.lua"}, data);
+    ASSERT_EQ(0, exported.m_result.m_exit_code) << exported.m_result.m_output;
+    std::string const written = qortest::read_file(presets);
+    size_t count = 0;
+    for (size_t at = shipped.find("\n    "); at != std::string::npos; at = shipped.find("\n    ", at + 1)) {
+        std::string const name = shipped.substr(at + 5, shipped.find(' ', at + 5) - at - 5);
+        if (name == "--") continue; // a comment
+        ++count;
+        EXPECT_NE(std::string::npos, written.find("\n    " + name + " = {")) << name;
+    }
+    EXPECT_EQ(40u, count);
+
+    SRun const again = run_host({"+ui_export", "again.lua"}, data);
+    ASSERT_EQ(0, again.m_result.m_exit_code) << again.m_result.m_output;
+    EXPECT_EQ(std::string::npos, again.m_result.m_output.find("Preset")) << again.m_result.m_output;
+    again.expect_golden("frame_0012.png", "demo_scene_1024x768");
+    EXPECT_EQ(qortest::read_file(data + "/ui/exported.lua"), qortest::read_file(data + "/ui/again.lua"));
+    EXPECT_EQ(written, qortest::read_file(presets));
+
+    std::string const gdf = qortest::read_file(data + "/qor.gdf");
+    qortest::write_file(data + "/qor.gdf", gdf.substr(0, gdf.find("[host]")));
+    run_host({"+ui_import", "exported.lua"}, data)
+        .expect_golden("frame_0012.png", "demo_layout_imported_1024x768");
+}
+
+// A layout's child of a class that no module registered is left out with its subtree, and the
+// host's log names the class; the children beside it are made.
+TEST(HostEndToEnd, AnImportedChildOfAnUnregisteredClassIsNamedInTheLog) {
+    std::string const data = data_copy(false);
+    qortest::write_file(data + "/ui/unknown.lua",
+                        "ui_windows_ini = { [11] = { name = 'ghost', class_name = 'NoSuchWindow' },\n"
+                        "  [12] = { name = 'label', class_name = 'StaticText', text = 'seen' } }\n");
+    SRun const run = run_host({"--frames", "1", "+ui_import", "unknown.lua", "+ui_export", "back.lua"}, data);
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    EXPECT_NE(std::string::npos,
+              run.m_result.m_output.find("Window class not registered: NoSuchWindow ('ghost' left out)"))
+        << run.m_result.m_output;
+    std::string const back = qortest::read_file(data + "/ui/back.lua");
+    EXPECT_EQ(std::string::npos, back.find("ghost"));
+    EXPECT_NE(std::string::npos, back.find("\"label\""));
 }

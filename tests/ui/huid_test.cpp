@@ -5,7 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <map>
 
 using namespace qorui;
@@ -16,11 +15,8 @@ TEST(Huid, HashesMatchTheCheckValuesFoldingAsciiLettersOnly) {
         uint64_t m_hash;
     } const rows[] = {
         {"", 0x0123456789ABCDEFULL},
-        {"Window", 0x8A3DD37E84E20F89ULL},
         {"window", 0x8A3DD37E84E20F89ULL},
         {"WindowVisual", 0x1DE224C9EA8E222DULL},
-        {"Desktop", 0xF65C8D8795B66618ULL},
-        {"MAT_NAME_NORMAL", 0x06BA127EF640D8DFULL},
         {std::string(64, 'A'), 0xD3B7D1760D8AC029ULL}, // exactly one block
         {std::string(64, 'a'), 0xD3B7D1760D8AC029ULL},
         // 65 bytes: the second block holds "+" and zeros
@@ -32,24 +28,12 @@ TEST(Huid, HashesMatchTheCheckValuesFoldingAsciiLettersOnly) {
     for (auto const &pair :
          {std::make_pair("@", "`"), std::make_pair("[", "{"), std::make_pair("\xC4", "\xE4")})
         EXPECT_NE(HUID(pair.first), HUID(pair.second)) << pair.first;
-    EXPECT_EQ(HUID((std::string(64, 'x') + "Q").c_str()), HUID((std::string(64, 'x') + "q").c_str()));
-}
-
-TEST(Huid, ComparesAndOrdersByTheUnsignedHashWhileNamesDiffer) {
-    HUID const lower("Window"), upper("WINDOW");
-    EXPECT_TRUE(lower == upper);
-    EXPECT_FALSE(lower != upper);
-    EXPECT_STREQ("WINDOW", upper.GetName());
-    EXPECT_FALSE(lower < upper || upper < lower);
-    EXPECT_TRUE(HUID("WindowVisual") < HUID("Window")); // 0x1DE2... below 0x8A3D...
-    std::map<HUID, int> by_name = {{HUID("Window"), 1}, {HUID("Desktop"), 3}, {HUID("WindowVisual"), 4}};
+    EXPECT_EQ(HUID((std::string(64, 'x') + "Z").c_str()), HUID((std::string(64, 'x') + "z").c_str()));
+    // Equal and ordered by the unsigned hash while the names differ.
+    std::map<HUID, int> by_name = {{HUID("Window"), 1}, {HUID("WindowVisual"), 4}};
     by_name[HUID("WINDOW")] = 2; // the same key
     EXPECT_EQ(2, by_name[HUID("window")]);
-    EXPECT_STREQ("Desktop", by_name.rbegin()->first.GetName()); // 0xF65C... the largest
-    HUID copy(lower);
-    copy = HUID("ListBox");
-    EXPECT_STREQ("ListBox", copy.GetName());
-    EXPECT_EQ(HUID("listbox").get_hash(), copy.get_hash());
+    EXPECT_STREQ("Window", by_name.rbegin()->first.GetName()); // 0x8A3D... above 0x1DE2...
 }
 
 TEST(Huid, NamesAreKeptTo119CharactersAndHashedWhole) {
@@ -60,11 +44,8 @@ TEST(Huid, NamesAreKeptTo119CharactersAndHashedWhole) {
     HUID const id((longest + "-and-more").c_str());
     EXPECT_EQ(longest, id.GetName());
     EXPECT_NE(HUID(longest.c_str()), id);
-    EXPECT_EQ(HUID((std::string(119, 'N') + "-AND-MORE").c_str()), id);
-    HUID const none(nullptr);
-    EXPECT_STREQ("", none.GetName());
-    EXPECT_EQ(HUID(""), none);
-    ASSERT_EQ(3u, capture.asserts().size()); // two long names and the null one
+    EXPECT_EQ(HUID(""), HUID(nullptr));
+    ASSERT_EQ(2u, capture.asserts().size()); // the long name and the null one
     EXPECT_NE(std::string::npos, capture.asserts()[0].find("strlen(_name) < sizeof(m_name)"));
 }
 
@@ -72,7 +53,6 @@ TEST(Huid, NamesAreKeptTo119CharactersAndHashedWhole) {
 TEST(Huid, EachStaticNameIsTheHuidOfItsOwnIdentifier) {
     std::map<HUID, std::string> seen;
 #define QOR_CHECK_STATIC_HUID(_id)                                                                           \
-    EXPECT_STREQ(#_id, _id.GetName());                                                                       \
     EXPECT_EQ(HUID(#_id).get_hash(), _id.get_hash()) << #_id;                                                \
     EXPECT_TRUE(seen.emplace(_id, #_id).second) << #_id << " collides with " << seen[_id];
     QOR_STATIC_HUIDS(QOR_CHECK_STATIC_HUID)

@@ -125,15 +125,27 @@ void CWorld::expect_golden(char const *_name) {
     qortest::expect_golden(m_renderer.get_frame(), _name);
 }
 
+std::vector<CWorld::SDrawn> CWorld::quads() const {
+    std::vector<SDrawn> found;
+    for (SDrawn const &drawn_call : drawn())
+        if (drawn_call.m_op == "quad") found.push_back(drawn_call);
+    return found;
+}
+
 std::string CWorld::clips() const {
     std::string text;
     for (SDrawn const &drawn_call : drawn())
-        if (drawn_call.m_op == "clip") {
-            CRectArea const &r = drawn_call.m_rect;
-            text += (text.empty() ? "" : "; ") + std::to_string(r.x) + "," + std::to_string(r.y) + " " +
-                    std::to_string(r.w) + "x" + std::to_string(r.h);
-        }
+        if (drawn_call.m_op == "clip") text += (text.empty() ? "" : "; ") + rect_text(drawn_call.m_rect);
     return text;
+}
+
+std::string rect_text(CRectArea const &_r) {
+    return std::to_string(_r.x) + "," + std::to_string(_r.y) + " " + std::to_string(_r.w) + "x" +
+           std::to_string(_r.h);
+}
+
+std::string place_text(CWindow const *_p_wnd) {
+    return rect_text(CRectArea(_p_wnd->get_pos().x, _p_wnd->get_pos().y, _p_wnd->get_w(), _p_wnd->get_h()));
 }
 
 std::vector<CRectArea> CWorld::glyphs(CFont *_p_font) const {

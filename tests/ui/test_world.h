@@ -67,6 +67,8 @@ public:
         rgba_t m_colour;
     };
     std::vector<SDrawn> drawn() const;
+    // Only the quads of the last frame.
+    std::vector<SDrawn> quads() const;
     // The clip areas of the last frame as "x,y wxh", in order, joined by "; ".
     std::string clips() const;
     // The quads of the last frame in the font's material: the characters it drew, in order.
@@ -88,6 +90,10 @@ private:
 // QOR_UPDATE_GOLDEN=1 in the environment the golden is written instead (look at it before checking
 // it in).
 void expect_golden(qorhost::SImage const &_actual, std::string const &_name);
+
+// A rectangle as "x,y wxh", and a window's place in its parent the same way.
+std::string rect_text(qorui::CRectArea const &_r);
+std::string place_text(qorui::CWindow const *_p_wnd);
 
 // The name of an event type as the source writes it ("EVENT_CLICK"), so that failures read.
 std::string event_name(qorui::EEventType _id);

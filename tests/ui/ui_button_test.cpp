@@ -1,13 +1,12 @@
-// Push buttons, check boxes and radio buttons in the test world, driven by the pointer: where the
-// caption, checker and label go in each state, the material chosen, the events of a click, radio
-// groups, the missing font, and the layout keys.
+// Push buttons, check boxes, radio buttons and static texts driven by the pointer: where caption,
+// checker and label go, the checker after a click, radio groups, the text events, the missing font,
+// and the layout keys. Each state's picture is in the controls' golden.
 #include "ui_button.h"
+#include "ui_static_text.h"
 
 #include "engine_interfaces.h"
 #include "interface_server.h"
 #include "log_manager.h"
-#include "qorscriptsystem.h"
-#include "test_support.h"
 #include "test_world.h"
 #include "ui_font.h"
 #include "ui_material.h"
@@ -19,7 +18,7 @@ using namespace qorui;
 namespace {
 
 typedef std::vector<std::string> events_t;
-enum : unsigned char { k_on = 1, k_on_disabled, k_off, k_off_disabled, k_highlight, k_body };
+enum : unsigned char { k_on = 1, k_off, k_highlight, k_body };
 
 // A check box of 120 by 24 at (30, 40) with a material for each state, its red byte naming it.
 class ButtonsTest : public ::testing::Test {
@@ -28,9 +27,8 @@ protected:
         m_world.clock().advance_ms(150); // the desktop has faded in
         mp_box = m_world.place(&m_world.desktop(), new CCheckBox(&m_world.desktop(), "box"), 30, 40, 120, 24);
         mp_box->m_text = CString("Sound");
-        HUID const *const ids[] = {&MAT_NAME_CHECKER_ON,  &MAT_NAME_CHECKER_ON_DISABLED,
-                                   &MAT_NAME_CHECKER_OFF, &MAT_NAME_CHECKER_OFF_DISABLED,
-                                   &MAT_NAME_HIGHLIGHTED, &MAT_NAME_NORMAL};
+        HUID const *const ids[] = {&MAT_NAME_CHECKER_ON, &MAT_NAME_CHECKER_OFF, &MAT_NAME_HIGHLIGHTED,
+                                   &MAT_NAME_NORMAL};
         for (unsigned char red = k_on; red <= k_body; ++red)
             mp_box->add_material(*ids[red - 1], m_world.colour(red, 0, 0));
     }
@@ -42,118 +40,92 @@ protected:
         m_world.frame();
         std::vector<int> reds;
         int const glyph = font() ? font()->get_char_material('A')->get_material_handle() : -1;
-        for (auto const &drawn : m_world.drawn())
-            if (drawn.m_op == "quad" && drawn.m_handle != glyph) reds.push_back(drawn.m_colour.r);
+        for (auto const &drawn : m_world.quads())
+            if (drawn.m_handle != glyph) reds.push_back(drawn.m_colour.r);
         return reds;
     }
-    LuaPlus::LuaObject layout(std::string const &_table) {
-        lua_machine().DoString(("probe = " + _table).c_str());
-        return lua_machine().GetGlobals().GetByName("probe");
+    // The first glyph of the last frame, as x and y.
+    std::vector<int> first_glyph() {
+        std::vector<CRectArea> const glyphs = m_world.glyphs(font());
+        return glyphs.empty() ? std::vector<int>{} : std::vector<int>{glyphs[0].x, glyphs[0].y};
+    }
+    CButton *button(char const *_name, int _y, char const *_caption) {
+        CButton *p_button =
+            m_world.place(&m_world.desktop(), new CButton(&m_world.desktop(), _name), 40, _y, 81, 31);
+        p_button->m_text = CString(_caption);
+        return p_button;
     }
 
-    qorhost::CInterfaceServer m_server;
-    qorhost::CLogManager m_log;
     qortest::CWorld m_world;
     CCheckBox *mp_box = nullptr;
 };
 
 } // namespace
 
+// Centred in the client area, the caption sinks by a pixel while pressed under the pointer or
+// checked: over, pressed over, pressed with the pointer gone, released, checked.
 TEST_F(ButtonsTest, TheCaptionIsCentredInTheClientAreaAndSinksWhilePressedUnderThePointerOrChecked) {
-    CButton *p_button =
-        m_world.place(&m_world.desktop(), new CButton(&m_world.desktop(), "ok"), 40, 80, 81, 31);
-    p_button->m_text = CString("OK");
+    CButton *p_button = button("ok", 80, "OK");
     mp_box->m_text = CString();
     p_button->set_left_margin(4);
     p_button->set_top_margin(2);
-    int const text_w = p_button->get_canvas().get_text_width(p_button->m_text, font(), -1);
-    int const x = 40 + 77 / 2 - text_w / 2 + 4,
-              y = 80 + 29 / 2 - p_button->get_canvas().get_text_height(font()) / 2 + 2;
-    struct {
-        char const *m_state;
-        void (*m_act)(qortest::CWorld &, CButton *);
-        int m_sink;
-    } const rows[] = {
-        {"pointer over", [](qortest::CWorld &_w, CButton *) { _w.move_to(60, 90); }, 0},
-        {"pressed over", [](qortest::CWorld &_w, CButton *) { _w.press(); }, 1},
-        {"pressed, pointer gone", [](qortest::CWorld &_w, CButton *) { _w.move_to(300, 200); }, 0},
-        {"released away", [](qortest::CWorld &_w, CButton *) { _w.release(); }, 0},
-        {"checked, pointer away", [](qortest::CWorld &, CButton *_p) { _p->set_checked(true); }, 1},
-    };
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_state);
-        row.m_act(m_world, p_button);
+    int const x = 40 + 77 / 2 - p_button->get_canvas().get_text_width(p_button->m_text, font(), -1) / 2 + 4;
+    int const y = 80 + 29 / 2 - p_button->get_canvas().get_text_height(font()) / 2 + 2;
+    int const sinks[] = {0, 1, 0, 0, 1};
+    for (int i = 0; i < 5; ++i) {
+        SCOPED_TRACE(i);
+        if (i == 0 || i == 2) m_world.move_to(i ? 300 : 60, i ? 200 : 90);
+        if (i == 1) m_world.press();
+        if (i == 3) m_world.release();
+        if (i == 4) p_button->set_checked(true);
         m_world.frame();
-        std::vector<CRectArea> const glyphs = m_world.glyphs(font());
-        ASSERT_EQ(2u, glyphs.size());
-        EXPECT_EQ(x + row.m_sink, glyphs[0].x);
-        EXPECT_EQ(y + row.m_sink, glyphs[0].y);
+        EXPECT_EQ((std::vector<int>{x + sinks[i], y + sinks[i]}), first_glyph());
     }
 }
 
-TEST_F(ButtonsTest, WithoutAnyFontOnlyAButtonWithACaptionIsReported) {
-    m_log.set_quiet(true);
-    m_server.register_interface(&m_log);
-    engine_interfaces().set_server(&m_server);
-    m_world.place(&m_world.desktop(), new CButton(&m_world.desktop(), "silent"), 0, 0, 20, 20);
-    m_world.place(&m_world.desktop(), new CButton(&m_world.desktop(), "named"), 0, 80, 20, 20)->m_text =
-        CString("X");
+// Without a font a button with a caption is logged, a check box draws no label quietly and a
+// static text reports the broken contract.
+TEST_F(ButtonsTest, WithoutAFontOnlyAButtonWithACaptionIsLoggedAndAStaticTextReports) {
+    // A log of the test's own behind the library, dropped before it goes.
+    struct SOwnLog {
+        qorhost::CInterfaceServer m_server;
+        qorhost::CLogManager m_log;
+        SOwnLog() {
+            m_log.set_quiet(true);
+            m_server.register_interface(&m_log);
+            engine_interfaces().set_server(&m_server);
+        }
+        ~SOwnLog() { engine_interfaces().set_server(nullptr); }
+    } own;
+    qorhost::CLogManager &log = own.m_log;
+    button("silent", 0, "");
+    button("named", 120, "X");
     m_world.desktop().add_font(FNT_NAME_DEFAULT, nullptr);
-    unsigned const first = m_log.get_next_index();
-    EXPECT_EQ((std::vector<int>{k_body, k_off}), frame_reds()); // the check box draws no label, quietly
-    ASSERT_EQ(first + 1, m_log.get_next_index());
-    EXPECT_NE(std::string::npos, m_log.get_message_text(first).find("No font was found for button named"));
-}
-
-// The body is never drawn highlighted: the highlight belongs to the checker.
-TEST_F(ButtonsTest, TheCheckerFollowsCheckedDisabledAndHighlighted) {
-    struct {
-        bool m_checked, m_disabled, m_pointer_over;
-        int m_checker;
-    } const rows[] = {
-        {false, false, false, k_off},         {true, false, false, k_on},
-        {false, true, false, k_off_disabled}, {true, true, false, k_on_disabled},
-        {false, false, true, k_highlight},    {true, false, true, k_highlight},
-        {true, true, true, k_on_disabled},
-    };
-    for (auto const &row : rows) {
-        SCOPED_TRACE(testing::Message() << row.m_checked << row.m_disabled << row.m_pointer_over);
-        m_world.move_to(300, 200);
-        mp_box->set_checked(row.m_checked);
-        mp_box->set_disabled(row.m_disabled);
-        if (row.m_pointer_over) m_world.move_to(100, 50);
-        EXPECT_EQ((std::vector<int>{k_body, row.m_checker}), frame_reds());
-    }
+    unsigned const first = log.get_next_index();
+    EXPECT_EQ((std::vector<int>{k_body, k_off}), frame_reds());
+    ASSERT_EQ(first + 1, log.get_next_index());
+    EXPECT_NE(std::string::npos, log.get_message_text(first).find("No font was found for button named"));
+    m_world.desktop().make_static_text(CString("t"), CRectArea(0, 200, 10, 10), "label");
+    qortest::CReportCapture capture;
+    m_world.frame();
+    ASSERT_EQ(1u, capture.asserts().size());
+    EXPECT_EQ(0u, capture.asserts()[0].find("Expression:   p_font, \n")) << capture.asserts()[0];
 }
 
 // The checker stands at the left edge, centred; the label half a checker width beyond it; both are
 // clipped to the window, not to the body's visual deltas.
 TEST_F(ButtonsTest, TheCheckerAndTheLabelStandByTheCheckerSize) {
-    LuaPlus::LuaObject deltas =
-        layout("{ name = 'box', class_name = 'CheckBox', visual_delta_left = 2,"
-               " visual_delta_top = 2, visual_delta_right = 2, visual_delta_bottom = 2 }");
-    mp_box->load_state(deltas);
-    struct {
-        int m_w, m_h, m_checker_y, m_label_x;
-    } const rows[] = {{16, 16, 40 + 12 - 8, 30 + 8 + 16}, {10, 7, 40 + 12 - 3, 30 + 5 + 10}}; // 7 / 2 is 3
+    qortest::load_state(mp_box, "{ name = 'box', class_name = 'CheckBox', visual_delta_left = 2,"
+                                " visual_delta_top = 2, visual_delta_right = 2, visual_delta_bottom = 2 }");
+    int const label_y = 40 + 12 - mp_box->get_canvas().get_text_height(font()) / 2;
     events_t events;
     qortest::log_events(mp_box, {EVENT_RESIZED}, events);
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_w);
-        mp_box->set_checker_size(row.m_w, row.m_h);
-        m_world.frame();
-        EXPECT_NE(std::string::npos, m_world.clips().find("28,38 124x28; 30,40 120x24")) << m_world.clips();
-        CRectArea checker;
-        for (auto const &drawn : m_world.drawn())
-            if (drawn.m_op == "quad" && drawn.m_colour.r == k_off) checker = drawn.m_rect;
-        EXPECT_EQ((std::vector<int>{30, row.m_checker_y, row.m_w, row.m_h}),
-                  (std::vector<int>{checker.x, checker.y, checker.w, checker.h}));
-        std::vector<CRectArea> const glyphs = m_world.glyphs(font());
-        ASSERT_EQ(5u, glyphs.size());
-        EXPECT_EQ(row.m_label_x, glyphs[0].x);
-        EXPECT_EQ(40 + 12 - mp_box->get_canvas().get_text_height(font()) / 2, glyphs[0].y);
-    }
-    EXPECT_EQ((events_t{"EVENT_RESIZED", "EVENT_RESIZED"}), events);
+    mp_box->set_checker_size(10, 7);
+    m_world.frame();
+    EXPECT_NE(std::string::npos, m_world.clips().find("28,38 124x28; 30,40 120x24")) << m_world.clips();
+    EXPECT_EQ("30,49 10x7", qortest::rect_text(m_world.quads()[1].m_rect)); // 7 / 2 is 3
+    EXPECT_EQ((std::vector<int>{30 + 5 + 10, label_y}), first_glyph());
+    EXPECT_EQ(events_t{"EVENT_RESIZED"}, events);
 }
 
 // After a click the highlight picture stays off, so the new state shows under the pointer, until
@@ -161,18 +133,19 @@ TEST_F(ButtonsTest, TheCheckerAndTheLabelStandByTheCheckerSize) {
 TEST_F(ButtonsTest, AClickTogglesTheBoxAndHidesTheHighlightUntilThePointerComesBack) {
     events_t events;
     qortest::log_events(mp_box, {EVENT_CLICK, EVENT_CHECKED, EVENT_UNCHECKED}, events);
-    m_world.click_at(100, 50);
-    EXPECT_TRUE(mp_box->is_checked());
-    EXPECT_EQ(k_on, frame_reds()[1]);
-    m_world.move_to(110, 52); // still inside: no new entry
-    EXPECT_EQ(k_on, frame_reds()[1]);
-    m_world.move_to(300, 200);
-    m_world.click_at(100, 50);
-    EXPECT_FALSE(mp_box->is_checked());
-    EXPECT_EQ(k_off, frame_reds()[1]);
-    m_world.move_to(300, 200);
-    m_world.move_to(100, 50);
-    EXPECT_EQ(k_highlight, frame_reds()[1]);
+    struct {
+        int m_x;
+        bool m_click, m_checked;
+        int m_checker;
+    } const steps[] = {{100, true, true, k_on},    {110, false, true, k_on},
+                       {300, false, true, k_on},   {100, true, false, k_off},
+                       {300, false, false, k_off}, {100, false, false, k_highlight}};
+    for (auto const &step : steps) {
+        SCOPED_TRACE(testing::Message() << step.m_x << (step.m_click ? " click" : " move"));
+        step.m_click ? m_world.click_at(step.m_x, 50) : m_world.move_to(step.m_x, 50);
+        EXPECT_EQ(step.m_checked, mp_box->is_checked());
+        EXPECT_EQ(step.m_checker, frame_reds()[1]);
+    }
     EXPECT_EQ((events_t{"EVENT_CHECKED", "EVENT_CLICK", "EVENT_UNCHECKED", "EVENT_CLICK"}), events);
 }
 
@@ -187,60 +160,69 @@ public:
 TEST_F(ButtonsTest, AClickOnARadioButtonTurnsOffTheOtherRadioButtonsOfItsParentOnly) {
     CWindowVisual *p_group =
         m_world.place(&m_world.desktop(), new CWindowVisual(&m_world.desktop(), "g"), 0, 100, 200, 80);
-    CRadioButton *p_a = m_world.place(p_group, new CRadioButton(&m_world.desktop(), "a"), 0, 0, 100, 20);
-    CRadioButton *p_b = m_world.place(p_group, new CTestRadio(&m_world.desktop(), "b"), 0, 25, 100, 20);
-    CRadioButton *p_c = m_world.place(p_group, new CRadioButton(&m_world.desktop(), "c"), 0, 50, 100, 20);
-    CCheckBox *p_box = m_world.place(p_group, new CCheckBox(&m_world.desktop(), "box"), 100, 0, 100, 20);
-    for (CCheckBox *p_on : std::initializer_list<CCheckBox *>{p_a, p_c, p_box, mp_box})
-        p_on->set_checked(true);
-    p_b->add_material(MAT_NAME_HIGHLIGHTED, m_world.colour(k_highlight, 0, 0));
+    CCheckBox *const boxes[] = {
+        new CRadioButton(&m_world.desktop(), "a"), new CTestRadio(&m_world.desktop(), "b"),
+        new CRadioButton(&m_world.desktop(), "c"), new CCheckBox(&m_world.desktop(), "d")};
+    for (int i = 0; i < 4; ++i)
+        m_world.place(p_group, boxes[i], 0, i * 25, 100, 20)->set_checked(i != 1);
+    boxes[1]->add_material(MAT_NAME_HIGHLIGHTED, m_world.colour(k_highlight, 0, 0));
+    mp_box->set_checked(true);
     events_t events;
-    qortest::log_events(p_b, {EVENT_CLICK, EVENT_CHECKED, EVENT_UNCHECKED}, events);
+    qortest::log_events(boxes[1], {EVENT_CLICK, EVENT_CHECKED, EVENT_UNCHECKED}, events);
     m_world.click_at(10, 130);
     m_world.click_at(10, 130);
     EXPECT_EQ((std::vector<bool>{false, true, false, true, true}),
-              (std::vector<bool>{p_a->is_checked(), p_b->is_checked(), p_c->is_checked(), p_box->is_checked(),
-                                 mp_box->is_checked()}));
+              (std::vector<bool>{boxes[0]->is_checked(), boxes[1]->is_checked(), boxes[2]->is_checked(),
+                                 boxes[3]->is_checked(), mp_box->is_checked()}));
     EXPECT_EQ((events_t{"EVENT_CLICK", "EVENT_CLICK"}), events);
     EXPECT_EQ((std::vector<int>{k_body, k_on, k_highlight}), frame_reds());
 }
 
-TEST_F(ButtonsTest, CaptionAndCheckerSizeGoThroughLayoutsOnlyWithTheRightKinds) {
-    CButton *p_button = m_world.place(&m_world.desktop(), new CButton(&m_world.desktop(), "b"), 0, 0, 10, 10);
-    p_button->m_text = CString("Go");
-    mp_box->set_checker_size(12, 9);
-    LuaPlus::LuaObject button, box;
-    button.AssignNewTable(&lua_machine());
-    box.AssignNewTable(&lua_machine());
-    p_button->save_state(button);
-    mp_box->save_state(box);
-    EXPECT_TRUE(box.GetByName("text").IsNil()); // the label belongs to the code
-    p_button->m_text = CString();
-    mp_box->set_checker_size(0, 0);
-    p_button->load_state(button);
-    mp_box->load_state(box);
-    struct {
-        char const *m_keys;
-        char const *m_text;
-        int m_w, m_h;
-    } const rows[] = {
-        {"", "Go", 12, 9},
-        {"text = 7, checker_w = 12.5, checker_h = '30'", "Go", 12, 9},
-        {"text = {}, checker_w = true, checker_h = {}", "Go", 12, 9},
-        {"text = 'Stop', checker_w = -4, checker_h = 20", "Stop", -4, 20},
-    };
+// A key without a local string shows itself, through EVENT_SET_TEXT to the static text. Where each
+// alignment puts the text is in the controls' golden.
+TEST_F(ButtonsTest, SetStrGoesOnAsSetTextWithTheKeyWhenNoLocalStringIsFound) {
+    CStaticText *p_text = m_world.desktop().make_static_text(CString(), CRectArea(0, 0, 10, 10), "label");
+    events_t events;
+    qortest::log_events(p_text, {EVENT_SET_STR, EVENT_SET_TEXT}, events);
+    CWndEvent set_str(EVENT_SET_STR);
+    set_str << string("NO_SUCH_KEY");
+    p_text->send_event(p_text, &set_str, CWndEvent::DISPATCH_NONE);
+    EXPECT_EQ((events_t{"EVENT_SET_TEXT", "EVENT_SET_STR"}), events); // nested, then the owner's
+    EXPECT_EQ(CString("NO_SUCH_KEY"), p_text->get_text());
+}
+
+// A button's caption, a box's checker size (not its label) and a text with its alignment go through
+// layouts; values of the wrong kind are passed over quietly.
+TEST_F(ButtonsTest, LayoutsCarryCaptionCheckerSizeTextAndAlignmentOnlyWithTheRightKinds) {
+    CButton *p_button = button("b", 80, "Go");
+    CStaticText *p_text = m_world.desktop().make_static_text(CString("Go"), CRectArea(0, 0, 10, 10), "label");
+    std::pair<CWindow *, char const *> const windows[] = {
+        {p_button, "name = 'b', class_name = 'Button', "},
+        {mp_box, "name = 'box', class_name = 'CheckBox', "},
+        {p_text, "name = 'label', class_name = 'StaticText', "}};
+    char const *const rows[] = {
+        "text = 'Stop', checker_w = -4, checker_h = 20, text_alignment = 'ALIGNMENT_RIGHT'",
+        "text = 7, checker_w = 12.5, checker_h = '30', text_alignment = 'ALIGNMENT_MIDDLE'",
+        "text = {}, checker_w = true, checker_h = {}, text_alignment = 5",
+        "text = true, text_alignment = 'alignment_right'", "text = 'x', checker_w = 1, checker_h = 1"};
+    LuaPlus::LuaObject saved[3];
     qortest::CReportCapture capture;
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_keys);
-        LuaPlus::LuaObject for_button =
-            layout(std::string("{ name = 'b', class_name = 'Button', ") + row.m_keys + " }");
-        LuaPlus::LuaObject for_box =
-            layout(std::string("{ name = 'box', class_name = 'CheckBox', ") + row.m_keys + " }");
-        p_button->load_state(for_button);
-        mp_box->load_state(for_box);
-        EXPECT_EQ(CString(row.m_text), p_button->m_text);
-        EXPECT_EQ((std::vector<int>{row.m_w, row.m_h}),
-                  (std::vector<int>{mp_box->get_checker_w(), mp_box->get_checker_h()}));
+    for (char const *row : rows) {
+        SCOPED_TRACE(row);
+        for (auto const &window : windows)
+            qortest::load_state(window.first, std::string("{ ") + window.second + row + " }");
+        if (row == rows[4]) // back through the layouts saved after the first row
+            for (int i = 0; i < 3; ++i)
+                windows[i].first->load_state(saved[i]);
+        else if (row == rows[0])
+            for (int i = 0; i < 3; ++i)
+                saved[i] = qortest::saved_state(windows[i].first);
+        EXPECT_EQ((std::vector<std::string>{"Stop", "Stop", "-4 20 ALIGNMENT_RIGHT"}),
+                  (std::vector<std::string>{p_button->m_text.get_c(), p_text->get_text().get_c(),
+                                            std::to_string(mp_box->get_checker_w()) + " " +
+                                                std::to_string(mp_box->get_checker_h()) + " " +
+                                                g_alignment_names[p_text->get_text_alignment()]}));
     }
+    EXPECT_TRUE(saved[1].GetByName("text").IsNil()); // the label belongs to the code
     EXPECT_TRUE(capture.reports().empty());
 }

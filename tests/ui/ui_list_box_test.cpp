@@ -6,7 +6,6 @@
 
 #include "engine_interfaces.h"
 #include "qorscriptsystem.h"
-#include "test_support.h"
 #include "test_world.h"
 #include "ui_font.h"
 #include "ui_material.h"
@@ -40,9 +39,11 @@ protected:
             m_world.place(&m_world.desktop(), new CListBox(&m_world.desktop(), "list"), 20, 30, 200, 108);
         mp_list->get_scroll_bar_vert()->set_w(16);
         mp_list->set_item_height(20);
-        mp_list->add_material(MAT_NAME_SELECTION, m_world.colour(1, 0, 0));
-        mp_list->add_material(MAT_NAME_CHECKED, m_world.colour(2, 0, 0));
-        mp_list->add_material(MAT_NAME_LISTBOX_HEADER, m_world.colour(3, 0, 0));
+        for (unsigned char red = 1; red <= 3; ++red)
+            mp_list->add_material(red == 1   ? MAT_NAME_SELECTION
+                                  : red == 2 ? MAT_NAME_CHECKED
+                                             : MAT_NAME_LISTBOX_HEADER,
+                                  m_world.colour(red, 0, 0));
     }
     // Rows of columns separated by '|', then a frame.
     void fill(std::vector<std::string> const &_rows, CMaterial *_p_icon = nullptr) {
@@ -56,21 +57,20 @@ protected:
         }
         m_world.frame();
     }
-    void fill(unsigned _count) { fill(std::vector<std::string>(_count, "row")); }
+    void refill(unsigned _count) {
+        mp_list->get_items().remove_all();
+        fill(std::vector<std::string>(_count, "row"));
+    }
     // Makes the list the active window, for the wheel and keys, with a click on its left margin.
     void activate() { m_world.click_at(21, 100); }
     float position() { return mp_list->get_scroll_bar_vert()->get_position(); }
-    CFont *font(HUID const &_id) { return m_world.desktop().get_font(_id); }
-    // The last frame's quads in a colour whose red byte names it.
-    // as "x,y wxh", joined by "; ".
+    CFont *font() { return m_world.desktop().get_font(FNT_NAME_DEFAULT); }
+    // The last frame's quads in a colour whose red byte names it, joined by "; ".
     std::string quads_of_red(int _red) {
         std::string found;
-        for (auto const &drawn : m_world.drawn())
-            if (drawn.m_op == "quad" && drawn.m_colour.r == _red && drawn.m_colour.g == 0) {
-                CRectArea const &r = drawn.m_rect;
-                found += (found.empty() ? "" : "; ") + std::to_string(r.x) + "," + std::to_string(r.y) + " " +
-                         std::to_string(r.w) + "x" + std::to_string(r.h);
-            }
+        for (auto const &drawn : m_world.quads())
+            if (drawn.m_colour.r == _red && drawn.m_colour.g == 0)
+                found += (found.empty() ? "" : "; ") + qortest::rect_text(drawn.m_rect);
         return found;
     }
     // The tops of the glyphs of the last frame in a font: one per line drawn.
@@ -80,12 +80,8 @@ protected:
             tops.insert(glyph.y);
         return tops;
     }
-    // A layout of the list with these keys, loaded into it.
-    void load(std::string const &_keys, CListBox *_p_list = nullptr) {
-        lua_machine().DoString(
-            ("list_probe = { name = 'list', class_name = 'ListBox', " + _keys + " }").c_str());
-        LuaPlus::LuaObject layout = lua_machine().GetGlobals().GetByName("list_probe");
-        (_p_list ? _p_list : mp_list)->load_state(layout);
+    void load(std::string const &_keys) {
+        qortest::load_state(mp_list, "{ name = 'list', class_name = 'ListBox', " + _keys + " }");
     }
 
     qortest::CWorld m_world;
@@ -94,64 +90,51 @@ protected:
 
 } // namespace
 
-// ---------------------------------------------------------------------------------------------
-// Scroll bar and view
-// ---------------------------------------------------------------------------------------------
-
 TEST_F(ListBoxTest, TheScrollBarShowsExactlyWhenTheRowsOverflowTheViewWithTheirRange) {
     struct {
         char const *m_case;
         unsigned m_rows;
         int m_spacing;
         bool m_header;
-        bool m_shown;
-        float m_max, m_small, m_large;
+        std::vector<float> m_bar; // max, small and large step; empty: hidden
     } const rows[] = {
-        {"ten rows of 20 in a view of 100", 10, 0, false, true, 100, 20, 100},
-        {"rows exactly as high as the view", 5, 0, false, false, 0, 0, 0},
-        {"no rows", 0, 0, false, false, 0, 0, 0},
-        {"the spacing counts", 6, 2, false, true, 32, 22, 32}, // 6 * 22 = 132; a step is cut to the range
-        {"the header takes 20 of the view", 5, 0, true, true, 20, 20, 20},
+        {"ten rows of 20 in a view of 100", 10, 0, false, {100, 20, 100}},
+        {"rows exactly as high as the view", 5, 0, false, {}},
+        {"the spacing counts", 6, 2, false, {32, 22, 32}}, // 6 * 22 = 132; a step is cut to the range
+        {"the header takes 20 of the view", 5, 0, true, {20, 20, 20}},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_case);
-        mp_list->get_items().remove_all();
         mp_list->show_columns(row.m_header);
         load("item_spacing = " + std::to_string(row.m_spacing));
-        fill(row.m_rows);
+        refill(row.m_rows);
         CScrollBar *p_bar = mp_list->get_scroll_bar_vert();
-        EXPECT_EQ(!row.m_shown, p_bar->is_hidden());
-        EXPECT_EQ(row.m_shown ? 20 : 4, mp_list->get_right_margin());
+        EXPECT_EQ(row.m_bar.empty(), p_bar->is_hidden());
+        EXPECT_EQ(row.m_bar.empty() ? 4 : 20, mp_list->get_right_margin());
         int const top = row.m_header ? 24 : 4;
-        EXPECT_EQ(184, p_bar->get_pos().x);
-        EXPECT_EQ(top, p_bar->get_pos().y);
-        EXPECT_EQ(104 - top, p_bar->get_h());
-        if (!row.m_shown) continue;
-        EXPECT_EQ(row.m_max, p_bar->get_max());
-        EXPECT_EQ(row.m_small, p_bar->get_small_step());
-        EXPECT_EQ(row.m_large, p_bar->get_large_step());
+        EXPECT_EQ(qortest::rect_text(CRectArea(184, top, 16, 104 - top)), qortest::place_text(p_bar));
+        if (!row.m_bar.empty()) {
+            EXPECT_EQ(row.m_bar, (std::vector<float>{p_bar->get_max(), p_bar->get_small_step(),
+                                                     p_bar->get_large_step()}));
+        }
     }
 }
 
-// Rows 2 to 6 meet the view scrolled by 40; the marks reach 2 pixels beyond the rows' clip.
+// Rows 2 to 6 meet the view scrolled by 40; the marks reach 2 pixels beyond the rows' clip. Shrunk
+// while scrolled, the list keeps its position with the bar hidden, and its rows stand above the view.
 TEST_F(ListBoxTest, AScrolledListDrawsOnlyTheRowsInItsViewInsideTheirClip) {
-    fill(10);
+    refill(10);
     activate();
     m_world.desktop().on_wheel_rotated(-1.0f);
     m_world.desktop().on_wheel_rotated(-1.0f);
     ASSERT_EQ(40.0f, position());
     m_world.frame();
-    EXPECT_EQ((std::set<int>{34, 54, 74, 94, 114}), line_tops(font(FNT_NAME_DEFAULT)));
-    EXPECT_EQ(24, m_world.glyphs(font(FNT_NAME_DEFAULT)).front().x);
+    EXPECT_EQ((std::set<int>{34, 54, 74, 94, 114}), line_tops(font()));
+    EXPECT_EQ(24, m_world.glyphs(font()).front().x);
     EXPECT_NE(std::string::npos, m_world.clips().find("20,30 200x108; 22,34 180x100; 24,34 176x100"))
         << m_world.clips();
     m_world.move_to(100, 39); // 5 below the rows' top, 45 into the rows: row 2
     EXPECT_EQ(2, mp_list->get_items().get_selected_idx());
-}
-
-TEST_F(ListBoxTest, AListShrunkWhileScrolledKeepsItsPositionWithTheBarHidden) {
-    fill(10);
-    activate();
     m_world.key(0x22); // page down
     ASSERT_EQ(100.0f, position());
     for (int i = 0; i < 7; ++i)
@@ -159,84 +142,69 @@ TEST_F(ListBoxTest, AListShrunkWhileScrolledKeepsItsPositionWithTheBarHidden) {
     m_world.frame();
     EXPECT_TRUE(mp_list->get_scroll_bar_vert()->is_hidden());
     EXPECT_EQ(100.0f, position());
-    EXPECT_EQ((std::set<int>{}), line_tops(font(FNT_NAME_DEFAULT))); // the rows stand above the view
+    EXPECT_EQ((std::set<int>{}), line_tops(font()));
 }
 
 // Each input steps the bar that the rows' overflow set up: a row, a view, or to an end. With the
 // bar hidden nothing moves.
 TEST_F(ListBoxTest, WheelAndKeysScrollByARowAViewOrToTheEnds) {
-    enum EInput { WHEEL, KEY };
     struct {
-        EInput m_input;
+        bool m_wheel;
         float m_value; // the wheel's rotation or the key
         float m_position;
     } const steps[] = {
-        {WHEEL, -1, 20},  {WHEEL, -2.5f, 40}, {WHEEL, 1, 20},   {WHEEL, 0, 20},
-        {KEY, 0x28, 40},  {KEY, 0x26, 20},    {KEY, 0x22, 100}, {KEY, 0x21, 0},
-        {KEY, 0x23, 100}, {KEY, 0x24, 0},     {KEY, 0x41, 0}, // not a key of the list
+        {true, -1, 20},     {true, -2.5f, 40}, {true, 1, 20},      {true, 0, 20},
+        {false, 0x28, 40},  {false, 0x26, 20}, {false, 0x22, 100}, {false, 0x21, 0},
+        {false, 0x23, 100}, {false, 0x24, 0},  {false, 0x41, 0}, // not a key of the list
     };
     for (unsigned rows : {10u, 3u}) {
-        mp_list->get_items().remove_all();
-        fill(rows);
+        refill(rows);
         activate();
         for (auto const &step : steps) {
             SCOPED_TRACE(testing::Message()
-                         << rows << " rows, " << (step.m_input == KEY ? "key " : "wheel ") << step.m_value);
-            if (step.m_input == WHEEL)
-                m_world.desktop().on_wheel_rotated(step.m_value);
-            else
-                m_world.key(static_cast<unsigned>(step.m_value));
+                         << rows << " rows, " << (step.m_wheel ? "wheel " : "key ") << step.m_value);
+            step.m_wheel ? m_world.desktop().on_wheel_rotated(step.m_value)
+                         : m_world.key(unsigned(step.m_value));
             EXPECT_EQ(rows == 10 ? step.m_position : 0.0f, position());
         }
     }
 }
 
-// ---------------------------------------------------------------------------------------------
-// Marks and events
-// ---------------------------------------------------------------------------------------------
-
-// Three rows at 34, 54 and 74 on the desktop; below 94 the view is empty.
+// Three rows at 34, 54 and 74 on the desktop; below 94 the view is empty. On the spacing between
+// rows, the row above is selected.
 TEST_F(ListBoxTest, TheSelectedRowFollowsThePointerAndAClickChecksIt) {
-    fill(3);
+    refill(3);
     events_t events;
     qortest::log_events(mp_list, {EVENT_HIGHLIGHTED, EVENT_CHECKED, EVENT_CLICK}, events);
-    enum EAction { MOVE, CLICK };
     struct {
         char const *m_case;
-        EAction m_action;
+        bool m_click;
         int m_x, m_y;
         int m_selected, m_checked;
         events_t m_events;
     } const steps[] = {
-        {"onto row 0", MOVE, 100, 40, 0, -1, {"EVENT_HIGHLIGHTED"}},
-        {"within row 0", MOVE, 100, 53, 0, -1, {}},
-        {"onto row 2", MOVE, 100, 75, 2, -1, {"EVENT_HIGHLIGHTED"}},
-        {"a click", CLICK, 100, 75, 2, 2, {"EVENT_CHECKED", "EVENT_CLICK"}},
-        {"a click on the checked row", CLICK, 100, 75, 2, 2, {"EVENT_CLICK"}},
-        {"below the last row", MOVE, 100, 120, 2, 2, {}},
-        {"into the left margin", MOVE, 22, 40, 2, 2, {}},
-        {"into the right margin", MOVE, 217, 40, 2, 2, {}},
-        {"out of the list", MOVE, 300, 40, -1, 2, {}},
-        {"back in below the rows", MOVE, 100, 120, -1, 2, {}},
-        {"a click with no row under the pointer", CLICK, 100, 120, -1, 2, {"EVENT_CLICK"}},
-        {"a click on row 1", CLICK, 100, 55, 1, 1, {"EVENT_HIGHLIGHTED", "EVENT_CHECKED", "EVENT_CLICK"}},
+        {"onto row 0", false, 100, 40, 0, -1, {"EVENT_HIGHLIGHTED"}},
+        {"within row 0", false, 100, 53, 0, -1, {}},
+        {"onto row 2", false, 100, 75, 2, -1, {"EVENT_HIGHLIGHTED"}},
+        {"a click", true, 100, 75, 2, 2, {"EVENT_CHECKED", "EVENT_CLICK"}},
+        {"a click on the checked row", true, 100, 75, 2, 2, {"EVENT_CLICK"}},
+        {"below the last row", false, 100, 120, 2, 2, {}},
+        {"into the left margin", false, 22, 40, 2, 2, {}},
+        {"into the right margin", false, 217, 40, 2, 2, {}},
+        {"out of the list", false, 300, 40, -1, 2, {}},
+        {"back in below the rows", false, 100, 120, -1, 2, {}},
+        {"a click with no row under the pointer", true, 100, 120, -1, 2, {"EVENT_CLICK"}},
+        {"a click on row 1", true, 100, 55, 1, 1, {"EVENT_HIGHLIGHTED", "EVENT_CHECKED", "EVENT_CLICK"}},
     };
     for (auto const &step : steps) {
         SCOPED_TRACE(step.m_case);
         events.clear();
-        if (step.m_action == MOVE)
-            m_world.move_to(step.m_x, step.m_y);
-        else
-            m_world.click_at(step.m_x, step.m_y);
+        step.m_click ? m_world.click_at(step.m_x, step.m_y) : m_world.move_to(step.m_x, step.m_y);
         EXPECT_EQ(step.m_selected, mp_list->get_items().get_selected_idx());
         EXPECT_EQ(step.m_checked, mp_list->get_items().get_checked_idx());
         EXPECT_EQ(step.m_events, events);
     }
-}
-
-TEST_F(ListBoxTest, OnTheSpacingBetweenRowsTheRowAboveIsSelected) {
     load("item_spacing = 4");
-    fill(3);
     for (auto const &row :
          {std::make_pair(34 + 21, 0), std::make_pair(34 + 24, 1), std::make_pair(34 + 71, 2)}) {
         m_world.move_to(100, row.first);
@@ -252,35 +220,24 @@ TEST_F(ListBoxTest, TheMarksAndTheCheckedFontShowOnlyWhileChecksAreAllowed) {
     mp_list->add_material(MAT_NAME_NORMAL, m_world.colour(5, 0, 0));
     mp_list->add_material(MAT_NAME_HIGHLIGHTED, m_world.colour(6, 0, 0));
     mp_list->add_material(MAT_NAME_PUSHED, m_world.colour(7, 0, 0));
-    events_t events;
-    qortest::log_events(mp_list, {EVENT_CHECKED}, events);
     for (bool const allowed : {true, false}) {
         SCOPED_TRACE(allowed);
         load(allowed ? "allow_check_items = true" : "allow_check_items = false");
-        mp_list->get_items().remove_all();
-        fill(3);
-        events.clear();
+        refill(3);
         m_world.click_at(100, 35);
         m_world.move_to(100, 75);
         m_world.press(); // held through the frame
         m_world.frame();
-        EXPECT_EQ(events_t{"EVENT_CHECKED"}, events);
         EXPECT_EQ(0, mp_list->get_items().get_checked_idx());
-        EXPECT_EQ("20,30 200x108", quads_of_red(5));
-        EXPECT_EQ("", quads_of_red(6) + quads_of_red(7));
+        EXPECT_EQ("20,30 200x108", quads_of_red(5) + quads_of_red(6) + quads_of_red(7));
         EXPECT_EQ("22,74 196x20", quads_of_red(1)); // the bar is hidden
         EXPECT_EQ(allowed ? "22,34 196x20" : "", quads_of_red(2));
         EXPECT_EQ(allowed ? std::set<int>{34} : std::set<int>{},
                   line_tops(mp_list->get_font(FNT_NAME_CHECKED)));
-        EXPECT_EQ(allowed ? (std::set<int>{54, 74}) : (std::set<int>{34, 54, 74}),
-                  line_tops(font(FNT_NAME_DEFAULT)));
+        EXPECT_EQ(allowed ? (std::set<int>{54, 74}) : (std::set<int>{34, 54, 74}), line_tops(font()));
         m_world.release();
     }
 }
-
-// ---------------------------------------------------------------------------------------------
-// Columns, header, icons, height
-// ---------------------------------------------------------------------------------------------
 
 // Two columns of 50 and 60 with a gap of 4: the second starts at 24 + 54. A row draws as many texts
 // as it has, up to the number of columns; an icon takes a cell of the row's height before them.
@@ -293,7 +250,7 @@ TEST_F(ListBoxTest, ColumnsHeaderAndIconsStandWhereTheirWidthsPutThem) {
     mp_list->show_columns(true);
     fill({"aa|bb|cc", "d"});
     fill({"e"}, m_world.colour(4, 0, 0)); // 16 square in a row 20 high: 2 in from each side
-    std::vector<CRectArea> const glyphs = m_world.glyphs(font(FNT_NAME_DEFAULT));
+    std::vector<CRectArea> const glyphs = m_world.glyphs(font());
     std::vector<std::pair<int, int>> starts; // each glyph's x and y
     for (CRectArea const &glyph : glyphs)
         starts.emplace_back(glyph.x, glyph.y);
@@ -311,56 +268,53 @@ TEST_F(ListBoxTest, ColumnsHeaderAndIconsStandWhereTheirWidthsPutThem) {
 
 // All rows are as high as the tallest; a text made from a string has a second, empty line.
 TEST_F(ListBoxTest, TheRowsHeightFollowsTheTallestRowWhateverChangesTheRows) {
-    int const font_h = mp_list->get_canvas().get_text_height(font(FNT_NAME_DEFAULT));
+    int const font_h = mp_list->get_canvas().get_text_height(font());
     ASSERT_GT(font_h, 0);
     mp_list->set_item_height(0);
     EXPECT_EQ(font_h, mp_list->get_item_height()); // no rows: one line
     CItems &items = mp_list->get_items();
     items.add(new CItem(line("a"), nullptr));
     EXPECT_EQ(font_h, mp_list->get_item_height());
-    CText three = line("1\\n2\\n3");
-    items.insert(new CItem(three, nullptr), 0);
+    items.insert(new CItem(line("1\\n2\\n3"), nullptr), 0);
     EXPECT_EQ(3 * font_h, mp_list->get_item_height());
     items.remove(0);
     items.add(new CItem(CText("b"), nullptr)); // as many rows as before
     EXPECT_EQ(2 * font_h, mp_list->get_item_height());
     load("items = { item_0 = { column_0 = 'c' } }");
     EXPECT_EQ(font_h, mp_list->get_item_height());
-    mp_list->set_item_height(25);
-    EXPECT_EQ(25, mp_list->get_item_height());
 }
 
-// ---------------------------------------------------------------------------------------------
-// Layouts and contracts
-// ---------------------------------------------------------------------------------------------
-
-// The copy saves what it loaded: the keys and the rows, icon included.
-TEST_F(ListBoxTest, TheLayoutKeysAndTheRowsGoThroughATableAndBack) {
+// A list that the factory makes by its name, its bar hidden, loads what another saved, the keys
+// and the rows with their icons, and saves the same again.
+TEST_F(ListBoxTest, TheLayoutKeysAndTheRowsGoThroughATableIntoAListOfTheFactory) {
     load("show_columns = true, columns_h = 18.9, columns_dw = -3.7, custom_item_height = 22,"
          " item_icon_size = 12, allow_check_items = false, item_spacing = 3");
     mp_list->get_items().add(new CItem(line("x"), m_world.colour(9, 8, 7)));
     fill({"y|z"});
-    auto saved = [](CListBox &_list) {
-        LuaPlus::LuaObject table;
-        table.AssignNewTable(&lua_machine());
-        _list.save_state(table);
+    auto saved = [](CListBox *_p_list) {
+        LuaPlus::LuaObject table = qortest::saved_state(_p_list);
         std::ostringstream keys;
         for (char const *key : {"show_columns", "columns_h", "columns_dw", "custom_item_height",
                                 "item_icon_size", "allow_check_items", "item_spacing", "items"})
             table.GetByName(key).dump(key, keys);
         return std::make_pair(table, keys.str());
     };
-    auto const original = saved(*mp_list);
+    auto original = saved(mp_list);
     EXPECT_EQ("show_columns = true\ncolumns_h = 18\ncolumns_dw = -3\ncustom_item_height = 22\n"
               "item_icon_size = 12\nallow_check_items = false\nitem_spacing = 3\n",
               original.second.substr(0, original.second.find("\nitems = ") + 1));
     for (char const *row : {"column_0 = \"x\"", "r = 9", "column_0 = \"y\"", "column_1 = \"z\""})
         EXPECT_NE(std::string::npos, original.second.find(row)) << row;
-    CListBox copy(&m_world.desktop(), "list");
-    LuaPlus::LuaObject layout = original.first;
-    copy.load_state(layout);
-    EXPECT_EQ(original.second, saved(copy).second);
-    EXPECT_EQ(2u, copy.get_items().get_count());
+    CWindow *p_made = get_windows_factory().Create(HUID("ListBox"), &m_world.desktop(), "list");
+    CListBox *p_copy = class_cast<CListBox>(p_made);
+    ASSERT_NE(nullptr, p_copy);
+    EXPECT_EQ(p_copy->get_scroll_bar_vert(), p_copy->get_child("scroll bar vert", "ScrollBar", true));
+    EXPECT_TRUE(p_copy->get_scroll_bar_vert()->is_hidden());
+    EXPECT_EQ(4, p_copy->get_left_margin());
+    p_copy->load_state(original.first);
+    EXPECT_EQ(original.second, saved(p_copy).second);
+    EXPECT_EQ(2u, p_copy->get_items().get_count());
+    delete p_made;
 }
 
 // Keys of another type are passed over without a word; an "items" table replaces the rows, and an
@@ -379,21 +333,21 @@ TEST_F(ListBoxTest, BadLayoutsLeaveWhatWasLoadedOrReportAndNothingBreaks) {
         {"items = { item_0 = { column_0 = 'a', icon = { material_preset = 'no_such_preset' } } }", 1,
          "UI: Preset 'no_such_preset' is not a table"},
     };
+    lua_machine().DoString("ui_material_presets = {}");
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_keys);
         mp_list->get_items().remove_all();
         fill({"a", "b"});
-        lua_machine().DoString("ui_material_presets = {}");
         qortest::CReportCapture capture;
         load(row.m_keys);
         m_world.move_to(100, 40);
         m_world.frame();
-        EXPECT_EQ(row.m_rows, mp_list->get_items().get_count());
-        EXPECT_EQ(20, mp_list->get_item_height());
-        EXPECT_EQ(4, mp_list->get_right_margin());
-        auto const errors = capture.texts(qordebug::REPORT_ERROR);
-        EXPECT_EQ(row.m_error ? std::vector<std::string>{row.m_error} : std::vector<std::string>{}, errors);
-        EXPECT_TRUE(capture.texts(qordebug::REPORT_ASSERT).empty());
+        EXPECT_EQ((std::vector<int>{(int)row.m_rows, 20, 4}),
+                  (std::vector<int>{(int)mp_list->get_items().get_count(), mp_list->get_item_height(),
+                                    mp_list->get_right_margin()}));
+        EXPECT_EQ(row.m_error ? std::vector<std::string>{row.m_error} : std::vector<std::string>{},
+                  capture.errors());
+        EXPECT_TRUE(capture.asserts().empty());
     }
 }
 
@@ -403,25 +357,13 @@ TEST_F(ListBoxTest, ContractsReportAndStepAside) {
     mp_list->set_column_title(1, CString("x"));
     m_world.desktop().add_font(FNT_NAME_DEFAULT, nullptr); // no font and no custom height: rows of 0
     mp_list->set_item_height(-1);
-    fill(3);
+    refill(3);
     m_world.move_to(100, 40);
     EXPECT_EQ(-1, mp_list->get_items().get_selected_idx());
     std::vector<std::string> expressions;
-    for (std::string const &text : capture.texts(qordebug::REPORT_ASSERT))
+    for (std::string const &text : capture.asserts())
         expressions.push_back(text.substr(14, text.find(", \nFile: ") - 14));
     EXPECT_EQ((std::vector<std::string>{"_idx < m_columns.size()", "_idx < m_columns.size()",
                                         "get_item_height() > 0"}),
               expressions);
-}
-
-TEST(ListBox, TheFactoryMakesItByItsNameWithItsBarHidden) {
-    qortest::CWorld world;
-    CWindow *p_wnd = get_windows_factory().Create(HUID("ListBox"), &world.desktop(), "made");
-    CListBox *p_list = class_cast<CListBox>(p_wnd);
-    ASSERT_NE(nullptr, p_list);
-    EXPECT_STREQ("ListBox", p_wnd->get_class_id().GetName());
-    EXPECT_EQ(p_list->get_scroll_bar_vert(), p_list->get_child("scroll bar vert", "ScrollBar", true));
-    EXPECT_TRUE(p_list->get_scroll_bar_vert()->is_hidden());
-    EXPECT_EQ(4, p_list->get_left_margin());
-    delete p_wnd;
 }

@@ -21,8 +21,10 @@ protected:
         lua_machine().DoString("ui_material_presets = nil");
         m_world.recorder().clear();
     }
-    std::unique_ptr<CMaterial> make() {
-        return std::unique_ptr<CMaterial>(m_world.desktop().create_material());
+    std::unique_ptr<CMaterial> make(char const *_table = nullptr) {
+        std::unique_ptr<CMaterial> p_material(m_world.desktop().create_material());
+        if (_table) p_material->load_state(lua_table(_table));
+        return p_material;
     }
     static std::string saved(CMaterial const &_material) {
         LuaPlus::LuaObject table = qortest::new_table();
@@ -40,11 +42,9 @@ protected:
 
 TEST_F(MaterialTest, InitMakesAHandleFromTheNamesResetGivesItBackAndAClonePaintsTheSame) {
     std::unique_ptr<CMaterial> material = make();
-    EXPECT_EQ(-1, material->get_material_handle());
     material->reset(); // nothing to give back
     material->init("ui_image", "font.tga", nullptr, nullptr, nullptr, nullptr, true, false);
     std::vector<qorhost::SRenderCall> const &calls = m_world.recorder().calls();
-    ASSERT_EQ("create_material", m_world.recorder().sequence());
     EXPECT_EQ((std::vector<std::string>{"ui_image", "font.tga", "", "", "", ""}), calls[0].m_names);
     int const handle = material->get_material_handle();
     material->reset();
@@ -52,10 +52,9 @@ TEST_F(MaterialTest, InitMakesAHandleFromTheNamesResetGivesItBackAndAClonePaints
     EXPECT_EQ("create_material destroy_material create_material", m_world.recorder().sequence());
     EXPECT_EQ(handle, calls[1].m_handle);
 
-    std::unique_ptr<CMaterial> source = make();
-    source->load_state(
-        lua_table("{ diffuse_texture = 'a.tga', material_template = 'ui_image', pos = { 0.25, 0.5 },"
-                  " bordered = true, border_left = 0.1, color = { r = 1, g = 2, b = 3, a = 4 } }"));
+    std::unique_ptr<CMaterial> source =
+        make("{ diffuse_texture = 'a.tga', material_template = 'ui_image', pos = { 0.25, 0.5 },"
+             " bordered = true, border_left = 0.1, color = { r = 1, g = 2, b = 3, a = 4 } }");
     std::unique_ptr<CMaterial> clone(source->clone());
     EXPECT_NE(source->get_material_handle(), clone->get_material_handle());
     EXPECT_EQ("a.tga", calls.back().m_names[1]);
@@ -68,32 +67,34 @@ TEST_F(MaterialTest, InitMakesAHandleFromTheNamesResetGivesItBackAndAClonePaints
     EXPECT_EQ(clone_handle, calls.back().m_handle);
 }
 
-TEST_F(MaterialTest, OnlyKeysOfTheRightTypeAreReadAndDeferredOnesWaitForInit) {
-    std::unique_ptr<CMaterial> material = make();
-    material->load_state(
-        lua_table("{ material_template = 'ui_color', bordered = false, border_left = 0.1,"
-                  " pos = 'x', size = { 0.5, 0.5 }, tex_size = { 256.9, 128 }, precache_enable = 0 }"));
+// Only keys of the right type are read, borders only of a nine-patch; deferred ones wait for init.
+TEST_F(MaterialTest, OnlyKeysOfTheRightTypeAreReadAndANinePatchComesBackTheSame) {
+    std::unique_ptr<CMaterial> material =
+        make("{ material_template = 'ui_color', bordered = false, border_left = 0.1,"
+             " pos = 'x', size = { 0.5, 0.5 }, tex_size = { 256.9, 128 }, defered_init = true }");
     EXPECT_FLOAT_EQ(0.5f, material->get_tex_w());
-    EXPECT_FLOAT_EQ(0.0f, material->get_border_left()); // borders only of a nine-patch
+    EXPECT_FLOAT_EQ(0.0f, material->get_border_left());
     EXPECT_FLOAT_EQ(0.0f, material->get_tex_x());
     EXPECT_EQ(256, material->get_tex_real_w());
-    EXPECT_EQ(rgba_t(255, 255, 255, 255), material->get_color());
-
-    std::unique_ptr<CMaterial> deferred = make();
-    m_world.recorder().clear();
-    deferred->load_state(lua_table("{ material_template = 'ui_color', defered_init = true }"));
-    EXPECT_EQ(-1, deferred->get_material_handle());
     EXPECT_EQ("", m_world.recorder().sequence());
-    deferred->init();
-    EXPECT_FALSE(deferred->get_defered_init());
+    material->init();
+    EXPECT_FALSE(material->get_defered_init());
+
+    std::unique_ptr<CMaterial> source =
+        make("{ material_template = 'ui_image', diffuse_texture = 'frame.tga',"
+             " tex_size = { 256, 128 }, bordered = true, border_left = 0.25,"
+             " border_right = 0.25, border_top = 0.125, border_bottom = 0.125 }");
+    std::unique_ptr<CMaterial> copy = make(saved(*source).substr(4).c_str());
+    EXPECT_EQ(saved(*source), saved(*copy));
+    EXPECT_FLOAT_EQ(0.125f, copy->get_border_bottom());
 }
 
 TEST_F(MaterialTest, APresetReferenceIgnoresTheLocalKeysAndIsSavedIntoThePreset) {
     lua_machine().DoString("ui_material_presets = { button = { material_template = 'ui_color',"
                            " color = { r = 10, g = 20, b = 30, a = 40 } } }");
-    std::unique_ptr<CMaterial> material = make();
-    material->load_state(lua_table("{ material_preset = 'button', color = { r = 1, g = 1, b = 1, a = 1 },"
-                                   " defered_init = true }"));
+    std::unique_ptr<CMaterial> material =
+        make("{ material_preset = 'button', color = { r = 1, g = 1, b = 1, a = 1 },"
+             " defered_init = true }");
     EXPECT_EQ(rgba_t(10, 20, 30, 40), material->get_color());
     EXPECT_NE(-1, material->get_material_handle());
     material->set_color(rgba_t(50, 60, 70, 80));
@@ -114,23 +115,4 @@ TEST_F(MaterialTest, APresetReferenceIgnoresTheLocalKeysAndIsSavedIntoThePreset)
               m_capture.errors());
     EXPECT_EQ(1u, m_capture.asserts().size());
     EXPECT_FLOAT_EQ(1.0f, material->get_tex_w());
-}
-
-TEST_F(MaterialTest, SavingWritesTheDefaultsAndANinePatchComesBackTheSame) {
-    EXPECT_EQ(
-        "m = {\n"
-        "    color = {\n        a = 255,\n        b = 255,\n        g = 255,\n        r = 255,\n    },\n"
-        "    load_textures_from_game_save = false,\n"
-        "    pos = {\n        [1] = 0,\n        [2] = 0,\n    },\n"
-        "    precache_enable = true,\n"
-        "    size = {\n        [1] = 1,\n        [2] = 1,\n    },\n"
-        "}\n",
-        saved(*make()));
-    std::unique_ptr<CMaterial> source = make(), copy = make();
-    source->load_state(lua_table("{ material_template = 'ui_image', diffuse_texture = 'frame.tga',"
-                                 " tex_size = { 256, 128 }, bordered = true, border_left = 0.25,"
-                                 " border_right = 0.25, border_top = 0.125, border_bottom = 0.125 }"));
-    copy->load_state(lua_table(saved(*source).substr(4)));
-    EXPECT_EQ(saved(*source), saved(*copy));
-    EXPECT_FLOAT_EQ(0.125f, copy->get_border_bottom());
 }

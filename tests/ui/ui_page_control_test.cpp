@@ -5,12 +5,8 @@
 #include "ui_page_control.h"
 
 #include "engine_interfaces.h"
-#include "qorscriptsystem.h"
-#include "test_support.h"
 #include "test_world.h"
 #include "ui_button.h"
-#include "ui_font.h"
-#include "ui_material.h"
 
 #include <gtest/gtest.h>
 
@@ -27,16 +23,9 @@ char const *const k_names[] = {"video", "audio", "keys"};
 class CProbe : public CPageControl {
 public:
     using CPageControl::CPageControl;
+    using CPageControl::m_active_page_idx;
     using CPageControl::m_tabs;
     using CPageControl::on_event_tab_click;
-    // What get_active_page answers while the active index is _idx.
-    CWindowVisual *active_page_at(int _idx) {
-        int const kept = m_active_page_idx;
-        m_active_page_idx = _idx;
-        CWindowVisual *p_page = get_active_page();
-        m_active_page_idx = kept;
-        return p_page;
-    }
 };
 
 class PageControlTest : public ::testing::Test {
@@ -47,7 +36,6 @@ protected:
         for (char const *p_name : k_names)
             add_page(p_name);
     }
-
     // The page and its tab, which add_page attaches last.
     void add_page(char const *_name) {
         m_pages.push_back(mp_control->add_page(_name));
@@ -58,9 +46,6 @@ protected:
     }
     void send(int _page, EEventType _id) {
         m_world.desktop().send_event(m_pages[_page], _id, CWndEvent::DISPATCH_NONE);
-    }
-    static std::vector<int> rect_of(CWindow *_p_wnd) {
-        return {_p_wnd->get_pos().x, _p_wnd->get_pos().y, _p_wnd->get_w(), _p_wnd->get_h()};
     }
     // Page _shown alone is visible and its tab alone checked; -1: none is shown, and the tabs are
     // not looked at (the tab of a disabled active page stays checked).
@@ -127,55 +112,18 @@ TEST_F(PageControlTest, EveryWayOfShowingAPageSwitchesToItAlone) {
 TEST_F(PageControlTest, ASwitchHidesTheOldPageAndActivatesTheNewOneWithItsChildren) {
     CWindow *p_content =
         m_world.place(m_pages[2], new CWindowVisual(&m_world.desktop(), "content"), 0, 0, 9, 9);
-    std::vector<std::string> events;
+    qortest::CEventLog log;
     for (CWindow *p_wnd : {(CWindow *)m_pages[0], (CWindow *)m_pages[1], (CWindow *)m_pages[2], p_content})
-        for (EEventType id : {EVENT_HIDE, EVENT_SHOW, EVENT_ACTIVATE, EVENT_DEACTIVATE})
-            p_wnd->register_callback(
-                id, CEventCallback([&events, id](CWndEvent const *_p_event) {
-                    char const *names[] = {"", "", "HIDE", "SHOW", "", "", "ACTIVATE", "DEACTIVATE"};
-                    events.push_back(std::string(_p_event->get_receiver()->get_name()) + " " + names[id]);
-                }));
+        log.watch(p_wnd, {EVENT_HIDE, EVENT_SHOW, EVENT_ACTIVATE, EVENT_DEACTIVATE});
     click_tab(2);
-    EXPECT_EQ((std::vector<std::string>{"video HIDE", "keys SHOW", "keys ACTIVATE", "content ACTIVATE"}),
-              events);
-}
-
-TEST_F(PageControlTest, ATabSizeActsOnLaterTabsWhileThePagesFollowItAtOnce) {
-    mp_control->set_tab_size(50, 20);
-    EXPECT_EQ(64, m_tabs[0]->get_w());
-    mp_control->set_tabs_pages_interval(8);
-    EXPECT_EQ(28, m_pages[0]->get_pos().y); // 0 + 20 + 8
-    EXPECT_EQ(172, m_pages[0]->get_h());
-    add_page("extra");
-    add_page("more");
-    EXPECT_EQ(50, m_tabs[3]->get_w());
-    EXPECT_EQ(20, m_tabs[3]->get_h());
-    EXPECT_EQ(216, m_tabs[3]->get_pos().x); // 3 * (64 + 8)
-    EXPECT_EQ(274, m_tabs[4]->get_pos().x); // + 50 + 8: each tab moves on by its own width
-}
-
-// Tabs in their built-in looks, the checked one lighter; of the pages, only the shown one.
-TEST_F(PageControlTest, TheTabsAndOnlyTheShownPageAreDrawn) {
-    m_pages[0]->add_material(MAT_NAME_NORMAL, m_world.colour(200, 0, 0));
-    m_pages[1]->add_material(MAT_NAME_NORMAL, m_world.colour(210, 0, 0));
-    click_tab(1);
-    m_world.move_to(0, 0);
-    m_world.clock().advance_ms(1000); // past every fade
-    m_world.frame();
-    m_world.frame();
-    int const glyph =
-        m_world.desktop().get_font(FNT_NAME_DEFAULT)->get_char_material('A')->get_material_handle();
-    std::vector<std::string> quads;
-    for (auto const &drawn : m_world.drawn())
-        if (drawn.m_op == "quad" && drawn.m_handle != glyph)
-            quads.push_back(std::to_string(drawn.m_rect.x) + "," + std::to_string(drawn.m_rect.y) + " " +
-                            std::to_string(drawn.m_colour.r) + "/" + std::to_string(drawn.m_colour.a));
-    EXPECT_EQ((std::vector<std::string>{"10,20 52/100", "10,60 210/255", "82,20 125/120", "154,20 52/100"}),
-              quads);
+    EXPECT_EQ((std::vector<std::string>{"video:EVENT_HIDE", "keys:EVENT_SHOW", "keys:EVENT_ACTIVATE",
+                                        "content:EVENT_ACTIVATE"}),
+              log.take());
 }
 
 // One control through the rows in turn: each row sets everything that its layout depends on, but
-// an unknown orientation lays nothing out and leaves the layout of the row before.
+// an unknown orientation lays nothing out and leaves the layout of the row before. A tab size acts
+// on later tabs, each moving on by its own width, while the pages follow it at once.
 TEST_F(PageControlTest, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem) {
     struct {
         char const *m_case;
@@ -183,14 +131,14 @@ TEST_F(PageControlTest, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem)
         EAlignment m_alignment;
         int m_margin, m_tabs_interval;
         int m_tab_x[3], m_tab_y[3];
-        int m_page[4]; // x, y, w, h
+        char const *m_page;
     } const rows[] = {
-        {"horizontal", 0, ALIGNMENT_LEFT, 0, 8, {0, 72, 144}, {0, 0, 0}, {0, 40, 300, 160}},
-        {"orientation 2: none", 2, ALIGNMENT_LEFT, 5, 4, {0, 72, 144}, {0, 0, 0}, {0, 40, 300, 160}},
-        {"horizontal, bottom ignored", 0, ALIGNMENT_BOTTOM, 5, 8, {5, 77, 149}, {5, 5, 5}, {5, 45, 290, 150}},
-        {"vertical", 1, ALIGNMENT_RIGHT, 0, 8, {0, 0, 0}, {0, 40, 80}, {72, 0, 228, 200}},
+        {"horizontal", 0, ALIGNMENT_LEFT, 0, 8, {0, 72, 144}, {0, 0, 0}, "0,40 300x160"},
+        {"orientation 2: none", 2, ALIGNMENT_LEFT, 5, 4, {0, 72, 144}, {0, 0, 0}, "0,40 300x160"},
+        {"horizontal, bottom ignored", 0, ALIGNMENT_BOTTOM, 5, 8, {5, 77, 149}, {5, 5, 5}, "5,45 290x150"},
+        {"vertical", 1, ALIGNMENT_RIGHT, 0, 8, {0, 0, 0}, {0, 40, 80}, "72,0 228x200"},
         // 200 - (32 + 4) * 3 - 5
-        {"vertical at the bottom", 1, ALIGNMENT_BOTTOM, 5, 4, {5, 5, 5}, {87, 123, 159}, {77, 5, 218, 190}},
+        {"vertical at the bottom", 1, ALIGNMENT_BOTTOM, 5, 4, {5, 5, 5}, {87, 123, 159}, "77,5 218x190"},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_case);
@@ -199,10 +147,23 @@ TEST_F(PageControlTest, TabsAndPagesStandWhereTheOrientationAndAlignmentPutThem)
         mp_control->set_tabs_interval(row.m_tabs_interval);
         mp_control->set_uniform_margins(row.m_margin);
         for (int i = 0; i < 3; ++i) {
-            EXPECT_EQ((std::vector<int>{row.m_tab_x[i], row.m_tab_y[i], 64, 32}), rect_of(m_tabs[i])) << i;
-            EXPECT_EQ((std::vector<int>(row.m_page, row.m_page + 4)), rect_of(m_pages[i])) << i;
+            EXPECT_EQ(qortest::rect_text(CRectArea(row.m_tab_x[i], row.m_tab_y[i], 64, 32)),
+                      qortest::place_text(m_tabs[i]))
+                << i;
+            EXPECT_EQ(row.m_page, qortest::place_text(m_pages[i])) << i;
         }
     }
+    mp_control->set_tabs_orientation(CPageControl::TABS_HORIZONTAL);
+    mp_control->set_uniform_margins(0);
+    mp_control->set_tabs_interval(8);
+    mp_control->set_tab_size(50, 20);
+    mp_control->set_tabs_pages_interval(8);
+    add_page("extra");
+    add_page("more");
+    EXPECT_EQ("0,28 300x172", qortest::place_text(m_pages[0])); // 0 + 20 + 8
+    EXPECT_EQ("72,0 64x32", qortest::place_text(m_tabs[1]));
+    EXPECT_EQ("216,0 50x20", qortest::place_text(m_tabs[3])); // 3 * (64 + 8)
+    EXPECT_EQ("274,0 50x20", qortest::place_text(m_tabs[4])); // + 50 + 8
 }
 
 TEST_F(PageControlTest, BrokenContractsAreReportedAndChangeNothing) {
@@ -218,7 +179,11 @@ TEST_F(PageControlTest, BrokenContractsAreReportedAndChangeNothing) {
         {"idx != -1", [this] { m_world.click_at(2, 2); }},
         {"_p_event && _p_event->get_receiver()", [this] { mp_control->on_event_tab_click(nullptr); }},
         {"m_active_page_idx >= 0 && m_active_page_idx < (int)m_pages.size()",
-         [this] { EXPECT_EQ(nullptr, mp_control->active_page_at(7)); }},
+         [this] {
+             mp_control->m_active_page_idx = 7;
+             EXPECT_EQ(nullptr, mp_control->get_active_page());
+             mp_control->m_active_page_idx = 0;
+         }},
         {"m_pages.size() == m_tabs.size()",
          [this] { mp_control->m_tabs.push_back(nullptr), mp_control->set_active_page(1); }},
         {"p_tab", [this] { mp_control->m_tabs.push_back(nullptr), mp_control->set_tabs_interval(8); }},
@@ -226,10 +191,9 @@ TEST_F(PageControlTest, BrokenContractsAreReportedAndChangeNothing) {
     for (auto const &row : rows) {
         qortest::CReportCapture capture;
         row.m_break();
-        std::vector<std::string> const reports = capture.texts(qordebug::REPORT_ASSERT);
-        ASSERT_FALSE(reports.empty()) << row.m_expression;
-        EXPECT_EQ(0u, reports[0].find(std::string("Expression:   ") + row.m_expression + ", \n"))
-            << reports[0];
+        ASSERT_FALSE(capture.asserts().empty()) << row.m_expression;
+        EXPECT_EQ(0u, capture.asserts()[0].find(std::string("Expression:   ") + row.m_expression + ", \n"))
+            << capture.asserts()[0];
         mp_control->m_tabs.resize(m_tabs.size()); // the pairs in step again
         expect_shown(0, row.m_expression);
     }
@@ -256,8 +220,7 @@ TEST(PageControlPersistence, ALayoutComesBackIntoAnEmptyDesktopWorkingAndUnchang
         _table.dump("ui_windows_ini", out);
         return out.str();
     };
-    LuaPlus::LuaObject table;
-    table.AssignNewTable(&lua_machine());
+    LuaPlus::LuaObject table = qortest::new_table();
     {
         qortest::CWorld world;
         CPageControl *p_control =
@@ -270,20 +233,16 @@ TEST(PageControlPersistence, ALayoutComesBackIntoAnEmptyDesktopWorkingAndUnchang
         world.click_at(20, 70); // the mute box: its page comes to the front of the control's children
         world.desktop().save_state(table);
     }
-    std::string const exported = dumped(table);
     qortest::CWorld world;
     world.desktop().load_state(table);
     auto *p_control = class_cast<CPageControl>(world.desktop().get_child("options", "PageControl", true));
     ASSERT_NE(nullptr, p_control);
     EXPECT_EQ(p_control->get_child("video", "WindowVisual", true), p_control->get_active_page());
     world.click_at(170, 25); // the keys tab
-    CWindow *p_keys = p_control->get_child("keys", "WindowVisual", true);
-    EXPECT_EQ(p_keys, p_control->get_active_page());
-    EXPECT_FALSE(p_keys->is_hidden());
-    EXPECT_TRUE(p_control->get_child("video", "WindowVisual", true)->is_hidden());
-    EXPECT_TRUE(p_control->get_child("audio", "WindowVisual", true)->is_hidden());
-    LuaPlus::LuaObject again;
-    again.AssignNewTable(&lua_machine());
-    world.desktop().save_state(again);
-    EXPECT_EQ(exported, dumped(again));
+    std::vector<bool> hidden;
+    for (char const *p_name : k_names)
+        hidden.push_back(p_control->get_child(p_name, "WindowVisual", true)->is_hidden());
+    EXPECT_EQ((std::vector<bool>{true, true, false}), hidden);
+    EXPECT_EQ(p_control->get_child("keys", "WindowVisual", true), p_control->get_active_page());
+    EXPECT_EQ(dumped(table), dumped(qortest::saved_state(&world.desktop())));
 }

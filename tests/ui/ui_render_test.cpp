@@ -16,54 +16,40 @@ public:
     std::vector<int> m_viewport;
 };
 
-void expect_point(float _x, float _y, vec2_t const &_p) {
-    EXPECT_FLOAT_EQ(_x, _p.x);
-    EXPECT_FLOAT_EQ(_y, _p.y);
-}
-
 } // namespace
 
-TEST(Render, QuadsLinesAndClipsReachTheEngineInDeviceCoordinates) {
-    qortest::CWorld world;
-    IRender &render = *world.desktop().get_render();
-    world.recorder().clear();
-    rgba_t const c2(9, 10, 11, 12);
-    render.draw_quad(point_t{0, 0}, point_t{320, 0}, point_t{320, 240}, point_t{80, 60}, vec2_t{0, 0},
-                     vec2_t{1, 0}, vec2_t{1, 1}, vec2_t{0, 1}, rgba_t(), rgba_t(), c2, rgba_t());
-    render.draw_line(point_t{160, 120}, point_t{0, 240}, rgba_t(), rgba_t());
-    render.set_clip_area(80, 60, 160, 60); // the engine takes the lower left corner and the size
-    ASSERT_EQ("draw_quad draw_line set_clip_rect", world.recorder().sequence());
-    std::vector<qorhost::SRenderCall> const &calls = world.recorder().calls();
-    expect_point(-1, 1, calls[0].m_points[0]);
-    expect_point(1, -1, calls[0].m_points[2]);
-    expect_point(-0.5f, 0.5f, calls[0].m_points[3]);
-    expect_point(1, 0, calls[0].m_uvs[1]);
-    EXPECT_EQ(c2, calls[0].m_colours[2]);
-    expect_point(0, 0, calls[1].m_points[0]);
-    expect_point(-1, -1, calls[1].m_points[1]);
-    expect_point(-0.5f, 0, calls[2].m_points[0]);
-    expect_point(1, 0.5f, calls[2].m_points[1]);
-}
-
-TEST(Render, FramesNestAndAViewSuspendsTheBatchAndScalesItsViewportToTheScreen) {
+// The engine takes a clip's lower left corner and its size; a view suspends the batch and scales
+// its viewport to the screen.
+TEST(Render, FiguresReachTheEngineInDeviceCoordinatesAndFramesNest) {
     qortest::CWorld world(320, 200); // another shape than the screen's
     IRender &render = *world.desktop().get_render();
     world.recorder().clear();
     CViewportCamera camera;
     render.begin_draw();
     render.begin_draw();
+    render.draw_quad(point_t{0, 0}, point_t{320, 0}, point_t{320, 200}, point_t{80, 50}, vec2_t{0, 0},
+                     vec2_t{1, 0}, vec2_t{1, 1}, vec2_t{0, 1}, rgba_t(), rgba_t(), rgba_t(9, 10, 11, 12),
+                     rgba_t());
+    render.set_clip_area(80, 50, 160, 50);
     render.render_view(10, 25, 100, 50, &camera);
     render.end_draw();
     render.end_draw();
-    EXPECT_EQ("begin_2d begin_2d end_2d render_view finish_view begin_2d end_2d end_2d",
-              world.recorder().sequence());
+    EXPECT_EQ(
+        "begin_2d begin_2d draw_quad set_clip_rect end_2d render_view finish_view begin_2d end_2d end_2d",
+        world.recorder().sequence());
+    std::vector<qorhost::SRenderCall> const &calls = world.recorder().calls();
+    std::vector<float> const expected = {-1, 1, 1, -1, -0.5f, 0.5f, 1, 0, -0.5f, 0, 1, 0.5f};
+    std::vector<float> const found = {calls[2].m_points[0].x, calls[2].m_points[0].y, calls[2].m_points[2].x,
+                                      calls[2].m_points[2].y, calls[2].m_points[3].x, calls[2].m_points[3].y,
+                                      calls[2].m_uvs[1].x,    calls[2].m_uvs[1].y,    calls[3].m_points[0].x,
+                                      calls[3].m_points[0].y, calls[3].m_points[1].x, calls[3].m_points[1].y};
+    EXPECT_EQ(expected, found);
+    EXPECT_EQ(rgba_t(9, 10, 11, 12), calls[2].m_colours[2]);
     EXPECT_EQ((std::vector<int>{32, 96, 320, 192}), camera.m_viewport);
-
     qortest::CReportCapture capture;
     render.end_draw(); // one end too many
-    EXPECT_EQ(8u, world.recorder().calls().size());
+    EXPECT_EQ(10u, calls.size());
     ASSERT_EQ(1u, capture.asserts().size());
-    EXPECT_NE(std::string::npos, capture.asserts()[0].find("mp_render && m_in_draw_2d > 0"));
 }
 
 TEST(Render, WithoutARendererEveryCallIsAReportedNoOp) {
@@ -76,8 +62,5 @@ TEST(Render, WithoutARendererEveryCallIsAReportedNoOp) {
               render.create_material("ui_color", nullptr, nullptr, nullptr, nullptr, nullptr, true, false));
     render.draw_line(point_t{0, 0}, point_t{1, 1}, rgba_t(), rgba_t());
     EXPECT_EQ(nullptr, render.get_avi_texture(0));
-    std::vector<std::string> const asserts = capture.asserts();
-    ASSERT_EQ(4u, asserts.size());
-    EXPECT_NE(std::string::npos, asserts[0].find("_p_render"));
-    EXPECT_NE(std::string::npos, asserts[1].find("mp_render"));
+    EXPECT_EQ(4u, capture.asserts().size());
 }

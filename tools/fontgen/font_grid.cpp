@@ -72,7 +72,7 @@ int glyph_row(SGlyph const &_glyph, SGrid const &_grid) {
     return _grid.m_baseline - _glyph.m_top;
 }
 
-SGrid plan_grid(std::vector<SGlyph> const &_glyphs, int _ascender, int _descender) {
+SGrid plan_grid(std::vector<SGlyph> const &_glyphs, int _ascender, int _descender, int _texture) {
     int above = std::max(_ascender, 0);
     int below = std::max(-_descender, 0);
     int right = 0;
@@ -84,12 +84,28 @@ SGrid plan_grid(std::vector<SGlyph> const &_glyphs, int _ascender, int _descende
     SGrid grid;
     grid.m_baseline = above;
     grid.m_line_height = above + below;
-    grid.m_dimension = 1;
-    while (static_cast<std::size_t>(grid.m_dimension) * grid.m_dimension < _glyphs.size())
-        grid.m_dimension *= 2;
     // One pixel to spare on the right and below keeps a filtering renderer from picking up the
     // neighbouring cell at the edge of a character.
-    grid.m_cell = next_power_of_two(std::max(grid.m_line_height, right) + 1);
+    int const cell = std::max(grid.m_line_height, right) + 1;
+    grid.m_dimension = 1;
+    if (_texture > 0) {
+        auto const holds = [&](int _dimension) {
+            return _texture % _dimension == 0 && _texture / _dimension >= cell &&
+                   static_cast<std::size_t>(_dimension) * _dimension >= _glyphs.size();
+        };
+        while (grid.m_dimension <= _texture / cell && !holds(grid.m_dimension))
+            ++grid.m_dimension;
+        if (grid.m_dimension > _texture / cell)
+            throw CFontgenError("no grid of cells of " + std::to_string(cell) +
+                                " pixels or more fills a texture of " + std::to_string(_texture) +
+                                " pixels with " + std::to_string(_glyphs.size()) +
+                                " characters: ask for another texture side");
+        grid.m_cell = _texture / grid.m_dimension;
+    } else {
+        while (static_cast<std::size_t>(grid.m_dimension) * grid.m_dimension < _glyphs.size())
+            grid.m_dimension *= 2;
+        grid.m_cell = next_power_of_two(cell);
+    }
     grid.m_texture = grid.m_dimension * grid.m_cell;
     if (grid.m_texture > MAX_TEXTURE_SIDE)
         throw CFontgenError("the texture would be " + std::to_string(grid.m_texture) +

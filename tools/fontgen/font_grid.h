@@ -31,8 +31,8 @@ struct SGlyph {
 
 // A square texture of dimension by dimension square cells, filled row by row from the top left.
 struct SGrid {
-    int m_dimension = 0;   // cells per side, a power of two
-    int m_cell = 0;        // pixels per side of a cell, a power of two
+    int m_dimension = 0;   // cells per side, a power of two unless the texture's side is given
+    int m_cell = 0;        // pixels per side of a cell, likewise
     int m_texture = 0;     // pixels per side of the texture: dimension * cell
     int m_baseline = 0;    // pixels from a cell's top down to the baseline
     int m_line_height = 0; // pixels of a line: the drawn height of every character, from a cell's top
@@ -51,8 +51,11 @@ int next_power_of_two(int _value);
 // The grid that holds every glyph in a cell of its own with the baseline at the same height:
 // the line reaches from the higher of the font's ascender and the highest glyph down to the lower
 // of its descender and the lowest glyph. _ascender is above the baseline, _descender below it
-// (negative), both in pixels. Throws when the texture would be too large.
-SGrid plan_grid(std::vector<SGlyph> const &_glyphs, int _ascender, int _descender);
+// (negative), both in pixels. The texture is the smallest of powers of two; or, with a _texture
+// side in pixels, that side cut into the fewest cells that hold the glyphs (a font whose size is
+// its texture's side is drawn at one texel a pixel, so a side can match the size a font is drawn
+// at). Throws when the texture would be too large, or the side given holds no such grid.
+SGrid plan_grid(std::vector<SGlyph> const &_glyphs, int _ascender, int _descender, int _texture = 0);
 
 // The interface draws a character as a quad of its width from its cell's left edge and moves the
 // pen by that width, so a glyph whose coverage reaches past its advance would be cut. Each drawn

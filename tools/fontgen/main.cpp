@@ -1,6 +1,7 @@
 // qorfontgen: makes a bitmap font for the interface from a TrueType font.
 //
 //   qorfontgen --font FILE --size PIXELS --chars LIST --out BASE [--texture-dir DIR] [--color RRGGBB]
+//              [--texture PIXELS]
 //
 // Writes BASE.fnt, the character description (font category of the data folder), and NAME.tga,
 // the texture (a texture folder), NAME being the file name part of BASE; then prints the entries
@@ -20,8 +21,10 @@ using namespace qorfontgen;
 
 char const USAGE[] =
     "usage: qorfontgen --font FILE --size PIXELS --chars LIST --out BASE [--texture-dir DIR] "
-    "[--color RRGGBB]\n"
+    "[--color RRGGBB] [--texture PIXELS]\n"
     "  LIST: codes and ranges, decimal or 0x hexadecimal, as 32-126,0x401,0x410-0x44F\n"
+    "  PIXELS of --texture: the texture's side, which is also the font's size (the smallest power of\n"
+    "  two that holds the characters unless given)\n"
     "  writes BASE.fnt and NAME.tga (beside BASE, or in DIR), NAME being BASE's file name\n";
 
 struct SOptions {
@@ -31,6 +34,7 @@ struct SOptions {
     std::string m_out;
     std::string m_texture_dir;
     SColor m_color;
+    int m_texture = 0; // the texture's side; 0 for a power of two
 };
 
 std::string file_name_of(std::string const &_path) {
@@ -43,12 +47,15 @@ std::string folder_of(std::string const &_path) {
     return slash == std::string::npos ? "." : _path.substr(0, slash);
 }
 
-int parse_size(std::string const &_text) {
+// A whole number of pixels from _least to _most, or a CFontgenError about the _what.
+int parse_pixels(std::string const &_text, char const *_what, int _least, int _most) {
     bool const digits =
         !_text.empty() && _text.size() < 5 && _text.find_first_not_of("0123456789") == std::string::npos;
-    int const size = digits ? std::stoi(_text) : 0;
-    if (size < 4 || size > 256) throw CFontgenError("bad size '" + _text + "': give 4 to 256 pixels");
-    return size;
+    int const pixels = digits ? std::stoi(_text) : 0;
+    if (pixels < _least || pixels > _most)
+        throw CFontgenError(std::string("bad ") + _what + " '" + _text + "': give " + std::to_string(_least) +
+                            " to " + std::to_string(_most) + " pixels");
+    return pixels;
 }
 
 // "--key value" pairs; each key once, the first four required.
@@ -56,8 +63,8 @@ SOptions parse_options(int _argc, char **_argv) {
     std::map<std::string, std::string> values;
     for (int i = 1; i < _argc; i += 2) {
         std::string const key = _argv[i];
-        static char const *const KEYS[] = {"--font", "--size",        "--chars",
-                                           "--out",  "--texture-dir", "--color"};
+        static char const *const KEYS[] = {"--font",        "--size",  "--chars",  "--out",
+                                           "--texture-dir", "--color", "--texture"};
         bool known = false;
         for (char const *p_known : KEYS)
             known = known || key == p_known;
@@ -71,12 +78,14 @@ SOptions parse_options(int _argc, char **_argv) {
             throw CFontgenError(std::string("option '") + p_required + "' is missing");
     SOptions options;
     options.m_font = values["--font"];
-    options.m_size = parse_size(values["--size"]);
+    options.m_size = parse_pixels(values["--size"], "size", 4, 256);
     options.m_chars = values["--chars"];
     options.m_out = values["--out"];
     options.m_texture_dir =
         values.count("--texture-dir") ? values["--texture-dir"] : folder_of(options.m_out);
     if (values.count("--color")) options.m_color = parse_color(values["--color"]);
+    if (values.count("--texture"))
+        options.m_texture = parse_pixels(values["--texture"], "texture side", 16, MAX_TEXTURE_SIDE);
     if (file_name_of(options.m_out).empty()) throw CFontgenError("'" + options.m_out + "' names no file");
     return options;
 }
@@ -101,7 +110,8 @@ void run(SOptions const &_options) {
     CGlyphRasterizer const rasterizer(_options.m_font, _options.m_size);
     std::vector<SGlyph> glyphs = render_glyphs(rasterizer, codes, _options.m_font);
     fit_drawn_widths(glyphs, rasterizer.is_fixed_width());
-    SGrid const grid = plan_grid(glyphs, rasterizer.get_ascender(), rasterizer.get_descender());
+    SGrid const grid =
+        plan_grid(glyphs, rasterizer.get_ascender(), rasterizer.get_descender(), _options.m_texture);
 
     std::string const name = file_name_of(_options.m_out);
     std::string const texture_file = name + ".tga";

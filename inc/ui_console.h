@@ -1,0 +1,86 @@
+// The developer console: a dialog with a history pane above a one-line command box. What the user
+// types goes to the engine's command and variable managers; every line that the engine's log
+// manager receives, from any module, shows up in the history, also while the console is hidden.
+//
+//   IConsole        what the service hands out: show, is_show, clear
+//   commands        return runs a line (a variable's name runs "set"), tab completes a name,
+//                   up and down recall earlier lines, page up and down scroll the history
+//
+// The service makes the one console and toggles it by the console key; the window tree owns it.
+// It has no creator in the windows factory and persists what a dialog persists.
+#pragma once
+#include "ui_dialog.h"
+#include "ui_interfaces.h"
+#include "ui_string.h"
+
+#include <deque>
+
+namespace qorui {
+
+class CEditBox;
+
+class CConsole : public IConsole, public CDialog {
+public:
+    // Lines of the history pane; older lines fall off the front.
+    static unsigned int const mn_max_history_strings = 1024;
+    // Bound of the recall list: after each command it is cut while it holds this many or more, so
+    // that one less stands at rest.
+    static unsigned int const mn_max_commands = 1024;
+
+    CConsole(CDesktop *_p_desktop, char const *_name);
+    virtual ~CConsole() {}
+
+    QOR_CLASS_ID(CConsole, CDialog, "Console")
+
+    // IConsole: the same object as the window
+    void show(bool _show) override;
+    bool is_show() override { return !is_hidden(); }
+    CConsole *get_console() override { return this; }
+    // Empties the command line and the history; the recall list stays.
+    void clear() override;
+
+    // The parts, for the owner and for tests
+    CEditBox *get_history() { return mp_history; }
+    CEditBox *get_command() { return mp_command; }
+    unsigned int get_commands_count() const { return static_cast<unsigned int>(m_commands.size()); }
+
+protected:
+    virtual void on_event_update(CWndEvent const *_p_event) override;
+    virtual void on_event_show(CWndEvent const *_p_event) override;
+    virtual void on_event_hide(CWndEvent const *_p_event) override;
+    virtual void on_event_activate(CWndEvent const *_p_event) override;
+    virtual void on_event_deactivate(CWndEvent const *_p_event) override;
+    virtual void on_event_resized(CWndEvent const *_p_event) override;
+    virtual void on_event_double_click(CWndEvent const *_p_event) override;
+    virtual void on_event_drag(CWndEvent const *_p_event) override;
+    virtual void on_event_set_text(CWndEvent const *_p_event) override;
+    virtual void on_event_key_down(CWndEvent const *_p_event) override;
+    virtual void on_event_char(CWndEvent const *_p_event) override;
+
+    // The line becomes the next name (command first, then variable) that starts with the name in
+    // front of its first blank, and one blank; false, and the line stays, when there is none.
+    bool complete_command(CString &_line);
+    // Echoes the line to the log, keeps it for recall and runs it; always true.
+    bool process_command(CString const &_line);
+
+    CEditBox *mp_history;                                   // child "history", owned by the window tree
+    CEditBox *mp_command;                                   // child "command", owned by the window tree
+    std::deque<CString, qor_allocator<CString>> m_commands; // oldest first
+    unsigned int mn_curr_command_idx;                       // the entry that the next key up or down recalls
+    unsigned int m_next_message; // running index of the first log message not yet shown
+
+private:
+    // The keys that the console keeps for itself: tab, return, page up, page down, up, down.
+    void complete_line();
+    void run_line();
+    void scroll_history_up();
+    void scroll_history_down();
+    void recall_previous() { recall_command(-1); }
+    void recall_next() { recall_command(+1); }
+    // The entry at the index into the command line; then the index steps by _step, wrapping.
+    void recall_command(int _step);
+    // A box of the console: attached, with a translucent dark material and a "courier" of its own.
+    CEditBox *make_box(char const *_name);
+};
+
+} // namespace qorui

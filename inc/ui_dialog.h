@@ -1,0 +1,175 @@
+// Dialogs: movable, resizable windows with a caption and a row or column of buttons at their foot.
+//
+//   CBorder        an invisible strip along one edge of its parent; dragging it resizes the
+//                  parent, and a grab near one of its ends acts on two edges, as a corner
+//   CDialog        caption, buttons that it makes and lays out itself, and a border on each edge
+//   CListDialog    a dialog with a list box between the caption and the buttons
+//   CMessageBox    a modal dialog with a text centred in it
+//
+// A dialog reports nothing of its buttons: the owner registers its callbacks for EVENT_CLICK on
+// the buttons that add_button gave back.
+#pragma once
+#include "qor_memory.h"
+#include "ui_string.h"
+#include "ui_text.h"
+#include "ui_window_visual.h"
+
+namespace qorui {
+
+class CButton;
+class CListBox;
+
+// Bit flags: one names the edge of a border, several make up what a drag moves.
+enum EBorderType : int {
+    BORDER_LEFT = 1,
+    BORDER_RIGHT = 2,
+    BORDER_TOP = 4,
+    BORDER_BOTTOM = 8,
+    BORDERS_ALL = 15
+};
+
+class CBorder : public CWindowVisual {
+public:
+    // A left border 8 pixels thick that can be dragged; its normal material slot is empty, so it
+    // draws nothing unless a layout gives it a material.
+    CBorder(CDesktop *_p_desktop, char const *_name);
+    virtual ~CBorder();
+
+    QOR_CLASS_ID(CBorder, CWindowVisual, "Border")
+
+    // Passive, and follows its parent's edge from then on. A border must have a parent, and
+    // stays with it: it is destroyed with the parent, never detached from it.
+    virtual void on_attached() override;
+    virtual void on_detached() override;
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    void set_border_size(int _size);
+    int get_border_size() const { return m_border_size; }
+    void set_border_type(EBorderType _type) { m_border_type = _type; }
+    EBorderType get_border_type() const { return m_border_type; }
+    // The edges that the running drag moves; 0 when there is no drag.
+    unsigned int get_drag_mode() const { return m_drag_mode; }
+
+protected:
+    virtual void on_event_drag_begin(CWndEvent const *_p_event) override;
+    virtual void on_event_drag(CWndEvent const *_p_event) override;
+    virtual void on_event_drag_end(CWndEvent const *_p_event) override;
+    // The parent's EVENT_RESIZED: the border lies along its edge again. A border of any other
+    // type than one edge (BORDERS_ALL too) stays as it is.
+    virtual void on_event_parent_resized(CWndEvent const *_p_event);
+
+    EBorderType m_border_type;
+    unsigned int m_drag_mode;
+    point_t m_drag_start; // where the pointer took hold, in the border's coordinates
+    int m_border_size;    // pixels
+};
+
+class CDialog : public CWindowVisual {
+public:
+    // Can be dragged by its background, and has a border of 8 pixels on each edge.
+    CDialog(CDesktop *_p_desktop, char const *_name);
+    virtual ~CDialog();
+
+    QOR_CLASS_ID(CDialog, CWindowVisual, "Dialog")
+
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    // A new button behind the others, in the dialog's button look, laid out with them at once.
+    // The dialog owns it through the window tree.
+    CButton *add_button(CString const &_caption);
+    unsigned int get_buttons_count() const { return static_cast<unsigned int>(m_buttons.size()); }
+    CButton *get_button(unsigned int _idx);
+
+    // The default button, which on_default_button_click clicks; the dialog calls that itself
+    // nowhere: the owner decides which key means it.
+    void set_default_button(CButton *_p_button);
+    CButton *get_default_button() { return mp_default_button; }
+    void on_default_button_click();
+
+    // Drawing only: a caption changes no layout.
+    void set_caption(CString const &_caption) { m_caption = _caption; }
+    CString const &get_caption() const { return m_caption; }
+
+    // Layout: each setter lays the dialog out again.
+    void set_caption_h(int _h);
+    void set_button_size(int _w, int _h);
+    void set_buttons_interval(int _interval);
+    void set_caption_alignment(EAlignment _alignment);
+    void set_buttons_horizontal(bool _horizontal);
+    int get_caption_h() const { return m_caption_h; }
+    int get_button_w() const { return m_button_w; }
+    int get_button_h() const { return m_button_h; }
+    int get_buttons_interval() const { return m_buttons_interval; }
+    EAlignment get_caption_alignment() const { return m_caption_alignment; }
+    bool get_buttons_horizontal() const { return m_buttons_horizontal; }
+
+protected:
+    virtual void on_event_draw(CWndEvent const *_p_event) override;
+    // The buttons at the foot, centred across the dialog: side by side, or one above the other.
+    virtual void on_event_resized(CWndEvent const *_p_event) override;
+
+    CString m_caption;
+    EAlignment m_caption_alignment; // horizontal place of the caption in the client area
+    bool m_buttons_horizontal;
+    int m_caption_h; // height of the caption strip, pixels
+    int m_button_w;  // size of each button, pixels
+    int m_button_h;
+    int m_buttons_interval;          // pixels between two buttons
+    qor_vector<CButton *> m_buttons; // in order of adding; owned by the window tree
+    CButton *mp_default_button;
+
+    // Stores a value that the layout depends on and lays the dialog out again.
+    template <class TValue>
+    void relayout(TValue &_field, TValue _value);
+
+private:
+    void layout_buttons();
+};
+
+class CListDialog : public CDialog {
+public:
+    // A list box, the child "list box", fills the room between the caption and the buttons.
+    CListDialog(CDesktop *_p_desktop, char const *_name);
+    virtual ~CListDialog();
+
+    QOR_CLASS_ID(CListDialog, CDialog, "ListDialog")
+
+    void set_buttons_list_box_interval(int _interval);
+    int get_buttons_list_box_interval() const { return m_buttons_list_box_interval; }
+    CListBox *get_list_box() { return mp_list_box; }
+
+protected:
+    // The list box's room leaves one row of buttons below it, also when they stand in a column.
+    virtual void on_event_resized(CWndEvent const *_p_event) override;
+
+    int m_buttons_list_box_interval; // pixels between the list box and the buttons
+    CListBox *mp_list_box;           // child "list box"; owned by the window tree
+};
+
+class CMessageBox : public CDialog {
+public:
+    // Modal, and so always on top, from the start.
+    CMessageBox(CDesktop *_p_desktop, char const *_name);
+    virtual ~CMessageBox();
+
+    QOR_CLASS_ID(CMessageBox, CDialog, "MessageBox")
+
+    // Layouts keep the message's first line only.
+    virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
+    virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+
+    void set_message_text(CString const &_text) { m_message_text = _text; }
+    CText const &get_message_text() const { return m_message_text; }
+
+protected:
+    // The message centred in the client area as a block, by the width of its first line; how each
+    // line stands in the block is the alignment of the text.
+    virtual void on_event_draw(CWndEvent const *_p_event) override;
+
+    CText m_message_text;
+};
+
+} // namespace qorui
