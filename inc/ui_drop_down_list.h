@@ -36,6 +36,8 @@ public:
     void check(unsigned int _idx);
     // What the closed control shows: the chosen row's column 0, or what a layout gave it.
     CText const &get_text() const { return m_text; }
+    // What the closed control shows until a row is chosen; no event goes out.
+    void set_text(CText const &_text) { m_text = _text; }
     CListBox *get_list_box() { return mp_list_box; }
 
     // Placement of the open list, in pixels relative to the control: _offset below its lower
