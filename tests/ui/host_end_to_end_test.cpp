@@ -152,6 +152,17 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          "GameUI: answer Yes",
          nullptr,
          nullptr},
+        // The graph profiler's phases take fixed shares of the manual clock's 16 ms a frame.
+        {"wait 12\ncommand graph_profiler\nwait 30\n"
+         "move -262 303 # from the centre onto the band of 'renderer' (250, 687)\n"
+         "press\nrelease\npress\nrelease\nwait 30\n"
+         "move 0 -53    # the drop-down list of unused nodes (250, 634)\npress\nrelease\nwait 12\n"
+         "screenshot profiler.png\ncommand graph_profiler\nmove 262 -250 # back to the centre\nwait 12\n"
+         "screenshot hidden.png\n",
+         {{"profiler.png", "graph_profiler_1024x768"}, {"hidden.png", "demo_scene_1024x768"}},
+         "",
+         nullptr,
+         nullptr},
     };
     for (auto const &run : runs) {
         SCOPED_TRACE(run.m_pictures[0].second);
