@@ -80,12 +80,6 @@ protected:
         size_t const size = _node.m_history.size();
         return _node.m_history[(_node.m_history_pos + size - 1) % size];
     }
-    std::set<std::string> used_names() const {
-        std::set<std::string> names;
-        for (CGraphProfilerNode const *p_node : mp_profiler->get_used_nodes())
-            names.insert(p_node->m_full_name.c_str());
-        return names;
-    }
     // The line strip that the last frame drew in _colour, as the profiler's own pixels: the start
     // of the first line, then the end of each.
     std::vector<SPoint> strip(rgba_t const &_colour) {
@@ -103,9 +97,6 @@ protected:
         }
         return points;
     }
-    // Pointer moves over the profiler's own pixel (_x, _y).
-    void point_at(int _x, int _y) { m_world.move_to(20 + _x, 30 + _y); }
-
     int const m_world_w = 400, m_world_h = 300;
     qortest::CWorld m_world{m_world_w, m_world_h};
     CGraphProfiler *mp_profiler = nullptr;
@@ -115,9 +106,8 @@ rgba_t const k_root_colour(255, 255, 255, 150);
 
 } // namespace
 
-// Nesting makes the tree: a node entered while another is open is its child, so one name under
-// two parents makes two nodes. The root's name isn't part of the paths. Measuring off, nothing
-// is made.
+// Nesting makes the tree: one name under two parents makes two nodes, and the root's name isn't
+// part of the paths. Measuring off, nothing is made. The walk that lists the nodes starts at the root.
 TEST_F(GraphProfilerTest, NestingBuildsTheTreeWithFullNames) {
     mp_profiler->stop();
     run("+off -");
@@ -125,24 +115,18 @@ TEST_F(GraphProfilerTest, NestingBuildsTheTreeWithFullNames) {
     run("+a +b - +c +d - - - +b - +a +b - -");
     EXPECT_EQ(0u, mp_profiler->get_open_nodes_count());
     frame();
-
-    EXPECT_EQ((std::set<std::string>{"root", "a", "a.b", "a.c", "a.c.d", "b"}), used_names());
+    std::set<std::string> names;
+    for (CGraphProfilerNode const *p_node : mp_profiler->get_used_nodes())
+        names.insert(p_node->m_full_name.c_str());
+    EXPECT_EQ((std::set<std::string>{"root", "a", "a.b", "a.c", "a.c.d", "b"}), names);
     EXPECT_EQ(6u, mp_profiler->get_used_nodes().size());
-    EXPECT_EQ(&mp_profiler->get_root(), mp_profiler->get_used_nodes()[0]); // the walk starts at the root
-    EXPECT_EQ(2u, mp_profiler->get_root().m_children.size());
+    EXPECT_EQ(&mp_profiler->get_root(), mp_profiler->get_used_nodes()[0]);
     EXPECT_EQ(2u, node("a")->m_children.size());
     EXPECT_EQ(nullptr, node("off"));
-    EXPECT_NE(node("a.b"), node("b"));
-    // Each node has a colour of its own, made with it.
-    std::set<CMaterial *> colours;
-    for (CGraphProfilerNode const *p_node : mp_profiler->get_used_nodes())
-        colours.insert(p_node->mp_material);
-    EXPECT_EQ(6u, colours.size());
-    EXPECT_EQ(0u, colours.count(nullptr));
 }
 
-// The newest sample of each node after one frame: all that the node's stretches took in the frame,
-// a parent's with its children's; the root's is the whole frame, from update to update.
+// The newest sample of each node after one frame: all that its stretches took in the frame, a
+// parent's with its children's; the root's is the whole frame, from update to update.
 TEST_F(GraphProfilerTest, EachFrameMovesTheNodesTimesIntoTheirRings) {
     struct {
         char const *m_case;
@@ -152,7 +136,7 @@ TEST_F(GraphProfilerTest, EachFrameMovesTheNodesTimesIntoTheirRings) {
         {"one stretch", "+a 3000 -", {{"a", 3000}, {"root", 19000}}},
         {"two stretches of one node add up", "+a 2000 - 500 +a 5000 -", {{"a", 7000}, {"root", 23500}}},
         {"a parent includes its child", "+a 1000 +b 4000 - 2000 -", {{"a", 7000}, {"a.b", 4000}}},
-        {"one name under two parents", "+a +b 1000 - - +b 3000 -", {{"a", 1000}, {"a.b", 1000}, {"b", 3000}}},
+        {"one name under two parents", "+a +b 1000 - - +b 3000 -", {{"a.b", 1000}, {"b", 3000}}},
         {"parts of a microsecond are cut", "+a 1999ns - +b 999ns -", {{"a", 1}, {"b", 0}}},
         {"a node not entered in a frame", "+b 5000 -", {{"b", 5000}, {"a", 0}}},
     };
@@ -165,29 +149,31 @@ TEST_F(GraphProfilerTest, EachFrameMovesTheNodesTimesIntoTheirRings) {
         for (auto const &sample : row.m_samples) {
             ASSERT_NE(nullptr, node(sample.first)) << sample.first;
             EXPECT_EQ(sample.second, newest(*node(sample.first))) << sample.first;
-            EXPECT_EQ(0u, node(sample.first)->m_time) << sample.first;
         }
     }
 }
 
-// The ring [4000, 1000, 2000, 3000] with its next slot 1, at a new width, then a frame of 5 ms. A
-// narrower ring loses the end of its storage, a wider one gains zeros; the graph starts at the
-// oldest sample, one pixel an update, one pixel of height a millisecond above the window's foot.
+// The ring [4000, 1000, 2000, 3000] with its next slot 1, at a new width, then one frame. A
+// narrower ring loses the end of its storage, a wider one gains zeros. The graph starts at the
+// oldest sample, one pixel an update and one of height a millisecond above the window's foot, and
+// a sample above the window stops at its top.
 TEST_F(GraphProfilerTest, TheRingFollowsTheWindowsWidthAndTheGraphScrolls) {
     struct {
         int m_w;
+        unsigned m_ms;
         std::vector<uint64_t> m_ring;
         uint32_t m_pos;
         std::vector<SPoint> m_strip;
     } const rows[] = {
-        {4, {4000, 5000, 2000, 3000}, 2, {{0, 140}, {0, 138}, {1, 137}, {2, 136}, {3, 135}}},
+        {4, 5, {4000, 5000, 2000, 3000}, 2, {{0, 140}, {0, 138}, {1, 137}, {2, 136}, {3, 135}}},
         {6,
+         5,
          {4000, 5000, 2000, 3000, 0, 0},
          2,
          {{0, 140}, {0, 138}, {1, 137}, {2, 140}, {3, 140}, {4, 136}, {5, 135}}},
-        {2, {4000, 5000}, 0, {{0, 140}, {0, 136}, {1, 135}}},
-        {1, {5000}, 0, {{0, 140}, {0, 135}}},
-        {0, {5000}, 0, {{0, 140}, {0, 135}}},
+        {2, 500, {4000, 500000}, 0, {{0, 140}, {0, 136}, {1, 0}}},
+        {1, 5, {5000}, 0, {{0, 140}, {0, 135}}},
+        {0, 5, {5000}, 0, {{0, 140}, {0, 135}}},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_w);
@@ -197,10 +183,8 @@ TEST_F(GraphProfilerTest, TheRingFollowsTheWindowsWidthAndTheGraphScrolls) {
         for (unsigned ms : {1, 2, 3, 4})
             frame(ms);
         CGraphProfilerNode const &root = mp_profiler->get_root();
-        ASSERT_EQ((std::vector<uint64_t>{4000, 1000, 2000, 3000}),
-                  std::vector<uint64_t>(root.m_history.begin(), root.m_history.end()));
         mp_profiler->set_size(row.m_w, 140);
-        frame(5);
+        frame(row.m_ms);
         EXPECT_EQ(std::max(row.m_w, 1), static_cast<int>(mp_profiler->get_history_size()));
         EXPECT_EQ(row.m_ring, std::vector<uint64_t>(root.m_history.begin(), root.m_history.end()));
         EXPECT_EQ(row.m_pos, root.m_history_pos);
@@ -208,73 +192,49 @@ TEST_F(GraphProfilerTest, TheRingFollowsTheWindowsWidthAndTheGraphScrolls) {
     }
 }
 
-// A sample higher than the band runs up through the bands above it and stops at the window's top.
-TEST_F(GraphProfilerTest, ASampleAboveTheWindowStopsAtItsTop) {
-    run("+a -");
-    mp_profiler->set_size(2, 140);
-    frame(16);
-    frame(500);
-    EXPECT_EQ((std::vector<SPoint>{{0, 140}, {0, 124}, {1, 0}}), strip(k_root_colour));
-}
-
-// Three bands of (140 - 20) / 3 = 40 pixels below the drop-down list, counted from the top; the
-// band under the pointer is drawn in the checked material. Over the drop-down the band stays.
-TEST_F(GraphProfilerTest, ThePointerMarksTheBandUnderIt) {
-    run("+a - +b -");
-    frame();
-    ASSERT_EQ(3u, mp_profiler->get_used_nodes().size());
-    EXPECT_EQ(0xFFFFFFFFu, mp_profiler->get_pointed_idx());
-    struct {
-        int m_y;
-        unsigned m_band;
-    } const rows[] = {{20, 0}, {59, 0}, {60, 1}, {100, 2}, {131, 2}, {10, 2}, {75, 1}};
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_y);
-        point_at(100, row.m_y);
-        frame();
-        EXPECT_EQ(row.m_band, mp_profiler->get_pointed_idx());
-        std::vector<qortest::CWorld::SDrawn> marks;
-        for (auto const &quad : m_world.quads())
-            if (quad.m_colour == rgba_t(250, 250, 250, 30)) marks.push_back(quad);
-        ASSERT_EQ(1u, marks.size());
-        EXPECT_EQ(qortest::rect_text(CRectArea(20, 30 + 20 + 40 * static_cast<int>(row.m_band), 200, 40)),
-                  qortest::rect_text(marks[0].m_rect));
-    }
-}
-
-// A double click takes the band's node out: at the next update it leaves the bands for a row of
-// the drop-down list. Choosing the row brings it back at the update after, and the row goes.
+// Three bands of (140 - 20) / 3 = 40 pixels below the drop-down list, counted from the top, the
+// one under the pointer drawn in the checked material; over the drop-down the band stays. A double
+// click takes the band's node out, to a row of the drop-down at the next update; choosing the row
+// brings it back at the update after, and the row goes.
 TEST_F(GraphProfilerTest, ADoubleClickTakesANodeOutAndTheDropDownBringsItBack) {
     run("+a - +b -");
     frame();
-    CGraphProfilerNode *p_top = mp_profiler->get_used_nodes()[2]; // the top band's
-    std::string const name = p_top->m_full_name.c_str();
+    for (auto const &row :
+         std::vector<std::pair<int, unsigned>>{{20, 0}, {59, 0}, {60, 1}, {131, 2}, {10, 2}}) {
+        SCOPED_TRACE(row.first);
+        m_world.move_to(120, 30 + row.first);
+        frame();
+        EXPECT_EQ(row.second, mp_profiler->get_pointed_idx());
+        std::vector<std::string> marks;
+        for (auto const &quad : m_world.quads())
+            if (quad.m_colour == rgba_t(250, 250, 250, 30)) marks.push_back(qortest::rect_text(quad.m_rect));
+        EXPECT_EQ(std::vector<std::string>{qortest::rect_text(CRectArea(20, 50 + 40 * row.second, 200, 40))},
+                  marks);
+    }
 
+    CGraphProfilerNode *p_top = mp_profiler->get_used_nodes()[2]; // the top band's
     m_world.click_at(120, 30 + 40);
     m_world.click_at(120, 30 + 40);
     frame();
     EXPECT_FALSE(p_top->m_is_used);
     EXPECT_EQ(2u, mp_profiler->get_used_nodes().size());
-    EXPECT_EQ(0u,
-              std::count(mp_profiler->get_used_nodes().begin(), mp_profiler->get_used_nodes().end(), p_top));
     CItems &rows = mp_profiler->get_unused_nodes()->get_items();
     ASSERT_EQ(1u, rows.get_count());
-    EXPECT_EQ(CString(name.c_str()), *rows.get(0)->get_string(0).get_string(0u));
+    EXPECT_EQ(CString(p_top->m_full_name.c_str()), *rows.get(0)->get_string(0).get_string(0u));
 
     m_world.click_at(120, 30 + 10); // opens the list below the drop-down
     CListBox *p_list = mp_profiler->get_unused_nodes()->get_list_box();
     ASSERT_FALSE(p_list->is_hidden());
     point_t const list = p_list->get_global_pos();
     m_world.click_at(list.x + 20, list.y + p_list->get_top_margin() + p_list->get_item_height() / 2);
-    EXPECT_EQ(0, rows.get_checked_idx());
     frame();
     EXPECT_TRUE(p_top->m_is_used);
     EXPECT_EQ(3u, mp_profiler->get_used_nodes().size());
     EXPECT_EQ(0u, rows.get_count());
 }
 
-// Stopped, nothing is measured or drawn but the dialog; started again, the rings go on where they
-// were and the root's first sample is the whole pause.
+// Stopped, nothing is measured or drawn; started again, the rings go on where they were and the
+// root's first sample is the whole pause.
 TEST_F(GraphProfilerTest, AfterAStopTheGraphsResumeFromTheSameRings) {
     run("+a 2000 -");
     frame();
@@ -282,15 +242,12 @@ TEST_F(GraphProfilerTest, AfterAStopTheGraphsResumeFromTheSameRings) {
     mp_profiler->stop();
     run("+a 2000 -");
     frame(100);
-    frame(100);
     EXPECT_TRUE(strip(k_root_colour).empty());
     EXPECT_EQ(pos, mp_profiler->get_root().m_history_pos);
-    EXPECT_EQ(0u, node("a")->m_time);
     mp_profiler->start();
     frame(16);
-    EXPECT_EQ(218000u, newest(mp_profiler->get_root())); // 2 + 100 + 100 + 16 ms
+    EXPECT_EQ(118000u, newest(mp_profiler->get_root())); // 2 + 100 + 16 ms
     EXPECT_EQ(0u, newest(*node("a")));
-    EXPECT_FALSE(strip(k_root_colour).empty());
 }
 
 // A broken pairing is reported with its expression; reset forgets the open nodes, after which
@@ -298,54 +255,47 @@ TEST_F(GraphProfilerTest, AfterAStopTheGraphsResumeFromTheSameRings) {
 TEST_F(GraphProfilerTest, BrokenPairingsAreReported) {
     qortest::CReportCapture capture;
     mp_profiler->exit_node();
-    ASSERT_EQ(1u, capture.asserts().size());
-    EXPECT_NE(std::string::npos, capture.asserts()[0].find("!m_stack.empty()"));
-
     run("+a");
     mp_profiler->start(); // already on: nothing to check
-    EXPECT_EQ(1u, capture.asserts().size());
     mp_profiler->stop();
     mp_profiler->start();
-    ASSERT_EQ(2u, capture.asserts().size());
-    EXPECT_NE(std::string::npos, capture.asserts()[1].find("m_stack.empty()"));
     mp_profiler->stop();
     mp_profiler->reset();
     EXPECT_EQ(0u, mp_profiler->get_open_nodes_count());
     mp_profiler->start();
-    EXPECT_EQ(2u, capture.asserts().size());
+    ASSERT_EQ(2u, capture.asserts().size());
+    EXPECT_EQ(0u, capture.asserts()[0].find("Expression:   !m_stack.empty(),"));
+    EXPECT_EQ(0u, capture.asserts()[1].find("Expression:   m_stack.empty(),"));
 }
 
-// The profiler keeps what a dialog keeps. A key of the wrong Lua type leaves its field; rows that a
-// layout gives the drop-down list have no node behind them, and choosing one is reported and
-// brings nothing back.
+// The profiler keeps what a dialog keeps, and a key of the wrong Lua type leaves its field. Rows that
+// a layout gives the drop-down list have no node behind them: choosing one is reported once.
 TEST_F(GraphProfilerTest, TheLayoutKeepsTheDialogAndBadTypesLeaveItAsItWas) {
     mp_profiler->set_caption(CString("frame times"));
     mp_profiler->set_caption_h(30);
     LuaPlus::LuaObject saved = qortest::saved_state(mp_profiler);
-    EXPECT_STREQ("GraphProfiler", saved.GetByName("class_name").GetString());
     saved.SetString("name", "copy");
-
     qortest::CReportCapture capture;
     CGraphProfiler *p_copy = m_world.place(&desktop(), new CGraphProfiler(&desktop(), "copy"), 0, 0, 50, 50);
-    p_copy->load_state(saved);
-    EXPECT_EQ(CString("frame times"), p_copy->get_caption());
-    EXPECT_EQ(30, p_copy->get_caption_h());
-    EXPECT_EQ("20,30 200x140", qortest::place_text(p_copy));
-
-    qortest::load_state(p_copy, "{ name = 'copy', class_name = 'GraphProfiler', caption = 12, caption_h = "
-                                "'tall', size = 'large', pos = true }");
-    EXPECT_EQ(CString("frame times"), p_copy->get_caption());
-    EXPECT_EQ(30, p_copy->get_caption_h());
-    EXPECT_EQ("20,30 200x140", qortest::place_text(p_copy));
+    for (char const *layout :
+         {"", "{ name = 'copy', class_name = 'GraphProfiler', caption = 12, caption_h = 'tall', "
+              "size = 'large', pos = true }"}) {
+        SCOPED_TRACE(layout);
+        if (*layout)
+            qortest::load_state(p_copy, layout);
+        else
+            p_copy->load_state(saved);
+        EXPECT_EQ(CString("frame times"), p_copy->get_caption());
+        EXPECT_EQ(30, p_copy->get_caption_h());
+        EXPECT_EQ("20,30 200x140", qortest::place_text(p_copy));
+    }
     EXPECT_TRUE(capture.reports().empty());
 
     p_copy->start();
-    CItems &rows = p_copy->get_unused_nodes()->get_items();
-    rows.add(new CItem(CText("a.b"), nullptr));
+    p_copy->get_unused_nodes()->get_items().add(new CItem(CText("a.b"), nullptr));
     p_copy->get_unused_nodes()->check(0);
     m_world.frame();
     m_world.frame();
     ASSERT_EQ(1u, capture.asserts().size());
     EXPECT_EQ(0u, capture.asserts()[0].find("Expression:   p,"));
-    EXPECT_FALSE(rows.is_checked());
 }
