@@ -44,7 +44,7 @@ public:
     // A new event of that type with an empty stream, sent by the virtual form.
     void send_event(CWindow *_p_receiver, EEventType _id, CWndEvent::EDispatchType _type);
 
-    QOR_CLASS_ID(CWindow, void, "Window")
+    QOR_CLASS_ID_ROOT(CWindow, "Window")
 
     // Tree and identity: links, order, lookup, the name
     virtual void attach_child(CWindow *_p_child);
