@@ -91,8 +91,10 @@ public:
     void print_stats_page();
 
     // The screen size read at init, in real pixels.
+    // @{
     int get_screen_w() const { return m_scr_w; }
     int get_screen_h() const { return m_scr_h; }
+    // @}
 
     // The engine's server, handed in by RegisterInterface; init gives it to the cache of
     // interfaces.
