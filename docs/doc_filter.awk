@@ -3,7 +3,7 @@
 #   - A block followed by a blank line (a file's opening comment, a section heading over a group
 #     of members) stays a plain comment, so a heading never becomes a member's first sentence.
 #   - "// @{" and "// @}" around a few members share the comment above them (DISTRIBUTE_GROUP_DOC).
-#   - A comment behind a declaration on the same line documents that declaration.
+#   - A comment behind a declaration or an enumerator on the same line documents it.
 # Banners ("// ----") and commented-out code ("//x") are left alone.
 
 function emit_block(as_doc,    i, line) {
@@ -24,8 +24,13 @@ function emit_block(as_doc,    i, line) {
 {
     emit_block($0 !~ /^[ \t]*$/)
     line = $0
-    if (match(line, /[;{] *\/\/ /))
+    if (match(line, /[;{,] *\/\/ /))
         line = substr(line, 1, RSTART) " ///< " substr(line, RSTART + RLENGTH)
+    else if (match(line, /^ *[A-Z][A-Z0-9_]*( *= *[^\/]*)? *\/\/ /)) {
+        # the last enumerator of an enumeration, without its comma
+        match(line, /\/\/ /)
+        line = substr(line, 1, RSTART - 1) "///< " substr(line, RSTART + RLENGTH)
+    }
     print line
 }
 
