@@ -132,8 +132,10 @@ public:
     CItem *get_selected() const;
     // Step by one row and stop at either end. With nothing selected, select_prev selects the last
     // row and select_next row 0; an empty list stays as it is.
+    // @{
     void select_prev();
     void select_next();
+    // @}
 
     // The checked row
 
