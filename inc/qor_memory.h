@@ -40,10 +40,13 @@ void *qor_small_alloc(size_t _size);
 void qor_small_free(void *_p);
 // @}
 
-// Status wrappers: 0 (or -1 for the per-module statistics) while the manager isn't loaded.
+// The manager's MMGetMemoryStatus, MMGetStatsForModules and MMGetMemoryBlockStatus; 0 (or -1 for
+// the per-module statistics) while the manager isn't loaded.
+// @{
 int qor_get_memory_status(SMMHeapStats *_p_out);
 int qor_get_stats_for_modules(SMMHeapStats *_p_out, int _max);
 int qor_get_memory_block_status(void const *_p);
+// @}
 // False without calling anything while the manager isn't loaded, true after the call.
 bool qor_check_memory_corrupt();
 
@@ -162,7 +165,7 @@ public:
     template <class U>
     bool operator!=(qor_small_allocator<U> const &) const noexcept {
         return false;
-    // @}
+        // @}
     }
 };
 
@@ -201,7 +204,7 @@ public:
     template <class U>
     bool operator!=(qor_allocator<U> const &) const noexcept {
         return false;
-    // @}
+        // @}
     }
 };
 

@@ -47,6 +47,7 @@ void *find_in_chain([[maybe_unused]] TClass *_p_object, [[maybe_unused]] char *_
 
 } // namespace class_id_detail
 
+// Declares the class's identity: class_id, find_class_by_id and get_class_id, as above.
 #define QOR_CLASS_ID(_class, _next, _name)                                                                   \
 public:                                                                                                      \
     static char *class_id() {                                                                                \

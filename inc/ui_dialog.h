@@ -128,29 +128,22 @@ public:
     // Layout: each setter lays the dialog out again.
 
     // The height of the caption strip in pixels (24 by default).
-    // @{
     void set_caption_h(int _h);
-    int get_caption_h() const { return m_caption_h; }
-    // @}
     // The size of every button in pixels (128 by 32 by default).
-    // @{
     void set_button_size(int _w, int _h);
+    // The space between two buttons in pixels (8 by default).
+    void set_buttons_interval(int _interval);
+    // Where the caption stands across the client area: left, centred or right.
+    void set_caption_alignment(EAlignment _alignment);
+    // Buttons side by side (the default), or one above the other.
+    void set_buttons_horizontal(bool _horizontal);
+    // The values of the setters above.
+    // @{
+    int get_caption_h() const { return m_caption_h; }
     int get_button_w() const { return m_button_w; }
     int get_button_h() const { return m_button_h; }
-    // @}
-    // The space between two buttons in pixels (8 by default).
-    // @{
-    void set_buttons_interval(int _interval);
     int get_buttons_interval() const { return m_buttons_interval; }
-    // @}
-    // Where the caption stands across the client area: left, centred or right.
-    // @{
-    void set_caption_alignment(EAlignment _alignment);
     EAlignment get_caption_alignment() const { return m_caption_alignment; }
-    // @}
-    // Buttons side by side (the default), or one above the other.
-    // @{
-    void set_buttons_horizontal(bool _horizontal);
     bool get_buttons_horizontal() const { return m_buttons_horizontal; }
     // @}
 

@@ -80,6 +80,7 @@ private:
     X(FNT_NAME_BUTTON_PUSHED)                                                                                \
     X(FNT_NAME_BUTTON_CHECKED)
 
+// Declares one static name; undefined again below.
 #define QOR_DECLARE_STATIC_HUID(_id) extern HUID const _id;
 QOR_STATIC_HUIDS(QOR_DECLARE_STATIC_HUID)
 #undef QOR_DECLARE_STATIC_HUID

@@ -73,7 +73,7 @@ public:
     CWindow *get_parent() { return mp_parent; }
     // The desktop of the tree, given at construction.
     CDesktop *get_desktop() { return mp_desktop; }
-    // The direct children.
+    // The number of direct children.
     unsigned int get_children_count() const { return static_cast<unsigned int>(m_children.size()); }
     // The child at _idx, from back (0) to front; null, with a report, when out of range.
     CWindow *get_child(unsigned int _idx);

@@ -25,10 +25,10 @@ public:
 
 // A variable record. The integer and float values follow the text when it is a number.
 struct SVariable {
-    char const *mp_name; // the name, as registered
+    char const *mp_name;  // the name, as registered
     char const *mp_value; // the value as text
-    int m_int_value; // the number at the start of the text as an integer, else 0
-    float m_float_value; // the number at the start of the text as a float, else 0
+    int m_int_value;      // the number at the start of the text as an integer, else 0
+    float m_float_value;  // the number at the start of the text as a float, else 0
 };
 
 // The engine's console variables, by name, as text with its number values.

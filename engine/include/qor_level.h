@@ -4,9 +4,9 @@
 
 // Four strings; the second is the level's name. Pointers owned by the engine, may be null.
 struct SLevelDescription {
-    char const *mp_file; // the level file
-    char const *mp_name; // the level's name, used in stats dump file names
-    char const *mp_title; // the title shown to the player
+    char const *mp_file;    // the level file
+    char const *mp_name;    // the level's name, used in stats dump file names
+    char const *mp_title;   // the title shown to the player
     char const *mp_comment; // the author's note
 };
 

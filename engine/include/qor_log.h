@@ -25,8 +25,8 @@ protected:
 // during the visit that hands the record out.
 struct SLogMessage {
     unsigned short const *mp_text; // 16-bit units, terminated; valid during the call only
-    uint32_t m_level; // 0 message, 1 warning, 2 error
-    uint32_t m_index; // running index, from 0
+    uint32_t m_level;              // 0 message, 1 warning, 2 error
+    uint32_t m_index;              // running index, from 0
 };
 
 // Receives messages from get_messages, oldest first. Copies what it keeps: records don't survive

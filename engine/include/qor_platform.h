@@ -16,9 +16,7 @@ int64_t query_performance_frequency();
 // and blinks are exact. Null restores the system clock.
 struct IClock {
     virtual ~IClock() {}
-    // Milliseconds, as get_tick_count.
     virtual uint32_t tick_count() = 0;        // ms
-    // Nanoseconds, as query_performance_counter.
     virtual int64_t performance_counter() = 0; // ns
 };
 // Puts the clock in place of the system clock; null restores the system clock. The caller

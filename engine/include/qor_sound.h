@@ -21,9 +21,11 @@ enum ESoundState : int { SOUND_STATE_RESET = 0, SOUND_STATE_START = 1, SOUND_STA
 
 // What the interface passes: the flags of create_sound, the option each source is given once
 // right after creation, and the argument of get_volume.
+// @{
 int const SOUND_FLAGS_INTERFACE = 2;
 int const SOUND_OPTION_INTERFACE = 1;
 int const SOUND_VOLUME_OWN = 1;
+// @}
 
 // One playing sound, owned by whoever made it.
 class ISoundSource {

@@ -83,10 +83,10 @@ public:
 
 // One file of IFileSystem::save_files.
 struct SFileToSave {
-    int m_category; // the category whose folder the path is relative to
+    int m_category;      // the category whose folder the path is relative to
     char const *mp_path; // the file's path in the category
     void const *mp_data; // the bytes to write, _size of them
-    unsigned m_size; // in bytes
+    unsigned m_size;     // in bytes
 };
 
 // The engine's files by category, and its log.
@@ -182,9 +182,9 @@ char const *get_config_string(char const *_section, char const *_key, char const
 // all temporaries are complete before the first rename; a failure before the renames replaces
 // none (errno tells why). False on any failure.
 struct SFileContent {
-    std::string m_path; // the full path
+    std::string m_path;  // the full path
     void const *mp_data; // the bytes to write
-    size_t m_size; // how many
+    size_t m_size;       // how many
 };
 // Writes the _count files of _p_files together, as above.
 bool write_files_atomically(SFileContent const *_p_files, size_t _count);

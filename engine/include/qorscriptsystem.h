@@ -48,7 +48,7 @@ private:
 // One Lua value of one state, or nil of no state.
 class LuaObject {
 public:
-    LuaObject();                       // nil of no state
+    LuaObject();                            // nil of no state
     explicit LuaObject(LuaState *_p_state); // nil of that state
     // Copies share a table, they don't copy it.
     // @{
