@@ -47,6 +47,8 @@ void *find_in_chain([[maybe_unused]] TClass *_p_object, [[maybe_unused]] char *_
 
 } // namespace class_id_detail
 
+// The members of a class's identity, as above: class_id, find_class_by_id and get_class_id, the
+// virtual ones marked by _overrides (empty in the root, override elsewhere).
 #define QOR_CLASS_ID_MEMBERS(_class, _next, _name, _overrides)                                               \
 public:                                                                                                      \
     static char *class_id() {                                                                                \
@@ -61,7 +63,9 @@ public:                                                                         
         static ::qorui::HUID const s_name(_name);                                                            \
         return s_name;                                                                                       \
     }
+// The identity of the root of the chain, which declares the virtual operations.
 #define QOR_CLASS_ID_ROOT(_class, _name) QOR_CLASS_ID_MEMBERS(_class, void, _name, )
+// The identity of a class whose chain goes on with _next, which overrides them.
 #define QOR_CLASS_ID(_class, _next, _name) QOR_CLASS_ID_MEMBERS(_class, _next, _name, override)
 
 // The object seen as T if T is its class or in its chain; otherwise, and for null, null.
