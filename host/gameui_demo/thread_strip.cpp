@@ -84,6 +84,10 @@ public:
 protected:
     void on_event_update(CWndEvent const *_p_event) override {
         CWindowVisual::on_event_update(_p_event);
+        // The first fetch measures the counter's frequency against the time since the monitor was
+        // made, so it waits until the clock has moved (a host's own clock may stand still between
+        // a command and the next frame).
+        if (qorplatform::query_performance_counter() == m_made_at) return;
         int status = 0;
         uint32_t const last = m_fetches;
         if (m_monitor.refresh(&status) && m_monitor.get_ticks_per_second()) ++m_fetches;
@@ -148,6 +152,7 @@ private:
     CThreadMonitor m_monitor; // after its device, which it stops and removes as it goes
     qor_vector<SThreadRow> m_rows;
     uint32_t m_fetches = 0;
+    int64_t const m_made_at = qorplatform::query_performance_counter();
 };
 
 CDesktop *desktop() {
