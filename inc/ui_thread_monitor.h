@@ -59,9 +59,9 @@ public:
 // thread ran on it, about 250 times a second, stamped with the processor's time stamp counter.
 // Processor p writes ring p modulo 4. The samples come from the kernel's processor-clock events
 // (perf_event_open) where the kernel lets this process watch every processor; elsewhere from
-// /proc, about 50 times a second, where of the threads in state R on a processor the one that ran
-// longest since the last look is taken to have had it. The sampler's thread is named "Thread_Sampler" in the
-// monitor's map.
+// /proc, about 50 times a second: of the threads in state R on a processor, one drawn by its run
+// time since the last look, so that each has its share of the samples. The sampler's thread is
+// named "Thread_Sampler" in the monitor's map.
 class CThreadSampler : public IThreadMonitorDevice {
 public:
     enum ESource {

@@ -51,8 +51,9 @@ SThreadNames &thread_names() {
     return s_names;
 }
 
-// Made at the library's load, so that the map exists before any thread is named.
-SThreadNames &g_thread_names = thread_names();
+// Made at the library's load at the latest, so that the map exists before any thread is named;
+// reached through thread_names(), which a static of another file may call before this line runs.
+[[maybe_unused]] SThreadNames &g_thread_names = thread_names();
 
 char *copy_text(char const *_text) {
     size_t const size = strlen(_text) + 1;
@@ -79,7 +80,7 @@ void tell_debuggers(unsigned _thread_id, char const *_name) {
 void CThreadMonitor::set_thread_name(unsigned _thread_id, char const *_name) {
     if (!QOR_CHECK(_name)) return;
     tell_debuggers(_thread_id, _name);
-    char *&p_name = g_thread_names.m_names[_thread_id];
+    char *&p_name = thread_names().m_names[_thread_id];
     qor_free(p_name);
     p_name = copy_text(_name);
 }
@@ -90,8 +91,9 @@ void CThreadMonitor::set_current_thread_name(char const *_name) {
 
 char const *CThreadMonitor::get_thread_name(unsigned _thread_id) {
     if (_thread_id == ~0u) return "System/Other";
-    auto found = g_thread_names.m_names.find(_thread_id);
-    return found != g_thread_names.m_names.end() && found->second ? found->second : "Unknown";
+    qor_map<unsigned, char *> const &names = thread_names().m_names;
+    auto found = names.find(_thread_id);
+    return found != names.end() && found->second ? found->second : "Unknown";
 }
 
 // ---------------------------------------------------------------------------------------------
@@ -378,6 +380,7 @@ struct CThreadSampler::SState {
         for (unsigned cpu = 0; cpu < m_cpus; ++cpu) {
             int const fd =
                 int(syscall(SYS_perf_event_open, &attributes, -1, int(cpu), -1, PERF_FLAG_FD_CLOEXEC));
+            if (fd < 0 && errno == ENODEV) continue; // a processor that is offline
             if (fd < 0) return false;
             size_t const size = (1 + k_perf_pages) * page;
             void *p_map = mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_SHARED, fd, 0);
@@ -387,7 +390,7 @@ struct CThreadSampler::SState {
             }
             m_events.push_back(SPerfEvent{fd, cpu, static_cast<perf_event_mmap_page *>(p_map), size});
         }
-        return true;
+        return !m_events.empty();
     }
 
     void close_events() {
@@ -450,10 +453,10 @@ struct CThreadSampler::SState {
 
     // -- /proc
 
-    // Of the threads in state R that the processor field puts on a processor, the one that ran
-    // longest since the last look (by the run time in its schedstat) is the one taken to have
-    // had it; a processor without one ran the idle process. The sampler's own thread, running
-    // as it looks, is passed over.
+    // Of the threads in state R that the processor field puts on a processor, one is taken to have
+    // had it, drawn with a chance in proportion to its run time since the last look (schedstat):
+    // so over many looks each thread has its share of the samples. A processor without one ran
+    // the idle process. The sampler's own thread, running as it looks, is passed over.
     void look_at_proc() {
         m_seen.assign(m_cpus, SCandidate());
         m_run_times_now.clear();
@@ -497,7 +500,19 @@ struct CThreadSampler::SState {
         uint64_t const ran =
             before != m_run_times.end() && run_time > before->second ? run_time - before->second : 0;
         SCandidate &seen = m_seen[cpu];
-        if (seen.m_pid == 0 || ran > seen.m_ran) seen = SCandidate{m_pid, _tid, ran};
+        seen.m_ran += ran;
+        if (seen.m_pid == 0 || (ran > 0 && next_random() % seen.m_ran < ran)) {
+            seen.m_pid = m_pid;
+            seen.m_tid = _tid;
+        }
+    }
+
+    // xorshift64: the draws need no quality beyond an even spread.
+    uint64_t next_random() {
+        m_random ^= m_random << 13;
+        m_random ^= m_random >> 7;
+        m_random ^= m_random << 17;
+        return m_random;
     }
 
     bool read_task_file(uint32_t _tid, char const *_name, char *_line, size_t _size) const {
@@ -514,11 +529,12 @@ struct CThreadSampler::SState {
 
     struct SCandidate {
         uint32_t m_pid = 0, m_tid = 0;
-        uint64_t m_ran = 0; // ns on a processor since the last look
+        uint64_t m_ran = 0; // ns on the processor since the last look, of all threads drawn from
     };
     qor_vector<SCandidate> m_seen;                            // by processor, during a look
     qor_map<uint32_t, uint64_t> m_run_times, m_run_times_now; // run time of threads in state R, ns
     uint32_t m_pid = 0;
+    uint64_t m_random = 0x9E3779B97F4A7C15ull;
 
     // -- the thread
 
@@ -640,7 +656,7 @@ CThreadMonitor::CThreadMonitor(IThreadMonitorDevice *_p_device)
 CThreadMonitor::~CThreadMonitor() {
     mp_device->stop();
     mp_device->remove();
-    for (auto &entry : g_thread_names.m_names) {
+    for (auto &entry : thread_names().m_names) {
         qor_free(entry.second);
         entry.second = nullptr;
     }
