@@ -22,6 +22,7 @@
 #include <fcntl.h>
 #include <linux/perf_event.h>
 #include <mutex>
+#include <pthread.h>
 #include <sys/ioctl.h>
 #include <sys/mman.h>
 #include <sys/syscall.h>
@@ -299,6 +300,7 @@ int64_t const k_perf_period_ns = 4000000; // a sample of each processor every 4 
 int const k_perf_drain_ms = 50;           // the kernel's buffers are read this often
 unsigned const k_perf_pages = 8;          // data pages of each processor's buffer
 int const k_proc_period_ms = 20;          // a look at /proc this often
+size_t const k_proc_threads_room = 4096;  // threads in state R that a look keeps the run times of
 
 int64_t monotonic_ns() {
     timespec now;
@@ -354,7 +356,15 @@ struct CThreadSampler::SState {
     std::mutex m_mutex; // the rings and m_running, between the sampling thread and the others
     std::condition_variable m_wake;
     bool m_running = false;
-    std::thread m_thread;
+    // A thread of the system's own making: std::thread would put its start record on the library's
+    // heap and free it on the new thread.
+    pthread_t m_thread;
+    bool m_started = false;
+
+    static void *thread_main(void *_p_state) {
+        static_cast<SState *>(_p_state)->run();
+        return nullptr;
+    }
     std::atomic<uint32_t> m_thread_id{0};
     SRing m_rings[k_ring_count];
 
@@ -458,7 +468,7 @@ struct CThreadSampler::SState {
     // so over many looks each thread has its share of the samples. A processor without one ran
     // the idle process. The sampler's own thread, running as it looks, is passed over.
     void look_at_proc() {
-        m_seen.assign(m_cpus, SCandidate());
+        std::fill(m_seen.begin(), m_seen.end(), SCandidate());
         m_run_times_now.clear();
         int64_t const now = qorplatform::read_hardware_time_stamp_counter();
         qorplatform::for_each_process_id(
@@ -473,6 +483,7 @@ struct CThreadSampler::SState {
                     p_self);
             },
             this);
+        std::sort(m_run_times_now.begin(), m_run_times_now.end(), SRunTime::by_thread);
         m_run_times.swap(m_run_times_now);
         for (unsigned cpu = 0; cpu < m_cpus; ++cpu)
             write(cpu, SThreadSample{m_seen[cpu].m_pid, m_seen[cpu].m_tid, now});
@@ -495,10 +506,13 @@ struct CThreadSampler::SState {
         unsigned const cpu = unsigned(strtoul(p_field, nullptr, 10));
         if (cpu >= m_cpus || !read_task_file(_tid, "schedstat", line, sizeof(line))) return;
         uint64_t const run_time = strtoull(line, nullptr, 10);
-        m_run_times_now[_tid] = run_time;
-        auto before = m_run_times.find(_tid);
-        uint64_t const ran =
-            before != m_run_times.end() && run_time > before->second ? run_time - before->second : 0;
+        if (m_run_times_now.size() < m_run_times_now.capacity())
+            m_run_times_now.push_back(SRunTime{_tid, run_time});
+        auto before =
+            std::lower_bound(m_run_times.begin(), m_run_times.end(), SRunTime{_tid, 0}, SRunTime::by_thread);
+        uint64_t const ran = before != m_run_times.end() && before->m_tid == _tid && run_time > before->m_ns
+                                 ? run_time - before->m_ns
+                                 : 0;
         SCandidate &seen = m_seen[cpu];
         seen.m_ran += ran;
         if (seen.m_pid == 0 || (ran > 0 && next_random() % seen.m_ran < ran)) {
@@ -531,8 +545,24 @@ struct CThreadSampler::SState {
         uint32_t m_pid = 0, m_tid = 0;
         uint64_t m_ran = 0; // ns on the processor since the last look, of all threads drawn from
     };
-    qor_vector<SCandidate> m_seen;                            // by processor, during a look
-    qor_map<uint32_t, uint64_t> m_run_times, m_run_times_now; // run time of threads in state R, ns
+    // The run times of the threads in state R at the last look, by id, and of this one.
+    struct SRunTime {
+        uint32_t m_tid;
+        uint64_t m_ns;
+        static bool by_thread(SRunTime const &_a, SRunTime const &_b) { return _a.m_tid < _b.m_tid; }
+    };
+    // The room of these is made before the sampling thread starts, which must not allocate: the
+    // library's heap belongs to the thread that drives the library.
+    qor_vector<SCandidate> m_seen; // by processor, during a look
+    qor_vector<SRunTime> m_run_times, m_run_times_now;
+
+    void make_room() {
+        m_seen.assign(m_cpus, SCandidate());
+        m_run_times.clear();
+        m_run_times_now.clear();
+        m_run_times.reserve(k_proc_threads_room);
+        m_run_times_now.reserve(k_proc_threads_room);
+    }
     uint32_t m_pid = 0;
     uint64_t m_random = 0x9E3779B97F4A7C15ull;
 
@@ -584,13 +614,19 @@ void CThreadSampler::install() {
 
 void CThreadSampler::start() {
     SState &state = *mp_state;
-    if (state.m_source == SOURCE_NONE || state.m_thread.joinable()) return;
+    if (state.m_source == SOURCE_NONE || state.m_started) return;
     state.m_running = true;
+    state.make_room();
     if (state.m_source == SOURCE_PERF) {
         state.m_clock_map.begin();
         state.enable_events();
     }
-    state.m_thread = std::thread([&state] { state.run(); });
+    if (pthread_create(&state.m_thread, nullptr, SState::thread_main, &state) != 0) {
+        state.m_running = false;
+        state.disable_events();
+        return;
+    }
+    state.m_started = true;
     while (!state.m_thread_id)
         std::this_thread::yield();
     CThreadMonitor::set_thread_name(state.m_thread_id, "Thread_Sampler");
@@ -598,13 +634,14 @@ void CThreadSampler::start() {
 
 void CThreadSampler::stop() {
     SState &state = *mp_state;
-    if (!state.m_thread.joinable()) return;
+    if (!state.m_started) return;
     {
         std::lock_guard<std::mutex> lock(state.m_mutex);
         state.m_running = false;
     }
     state.m_wake.notify_all();
-    state.m_thread.join();
+    pthread_join(state.m_thread, nullptr);
+    state.m_started = false;
     state.m_thread_id = 0;
     state.disable_events();
 }
@@ -617,7 +654,7 @@ void CThreadSampler::remove() {
 
 bool CThreadSampler::fetch(unsigned char *_p_buffer) {
     SState &state = *mp_state;
-    if (!QOR_CHECK(_p_buffer) || !state.m_thread.joinable()) return false;
+    if (!QOR_CHECK(_p_buffer) || !state.m_started) return false;
     std::lock_guard<std::mutex> lock(state.m_mutex);
     for (unsigned ring = 0; ring < k_ring_count; ++ring)
         state.m_rings[ring].copy_to(_p_buffer + ring * k_ring_section_bytes);
