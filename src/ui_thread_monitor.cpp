@@ -563,7 +563,7 @@ struct CThreadSampler::SState {
         m_run_times.reserve(k_proc_threads_room);
         m_run_times_now.reserve(k_proc_threads_room);
     }
-    uint32_t m_pid = 0;
+    uint32_t m_pid = 0; // the process whose threads a look goes through
     uint64_t m_random = 0x9E3779B97F4A7C15ull;
 
     // -- the thread
