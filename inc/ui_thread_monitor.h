@@ -46,10 +46,14 @@ static_assert(sizeof(SThreadSample) == 16, "a sample is 16 bytes in the rings");
 class IThreadMonitorDevice {
 public:
     virtual ~IThreadMonitorDevice() {}
+    // Makes the device ready to record (the sampler opens its sources), then starts recording;
+    // stop and remove undo them in the reverse order.
+    // @{
     virtual void install() = 0;
     virtual void start() = 0;
     virtual void stop() = 0;
     virtual void remove() = 0;
+    // @}
     // Copies the four rings with their heads into _p_buffer of k_ring_buffer_bytes. False when the
     // device can't be reached (not installed or not running): the buffer is left alone then.
     virtual bool fetch(unsigned char *_p_buffer) = 0;
@@ -64,6 +68,7 @@ public:
 // named "Thread_Sampler" in the monitor's map.
 class CThreadSampler : public IThreadMonitorDevice {
 public:
+    // Where the samples come from.
     enum ESource {
         SOURCE_BEST, // the kernel's events where allowed, else /proc
         SOURCE_PERF, // the kernel's processor-clock events
@@ -71,16 +76,21 @@ public:
         SOURCE_NONE, // not installed, or nothing could be opened
     };
 
+    // A sampler that will use _wanted at install: SOURCE_PROC to leave the kernel's events alone.
     explicit CThreadSampler(ESource _wanted = SOURCE_BEST);
     ~CThreadSampler() override;
     CThreadSampler(CThreadSampler const &) = delete;
     CThreadSampler &operator=(CThreadSampler const &) = delete;
 
-    // install opens the kernel's events (or settles on /proc); remove closes them.
+    // install opens the kernel's events (or settles on /proc) and remove closes them; start and
+    // stop run and end the sampling thread.
+    // @{
     void install() override;
     void start() override;
     void stop() override;
     void remove() override;
+    // @}
+    // The rings as the sampling thread has filled them so far.
     bool fetch(unsigned char *_p_buffer) override;
 
     // Where the samples come from after install.
@@ -99,14 +109,19 @@ private:
 //   PROCESS THREAD TIME  one record, in slot order from slot 0
 class CThreadRingsRecording : public IThreadMonitorDevice {
 public:
+    // An empty recording: every slot zero.
     CThreadRingsRecording();
     // A recording of the buffer given, k_ring_buffer_bytes long.
     explicit CThreadRingsRecording(unsigned char const *_p_buffer);
 
+    // A recording has nothing to install or run.
+    // @{
     void install() override {}
     void start() override {}
     void stop() override {}
     void remove() override {}
+    // @}
+    // The recorded buffer, the same at every fetch.
     bool fetch(unsigned char *_p_buffer) override;
 
     // Reads a recording file; false with the reason in _error (file and line) on a bad one, and the
@@ -116,10 +131,15 @@ public:
     bool save(char const *_path) const;
 
     // The buffer, as a device would give it.
+    // @{
     unsigned char const *get_buffer() const { return m_buffer.data(); }
     void set_buffer(unsigned char const *_p_buffer);
+    // @}
+    // The process that the recording watched.
+    // @{
     uint32_t get_process_id() const { return m_process_id; }
     void set_process_id(uint32_t _process_id) { m_process_id = _process_id; }
+    // @}
 
 private:
     qor_vector<unsigned char> m_buffer;
@@ -130,6 +150,7 @@ private:
 // The monitor
 // ---------------------------------------------------------------------------------------------
 
+// A process of the machine, as update_processes lists it.
 struct SProcessInfo {
     uint32_t m_id;    // the process id
     char m_name[260]; // the executable's name, terminated
@@ -137,15 +158,18 @@ struct SProcessInfo {
 
 // A bar of a thread's activity: columns of the bar's width, m_end inclusive.
 struct SActivitySegment {
-    uint16_t m_begin;
-    uint16_t m_end;
+    uint16_t m_begin; // the first column
+    uint16_t m_end;   // the last column
 };
 
+// Which thread had a processor when: the samples of a device merged by time, and a thread's
+// activity from them.
 class CThreadMonitor {
 public:
     // Installs and starts _p_device, which must outlive the monitor; with none, a CThreadSampler
     // of the monitor's own. The thread that makes the monitor is named "Main_Thread".
     explicit CThreadMonitor(IThreadMonitorDevice *_p_device = nullptr);
+    // Stops and removes the device.
     ~CThreadMonitor();
     CThreadMonitor(CThreadMonitor const &) = delete;
     CThreadMonitor &operator=(CThreadMonitor const &) = delete;
@@ -155,10 +179,15 @@ public:
     bool refresh(int *_p_status);
 
     // Fill get_processes() and get_threads() from the machine's list; empty when it can't be read.
+    // @{
     void update_processes();
     void update_threads(unsigned _process_id);
+    // @}
+    // The lists that the last updates filled: the machine's processes and the threads of one.
+    // @{
     qor_vector<SProcessInfo> const &get_processes() const { return m_processes; }
     qor_vector<unsigned> const &get_threads() const { return m_threads; }
+    // @}
 
     // The bars of one thread over the last _period half seconds, drawn _width columns wide, and its
     // busy share of the period in thousandths. _thread_id -1 stands for every other process but the
@@ -173,9 +202,11 @@ public:
     int64_t get_ticks_per_second() const { return m_ticks_per_second; }
 
     // The map of thread names, which exists without a monitor. Names are set on one thread at a
-    // time; a name is copied.
+    // time; a name is copied. The second form names the calling thread.
+    // @{
     static void set_thread_name(unsigned _thread_id, char const *_name);
     static void set_current_thread_name(char const *_name);
+    // @}
     // "System/Other" for -1, the stored name, or "Unknown".
     static char const *get_thread_name(unsigned _thread_id);
 

@@ -57,14 +57,18 @@ void message_box(char const *_text, char const *_caption);
 // ---------------------------------------------------------------------------------------------
 
 // The kernel's ids of the calling thread and of its process.
+// @{
 uint32_t get_current_thread_id();
 uint32_t get_current_process_id();
+// @}
 
 // The calling thread's processors as a mask of processors 0 to 63. Setting gives the mask before
 // the change, or 0 when the kernel refuses it (a processor that the thread may not use); the
 // thread then stays where it was allowed to run.
+// @{
 uint64_t get_thread_affinity_mask();
 uint64_t set_thread_affinity_mask(uint64_t _mask);
+// @}
 // Gives up the rest of the thread's time slice, so that a new affinity takes effect.
 void yield_thread();
 
@@ -79,12 +83,16 @@ int64_t read_hardware_time_stamp_counter();
 // Each process of the machine from /proc: its id and the file name of its executable (the
 // kernel's short name for a process without one, such as a kernel thread). False when /proc can't
 // be read, and nothing was visited.
+// @{
 typedef void (*process_visitor_t)(uint32_t _id, char const *_name, void *_user);
 bool for_each_process(process_visitor_t _visit, void *_user);
+// @}
 // The same, ids only, for callers that look at many processes often.
+// @{
 typedef void (*id_visitor_t)(uint32_t _id, void *_user);
 bool for_each_process_id(id_visitor_t _visit, void *_user);
-// Each thread of the process _process_id from /proc/<id>/task, in the kernel's order. False when
+// @}
+// Each thread of the process _process_id from /proc/ID/task, in the kernel's order. False when
 // the process's task folder can't be read.
 bool for_each_thread(uint32_t _process_id, id_visitor_t _visit, void *_user);
 
