@@ -284,3 +284,17 @@ TEST(HostEndToEnd, AnImportedChildOfAnUnregisteredClassIsNamedInTheLog) {
     EXPECT_EQ(std::string::npos, back.find("ghost"));
     EXPECT_NE(std::string::npos, back.find("\"label\""));
 }
+
+// The thread strip over the demo scene on a recorded session of the host, so that the picture is
+// the same on every machine: a row for each of the recording's threads by the names it gave them,
+// and the rest of the system last. A recording that can't be read is reported and shows nothing.
+TEST(HostEndToEnd, TheThreadStripReplaysARecordingOverTheScene) {
+    std::string const recording = qortest::source_dir() + "/tests/host/thread_rings.txt";
+    SRun const run = run_host({"--script", script("command gameui_threads " + recording +
+                                                  "\nwait 12\nscreenshot threads.png\n"
+                                                  "command gameui_threads /no/such/rings.txt\n")});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    run.expect_golden("threads.png", "thread_strip_replayed_1024x768");
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Cannot open '/no/such/rings.txt'"))
+        << run.m_result.m_output;
+}
