@@ -40,22 +40,26 @@ class CMaterial;
 // through this interface.
 class IGraphProfiler {
 public:
-    // A stretch of code: enter_node opens the child _id of the innermost open node (made at its first
-    // entry), exit_node closes the innermost one. Both do nothing while measuring is off.
+    // Opens the child _id of the innermost open node, made at its first entry; nothing while
+    // measuring is off.
     virtual void enter_node(HUID const &_id) = 0;
+    // Closes the innermost open node and adds its time; nothing while measuring is off.
     virtual void exit_node() = 0;
     // Forgets the open stretches; nodes and their times stay.
     virtual void reset() = 0;
-    // Measuring on and off. start belongs outside all stretches: no node may be open then.
+    // Measuring on. It belongs outside all stretches: no node may be open then.
     virtual void start() = 0;
+    // Measuring off; the nodes keep their data, and open stretches stay open.
     virtual void stop() = 0;
     // Shows the window and makes it the active one, or hides it. A hidden profiler goes on measuring.
     virtual void show(bool _show) = 0;
+    // The object itself.
     virtual CGraphProfiler *get_graph_profiler() = 0;
     // Called back on a click in the drop-down list; a hook that does nothing here.
     virtual void on_event_unused_click(CWndEvent const *_p_event) = 0;
 
 protected:
+    // Not deleted through the interface.
     ~IGraphProfiler() {}
 };
 
@@ -72,10 +76,15 @@ typedef qor_map<uint64_t, CGraphProfilerNode> CGraphProfilerNodes;
 // the profiler goes.
 class CGraphProfilerNode {
 public:
+    // Used, with no time and no colour yet. The first node reads the counter's frequency.
     explicit CGraphProfilerNode(HUID const &_id);
+    // Deletes the colour; the children go with the map.
     ~CGraphProfilerNode();
+    // A node keeps its address: never copied.
+    // @{
     CGraphProfilerNode(CGraphProfilerNode const &) = delete;
     CGraphProfilerNode &operator=(CGraphProfilerNode const &) = delete;
+    // @}
 
     HUID m_id;                      // the short name and its hash
     string m_full_name;             // the short names from the top down joined by "."; "root" alone
@@ -93,15 +102,18 @@ public:
 // CGraphProfiler
 // ---------------------------------------------------------------------------------------------
 
+// The dialog that draws the tree's per-frame times, one band per node shown.
 class CGraphProfiler : public IGraphProfiler, public CDialog {
 public:
     // Off, always on top, with the drop-down list "unused nodes" across its top.
     CGraphProfiler(CDesktop *_p_desktop, char const *_name);
+    // The nodes and their colours go with the root; the drop-down list with the window tree.
     virtual ~CGraphProfiler();
 
     QOR_CLASS_ID(CGraphProfiler, CDialog, "GraphProfiler")
 
-    // IGraphProfiler: the same object as the window
+    // IGraphProfiler, on the same object as the window.
+    // @{
     void enter_node(HUID const &_id) override;
     void exit_node() override;
     void reset() override;
@@ -110,16 +122,23 @@ public:
     void show(bool _show) override;
     CGraphProfiler *get_graph_profiler() override { return this; }
     void on_event_unused_click(CWndEvent const *) override {}
+    // @}
 
     // The tree and the display, for the owner and for tests
+
+    // Whether measuring is on.
     bool is_active() const { return m_active_mode; }
+    // The root, timed from update to update, with the tree below it.
     CGraphProfilerNode &get_root() { return m_root; }
     // The nodes drawn, from the bottom band up, as the last update that rebuilt them found them.
     qor_vector<CGraphProfilerNode *> const &get_used_nodes() const { return m_used_nodes; }
+    // The nodes entered and not yet left.
     unsigned int get_open_nodes_count() const { return static_cast<unsigned int>(m_stack.size()); }
+    // Samples per node: the window's width at the last update, at least 1.
     unsigned int get_history_size() const { return m_history_size; }
     // The band under the pointer counted from the top; 0xFFFFFFFF for none.
     unsigned int get_pointed_idx() const { return m_pointed_idx; }
+    // The drop-down list of the nodes taken out of the display.
     CDropDownList *get_unused_nodes() { return mp_unused_nodes; }
 
 protected:
