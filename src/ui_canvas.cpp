@@ -300,7 +300,8 @@ void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
     int x_cur = _x;
     size_t const length = _string.length();
     for (size_t i = 0; i < length; ++i) {
-        if (m_tags_enable && _string[i] == '<' && i + 2 < length && _string.find('>', i + 1) != wstring::npos) {
+        if (m_tags_enable && _string[i] == '<' && i + 2 < length &&
+            _string.find('>', i + 1) != wstring::npos) {
             i = read_tag(_string, i, base, current);
             faded = current;
             fade_color(faded);
@@ -312,7 +313,8 @@ void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
         if (meets(visible, l, t, r, b)) {
             if (!material_set) p_render->set_material(p_material->get_material_handle());
             material_set = true;
-            quad(p_render, l, t, r, b, p_char->x, p_char->y, p_char->x + p_char->w, p_char->y + height, faded);
+            quad(p_render, l, t, r, b, p_char->x, p_char->y, p_char->x + p_char->w, p_char->y + height,
+                 faded);
         } else if (pen_only_grows && l >= visible.m_r) {
             break;
         }

@@ -279,6 +279,11 @@ bool CWindowVisual::filter_event(CWndEvent const *_p_event) {
     return CWindow::filter_event(_p_event);
 }
 
+// A sound may hang on the test itself.
+bool CWindowVisual::is_hit_test_needed(CWndEvent const *_p_event) {
+    return !m_sounds.empty() || CWindow::is_hit_test_needed(_p_event);
+}
+
 void CWindowVisual::on_event(CWndEvent const *_p_event) {
     CWindow::on_event(_p_event);
     play_sounds(_p_event);

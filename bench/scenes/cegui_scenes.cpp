@@ -98,12 +98,13 @@ int main() {
     scenes::print_value("cegui", "MEM_allocs/btn",
                         static_cast<double>(after.m_allocations - before.m_allocations) / scenes::k_buttons);
 
-    scenes::print("cegui", "S1_frame", scenes::measure(
-                                           [p_scene] {
-                                               p_scene->invalidate(true);
-                                               frame();
-                                           },
-                                           100, 1, 5));
+    scenes::print("cegui", "S1_frame",
+                  scenes::measure(
+                      [p_scene] {
+                          p_scene->invalidate(true);
+                          frame();
+                      },
+                      100, 1, 5));
     scenes::SSummary const cached = scenes::measure(frame, 300);
     scenes::print("cegui", "S1_frame_cached", cached);
     scenes::print_value("cegui", "MEM_allocs/frm", cached.m_allocations);
@@ -115,12 +116,13 @@ int main() {
         context.injectMousePosition(static_cast<float>(x), static_cast<float>(y));
     };
     scenes::print("cegui", "S2_move", scenes::measure(move, 300, 20));
-    scenes::print("cegui", "S2_move+frame", scenes::measure(
-                                                [&move] {
-                                                    move();
-                                                    frame();
-                                                },
-                                                300));
+    scenes::print("cegui", "S2_move+frame",
+                  scenes::measure(
+                      [&move] {
+                          move();
+                          frame();
+                      },
+                      300));
 
     // S3: the scene written as a layout file once, then loaded, attached and destroyed.
     char folder[] = "/tmp/cegui_scenes_XXXXXX";
@@ -130,7 +132,8 @@ int main() {
         static_cast<DefaultResourceProvider *>(System::getSingleton().getResourceProvider())
             ->setResourceGroupDirectory("scenes", std::string(folder) + "/");
         auto load = [p_root] {
-            Window *p_loaded = WindowManager::getSingleton().loadLayoutFromFile("scene_buttons.layout", "scenes");
+            Window *p_loaded =
+                WindowManager::getSingleton().loadLayoutFromFile("scene_buttons.layout", "scenes");
             p_root->addChild(p_loaded);
             destroy(p_loaded);
         };
@@ -154,12 +157,13 @@ int main() {
     p_text->setProperty("VertFormatting", "TopAligned");
     p_root->addChild(p_text);
     frame();
-    scenes::print("cegui", "S4_frame", scenes::measure(
-                                           [p_text] {
-                                               p_text->invalidate(true);
-                                               frame();
-                                           },
-                                           100, 1, 5));
+    scenes::print("cegui", "S4_frame",
+                  scenes::measure(
+                      [p_text] {
+                          p_text->invalidate(true);
+                          frame();
+                      },
+                      100, 1, 5));
     scenes::print("cegui", "S4_frame_cached", scenes::measure(frame, 300));
 
     NullRenderer::destroySystem();

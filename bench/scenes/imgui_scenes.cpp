@@ -125,15 +125,15 @@ int main() {
     scenes::print_value("imgui", "S1_quads", static_cast<double>(g_copy.quads()));
 
     uint64_t k = 0;
-    scenes::print("imgui", "S2_move+frame", scenes::measure(
-                                                 [&k] {
-                                                     int x, y;
-                                                     scenes::button_centre(scenes::move_target(++k), x, y);
-                                                     ImGui::GetIO().MousePos =
-                                                         ImVec2(static_cast<float>(x), static_cast<float>(y));
-                                                     buttons_frame(scenes::k_buttons);
-                                                 },
-                                                 300));
+    scenes::print("imgui", "S2_move+frame",
+                  scenes::measure(
+                      [&k] {
+                          int x, y;
+                          scenes::button_centre(scenes::move_target(++k), x, y);
+                          ImGui::GetIO().MousePos = ImVec2(static_cast<float>(x), static_cast<float>(y));
+                          buttons_frame(scenes::k_buttons);
+                      },
+                      300));
 
     scenes::print("imgui", "S4_frame", scenes::measure(text_frame, 300));
     ImGui::DestroyContext();

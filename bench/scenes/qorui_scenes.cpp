@@ -146,12 +146,13 @@ void measure_buttons(CDesktop &_desktop, CVertexCopyRenderer &_renderer) {
     };
     if (wanted("S2")) {
         scenes::print("qorui", "S2_move", scenes::measure(move, 300, 20));
-        scenes::print("qorui", "S2_move+frame", scenes::measure(
-                                                     [&] {
-                                                         move();
-                                                         frame(_desktop);
-                                                     },
-                                                     300));
+        scenes::print("qorui", "S2_move+frame",
+                      scenes::measure(
+                          [&] {
+                              move();
+                              frame(_desktop);
+                          },
+                          300));
     }
     delete p_root;
 }

@@ -39,7 +39,8 @@ struct SRect {
 
 // Button _index from 0, row by row from the top left.
 inline SRect button_rect(int _index) {
-    return SRect{(_index % k_columns) * k_button_w, (_index / k_columns) * k_button_h, k_button_w, k_button_h};
+    return SRect{(_index % k_columns) * k_button_w, (_index / k_columns) * k_button_h, k_button_w,
+                 k_button_h};
 }
 
 // "Button0001" for the button of index 0.
@@ -116,8 +117,10 @@ SSummary measure(TBody &&_body, size_t _samples, size_t _batch = 1, size_t _warm
     uint64_t const allocations = heap_count().m_allocations - allocations_before; // times was reserved
     std::sort(times.begin(), times.end());
     auto at = [&times](double _q) { return times[static_cast<size_t>(_q * (times.size() - 1))]; };
-    return SSummary{at(0.5),  times.front(), at(0.1), at(0.9), at(0.99),
-                    static_cast<double>(allocations) / static_cast<double>(_samples * _batch), _samples};
+    return SSummary{at(0.5),  times.front(),
+                    at(0.1),  at(0.9),
+                    at(0.99), static_cast<double>(allocations) / static_cast<double>(_samples * _batch),
+                    _samples};
 }
 
 // One line per measurement, the same columns in every program:
