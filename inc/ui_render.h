@@ -88,10 +88,6 @@ private:
     virtual void end_draw_3d();
 
     vec2_t to_device(point_t const &_p) const;
-    float device_x(int _x) const;
-    float device_y(int _y) const;
-    vec2_t to_device_beside(point_t const &_p, point_t const &_a, vec2_t const &_a_device, point_t const &_b,
-                            vec2_t const &_b_device) const;
     bool has_render() const;
     SPixelRect desktop_area() const { return SPixelRect{0, 0, m_res_w, m_res_h}; }
 

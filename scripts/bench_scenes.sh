@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Runs the side-by-side scene benchmarks of bench/scenes and writes bench/scenes/RESULTS.md.
 # Installs the peer libraries' Debian packages if they are missing (libcegui-mk2-dev,
-# libimgui-dev), builds a Release tree in build-scenes/ with QOR_BENCH_PEERS on, then runs every
+# libimgui-dev), builds a RelWithDebInfo tree (as the test build) in build-scenes/ with QOR_BENCH_PEERS on, then runs every
 # program pinned to one core, three repeats interleaved (qorui, cegui, imgui, qorui, ...). The
 # table holds the median of each program's three medians and qorui's ratio to each peer.
 #   scripts/bench_scenes.sh [core]     (core defaults to the last one)
@@ -18,7 +18,7 @@ if [ ${#missing[@]} -gt 0 ]; then
   $sudo apt-get update -qq
   DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y -qq --no-install-recommends "${missing[@]}"
 fi
-cmake -S . -B build-scenes -G Ninja -DCMAKE_BUILD_TYPE=Release -DQOR_BENCH_PEERS=ON -DQOR_BUILD_TESTS=OFF \
+cmake -S . -B build-scenes -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo -DQOR_BENCH_PEERS=ON -DQOR_BUILD_TESTS=OFF \
   ${CMAKE_CXX_COMPILER_LAUNCHER:+-DCMAKE_CXX_COMPILER_LAUNCHER=$CMAKE_CXX_COMPILER_LAUNCHER} > /dev/null
 cmake --build build-scenes -j "$(nproc)" --target qorui_scenes cegui_scenes imgui_scenes
 out=build-scenes/scenes-out

@@ -27,6 +27,16 @@ SPixelRect bounds(SPixelRect const &_a, SPixelRect const &_b) {
                       std::max(_a.m_b, _b.m_b)};
 }
 
+// No half-pixel offset: the desktop's corners are exactly (-1, 1) and (1, -1). In double, a
+// product by 2 / size gives the float of (p / size - 0.5) * 2 to the last bit, without a division.
+float device_x(int _x, int _res_w) {
+    return static_cast<float>(_x * (2.0 / _res_w) - 1.0);
+}
+
+float device_y(int _y, int _res_h) {
+    return static_cast<float>(1.0 - _y * (2.0 / _res_h));
+}
+
 } // namespace
 
 CRender::CRender()
@@ -54,27 +64,8 @@ bool CRender::has_render() const {
     return QOR_CHECK(mp_render);
 }
 
-// No half-pixel offset: the desktop's corners are exactly (-1, 1) and (1, -1). In double, a
-// product by 2 / size gives the float of (p / size - 0.5) * 2 to the last bit, without a division.
 vec2_t CRender::to_device(point_t const &_p) const {
-    return vec2_t{device_x(_p.x), device_y(_p.y)};
-}
-
-float CRender::device_x(int _x) const {
-    return static_cast<float>(_x * (2.0 / m_res_w) - 1.0);
-}
-
-float CRender::device_y(int _y) const {
-    return static_cast<float>(1.0 - _y * (2.0 / m_res_h));
-}
-
-// The corners of a quad share their coordinates with their neighbours, as an upright rectangle's
-// do: a coordinate equal to one of two corners converted before is taken from there.
-vec2_t CRender::to_device_beside(point_t const &_p, point_t const &_a, vec2_t const &_a_device,
-                                 point_t const &_b, vec2_t const &_b_device) const {
-    float const x = _p.x == _a.x ? _a_device.x : _p.x == _b.x ? _b_device.x : device_x(_p.x);
-    float const y = _p.y == _a.y ? _a_device.y : _p.y == _b.y ? _b_device.y : device_y(_p.y);
-    return vec2_t{x, y};
+    return vec2_t{device_x(_p.x, m_res_w), device_y(_p.y, m_res_h)};
 }
 
 // The outermost begin starts the frame's figures, and its end keeps them.
@@ -148,10 +139,21 @@ void CRender::draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_
                         vec2_t const &_t0, vec2_t const &_t1, vec2_t const &_t2, vec2_t const &_t3,
                         rgba_t const &_c0, rgba_t const &_c1, rgba_t const &_c2, rgba_t const &_c3) {
     if (!has_render()) return;
+    // The corners share their coordinates with their neighbours, as an upright rectangle's do: a
+    // coordinate equal to one converted before is taken from there.
+    auto beside = [this](point_t const &_p, point_t const &_a, vec2_t const &_a_device, point_t const &_b,
+                         vec2_t const &_b_device) {
+        return vec2_t{_p.x == _a.x   ? _a_device.x
+                      : _p.x == _b.x ? _b_device.x
+                                     : device_x(_p.x, m_res_w),
+                      _p.y == _a.y   ? _a_device.y
+                      : _p.y == _b.y ? _b_device.y
+                                     : device_y(_p.y, m_res_h)};
+    };
     vec2_t const d0 = to_device(_p0);
-    vec2_t const d1 = to_device_beside(_p1, _p0, d0, _p0, d0);
-    vec2_t const d2 = to_device_beside(_p2, _p1, d1, _p0, d0);
-    vec2_t const d3 = to_device_beside(_p3, _p2, d2, _p0, d0);
+    vec2_t const d1 = beside(_p1, _p0, d0, _p0, d0);
+    vec2_t const d2 = beside(_p2, _p1, d1, _p0, d0);
+    vec2_t const d3 = beside(_p3, _p2, d2, _p0, d0);
     mp_render->draw_quad(d0, _t0, _c0, d1, _t1, _c1, d2, _t2, _c2, d3, _t3, _c3);
     ++m_frame.m_quads;
 }

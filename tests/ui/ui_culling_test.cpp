@@ -176,3 +176,36 @@ TEST(HitTest, ReachesAChildOutsideItsParentAListenerAndAWiderOwnTest) {
               log.take());
     EXPECT_EQ((std::vector<std::string>{"205,205", "100,100", "305,5"}), heard);
 }
+
+// Children of a layout already in order aren't sorted again; those that aren't are, and a window
+// that isn't visual among them leaves the order to the sort.
+TEST(LayoutOrder, ChildrenKeepTheOrderThatTheSortGivesThem) {
+    struct {
+        char const *mp_children;
+        char const *mp_order;
+    } const rows[] = {
+        {"{ name = 'a', class_name = 'WindowVisual', z_order = 1 }, { name = 'b', class_name = "
+         "'WindowVisual',"
+         " z_order = 5 }, { name = 'c', class_name = 'WindowVisual', z_order = 3 }",
+         "bca"},
+        {"{ name = 'a', class_name = 'WindowVisual', z_order = 9 }, { name = 'b', class_name = "
+         "'WindowVisual' },"
+         " { name = 'c', class_name = 'WindowVisual' }",
+         "abc"},
+        {"{ name = 'a', class_name = 'WindowVisual', z_order = 1 }, { name = 'n', class_name = 'Window' },"
+         " { name = 'c', class_name = 'WindowVisual', z_order = 5 }",
+         "anc"},
+    };
+    for (auto const &row : rows) {
+        SCOPED_TRACE(row.mp_order);
+        qortest::CWorld world(100, 100);
+        CWindowVisual *p_root =
+            world.place(&world.desktop(), new CWindowVisual(&world.desktop(), "root"), 0, 0, 10, 10);
+        qortest::load_state(p_root, std::string("{ name = 'root', class_name = 'WindowVisual', ") +
+                                        row.mp_children + " }");
+        std::string order;
+        for (unsigned i = 0; i < p_root->get_children_count(); ++i)
+            order += p_root->get_child(i)->get_name();
+        EXPECT_EQ(row.mp_order, order);
+    }
+}
