@@ -128,7 +128,7 @@ protected:
     // Whether the hit test has to reach the window: false only when neither the window nor a child
     // could report the point and nothing else listens. A class whose on_event or
     // on_event_report_point_inside does more than the default answers true.
-    virtual bool is_hit_test_needed(CWndEvent const *_p_event);
+    virtual bool is_hit_test_needed(point_t const &_global);
 
     virtual void on_event_update(CWndEvent const *_p_event);
     virtual void on_event_draw(CWndEvent const *_p_event);
@@ -198,6 +198,7 @@ private:
 
     typedef void (CWindow::*handler_t)(CWndEvent const *);
     static handler_t handler_of(EEventType _id);
+    void pass_hit_test(CWndEvent const *_p_event);
     void align_in_parent();
     void load_children(LuaPlus::LuaObject &_lo_table);
     void load_child(LuaPlus::LuaObject &_lo_child);

@@ -104,7 +104,7 @@ protected:
     // Routing and handlers
     virtual void on_event(CWndEvent const *_p_event) override;
     virtual bool filter_event(CWndEvent const *_p_event) override;
-    virtual bool is_hit_test_needed(CWndEvent const *_p_event) override;
+    virtual bool is_hit_test_needed(point_t const &_global) override;
     virtual void on_event_update(CWndEvent const *_p_event) override;
     virtual void on_event_draw(CWndEvent const *_p_event) override;
     virtual void on_event_show(CWndEvent const *_p_event) override;

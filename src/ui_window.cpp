@@ -156,12 +156,13 @@ void CWindow::on_event(CWndEvent const *_p_event) {
     dispatch_event(_p_event);
     switch (_p_event->get_dispatch_type()) {
     case CWndEvent::DISPATCH_CHILDREN:
-        // The end is read anew behind each child. The hit test passes by the children that can't
-        // report its point.
+        if (_p_event->get_id() == EVENT_REPORT_POINT_INSIDE) {
+            pass_hit_test(_p_event);
+            break;
+        }
+        // The end is read anew behind each child.
         for (size_t i = 0; i < m_children.size(); ++i)
-            if (_p_event->get_id() != EVENT_REPORT_POINT_INSIDE ||
-                m_children[i]->is_hit_test_needed(_p_event))
-                m_children[i]->on_event(_p_event);
+            m_children[i]->on_event(_p_event);
         break;
     case CWndEvent::DISPATCH_PARENT:
         if (mp_parent) mp_parent->send_event(mp_parent, _p_event, CWndEvent::DISPATCH_PARENT);
@@ -301,13 +302,26 @@ void CWindow::on_event_drag(CWndEvent const *_p_event) {
     set_pos(pos.x + movement.x, pos.y + movement.y);
 }
 
+// The hit test goes on only to the children that could report its point or that listen to it. The
+// point is read again behind each child that took the test: its callbacks may overwrite it.
+void CWindow::pass_hit_test(CWndEvent const *_p_event) {
+    auto point = [_p_event] {
+        _p_event->rewind();
+        return _p_event->get<point_t>();
+    };
+    point_t global = point();
+    for (size_t i = 0; i < m_children.size(); ++i) {
+        if (!m_children[i]->is_hit_test_needed(global)) continue;
+        m_children[i]->on_event(_p_event);
+        global = point();
+    }
+}
+
 // Children may stand outside the window, and anything that listens to the test must hear it.
-bool CWindow::is_hit_test_needed(CWndEvent const *_p_event) {
+bool CWindow::is_hit_test_needed(point_t const &_global) {
     if (!m_children.empty() || has_callbacks(EVENT_REPORT_POINT_INSIDE)) return true;
-    _p_event->rewind();
-    point_t const global = _p_event->get<point_t>();
     calc_global_pos();
-    return is_point_inside(global);
+    return is_point_inside(_global);
 }
 
 void CWindow::on_event_report_point_inside(CWndEvent const *_p_event) {

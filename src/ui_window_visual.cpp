@@ -289,8 +289,8 @@ bool CWindowVisual::filter_event(CWndEvent const *_p_event) {
 }
 
 // A sound may hang on the test itself.
-bool CWindowVisual::is_hit_test_needed(CWndEvent const *_p_event) {
-    return !m_sounds.empty() || CWindow::is_hit_test_needed(_p_event);
+bool CWindowVisual::is_hit_test_needed(point_t const &_global) {
+    return !m_sounds.empty() || CWindow::is_hit_test_needed(_global);
 }
 
 void CWindowVisual::on_event(CWndEvent const *_p_event) {
