@@ -28,6 +28,7 @@ ROWS = [
     ("MEM_allocs/btn", "heap allocations per button"),
     ("MEM_allocs/frm", "heap allocations per steady frame"),
     ("S1_quads", "quads of an S1 frame"),
+    ("S4_quads", "quads of an S4 frame"),
 ]
 # (description, qorui's scene, peer, peer's scene, largest ratio)
 TARGETS = [

@@ -136,6 +136,7 @@ int main() {
                       300));
 
     scenes::print("imgui", "S4_frame", scenes::measure(text_frame, 300));
+    scenes::print_value("imgui", "S4_quads", static_cast<double>(g_copy.quads()));
     ImGui::DestroyContext();
     return 0;
 }

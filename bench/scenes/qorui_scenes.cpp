@@ -174,10 +174,11 @@ void measure_layout(CDesktop &_desktop) {
     rmdir(folder);
 }
 
-void measure_text(CDesktop &_desktop) {
+void measure_text(CDesktop &_desktop, CVertexCopyRenderer &_renderer) {
     CEditBox *p_box = add_text_window(_desktop);
     wait_for_fades(_desktop);
     scenes::print("qorui", "S4_frame", scenes::measure([&] { frame(_desktop); }, 300));
+    scenes::print_value("qorui", "S4_quads", static_cast<double>(_renderer.quads()));
     delete p_box;
 }
 
@@ -194,6 +195,6 @@ int main(int _argc, char **_argv) {
     gp_only = _argc > 1 ? _argv[1] : nullptr;
     if (wanted("S1") || wanted("S2")) measure_buttons(bench.desktop(), renderer);
     if (wanted("S3")) measure_layout(bench.desktop());
-    if (wanted("S4")) measure_text(bench.desktop());
+    if (wanted("S4")) measure_text(bench.desktop(), renderer);
     return 0;
 }
