@@ -17,6 +17,9 @@ namespace qorhost {
 
 namespace {
 unsigned const k_frame_ms = 16;
+// The shares of a watched frame on the manual clock, in ms: clearing, update, draw, presenting.
+unsigned const k_clear_ms = 1, k_update_ms = 3, k_draw_ms = 7, k_present_ms = 5;
+static_assert(k_clear_ms + k_update_ms + k_draw_ms + k_present_ms == k_frame_ms, "a frame is 16 ms");
 
 bool folder_exists(std::string const &_path) {
     struct stat info;
@@ -40,7 +43,7 @@ CInterfaceServer &new_server() {
 CHost::CHost(SHostOptions const &_options)
     : m_options(_options), m_server(new_server()), m_commands(&m_vars), mp_engine_logger(nullptr),
       m_renderer(_options.m_w, _options.m_h), m_recorder(&m_renderer), mp_active_renderer(&m_renderer),
-      mp_ui(nullptr), m_frame_time(0), m_start_tick(qorplatform::get_tick_count()) {
+      mp_ui(nullptr), mp_frame_timer(nullptr), m_frame_time(0), m_start_tick(qorplatform::get_tick_count()) {
     m_log.set_quiet(m_options.m_quiet);
     mp_engine_logger = m_log.create_logger("Engine", "");
     qorbase::set_log_sink(log_sink, this);
@@ -83,6 +86,7 @@ void CHost::use_renderer(CHostRenderer &_renderer) {
 // modules close while the server they hold on to still stands.
 CHost::~CHost() {
     m_server.withdraw_all();
+    mp_frame_timer = nullptr;
     m_server.close_modules();
     qorbase::set_log_sink(nullptr, nullptr);
     if (m_options.m_manual_clock) qorplatform::set_clock(nullptr);
@@ -136,16 +140,47 @@ void CHost::write_frame(SImage const &_frame, unsigned _index) {
 
 void CHost::frame() {
     if (!mp_ui) return;
+    bool const timed = mp_frame_timer && mp_frame_timer->is_timing();
+    unsigned elapsed_ms = 0;
+    enter_phase(timed, "renderer");
     mp_active_renderer->begin_frame(rgba_t(0, 0, 0, 255));
+    exit_phase(timed, k_clear_ms, elapsed_ms);
+    enter_phase(timed, "update");
     mp_ui->update(static_cast<int>(m_frame_time));
+    exit_phase(timed, k_update_ms, elapsed_ms);
+    enter_phase(timed, "draw");
     mp_ui->draw();
+    exit_phase(timed, k_draw_ms, elapsed_ms);
+    enter_phase(timed, "renderer");
     mp_active_renderer->present();
+    exit_phase(timed, k_present_ms, elapsed_ms);
     if (m_options.m_manual_clock) {
-        m_clock.advance_ms(k_frame_ms);
+        m_clock.advance_ms(k_frame_ms - elapsed_ms);
         m_frame_time += k_frame_ms;
     } else {
         m_frame_time = qorplatform::get_tick_count() - m_start_tick;
     }
+}
+
+void CHost::enter_phase(bool _timed, char const *_phase) {
+    if (_timed) mp_frame_timer->enter(_phase);
+}
+
+// Untimed, the manual clock moves once at the end of the frame, as it always has.
+void CHost::exit_phase(bool _timed, unsigned _share_ms, unsigned &_elapsed_ms) {
+    if (!_timed) return;
+    if (m_options.m_manual_clock) {
+        m_clock.advance_ms(_share_ms);
+        _elapsed_ms += _share_ms;
+    }
+    mp_frame_timer->exit();
+}
+
+bool CHost::load_frame_timer(char const *_library_name) {
+    if (!m_server.open_module(_library_name)) return false;
+    mp_frame_timer = static_cast<IFrameTimer *>(m_server.query_interface(qor_uid::FRAME_TIMER, 1));
+    if (!mp_frame_timer) qordebug::warning("'%s' registered no frame timer", _library_name);
+    return mp_frame_timer != nullptr;
 }
 
 // The configuration's "[host] startup" line, as a game's autoexec: commands separated by ';'.

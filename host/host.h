@@ -5,6 +5,7 @@
 //   lifecycle     load_ui, init, frames of update and draw, shutdown
 #pragma once
 #include "commands.h"
+#include "frame_timer.h"
 #include "input_system.h"
 #include "interface_server.h"
 #include "level_description.h"
@@ -62,6 +63,9 @@ public:
     void finish();
     // One frame: clear, update, draw, present.
     void frame();
+    // Opens a module that registers a frame timer on the server, which then hears of the phases
+    // of every frame; false, with a warning, when the module doesn't load or registers none.
+    bool load_frame_timer(char const *_library_name);
 
     CInterfaceServer &server() { return m_server; }
     CInputSystem &input() { return m_input; }
@@ -90,6 +94,10 @@ private:
     IRenderQOR *served(CHostRenderer *_p_renderer);
     void write_frame(SImage const &_frame, unsigned _index);
     static void log_sink(char const *_line, void *_user);
+    // A phase of the frame: the timer's brackets and, on the manual clock, the phase's share of the
+    // frame's time, which _elapsed_ms adds up.
+    void enter_phase(bool _timed, char const *_phase);
+    void exit_phase(bool _timed, unsigned _share_ms, unsigned &_elapsed_ms);
 
     SHostOptions m_options;
     CInterfaceServer &m_server; // lives to the end of the process
@@ -105,6 +113,7 @@ private:
     CHostRenderer *mp_active_renderer; // the one on the server, or the recorder's target
     qorplatform::CManualClock m_clock;
     qorui::IUserInterface *mp_ui;
+    IFrameTimer *mp_frame_timer; // on the server, from a module; null for none
     unsigned m_frame_time; // handed to update, ms: 16 a frame on the manual clock, else since m_start_tick
     uint32_t m_start_tick; // the system clock's when the host was made
 };

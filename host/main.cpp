@@ -83,6 +83,7 @@ int main(int _argc, char **_argv) {
         fprintf(stderr, "qorhost: libqorui.so could not be loaded\n");
         return 1;
     }
+    host.load_frame_timer("libqorhost_graph_profiler.so"); // the command "graph_profiler"
 #ifdef QORHOST_WITH_SDL2
     if (options.m_window) return qorhost::run_window(host);
 #endif

@@ -13,11 +13,14 @@
 
 namespace qorui {
 
+// A typed first-in-first-out list of values of the types of TL, read back in order and type.
 template <class TL>
 class TDataStreamBase {
 public:
+    // One value of the stream, from the pool of its type list.
     typedef CDataVariantBase<TL> CNode;
 
+    // An empty stream.
     TDataStreamBase() : mp_head(nullptr), mp_tail(nullptr), mp_curr(nullptr) {}
 
     // Copying moves: the target takes the chain and the read position, the source is left empty,
@@ -36,6 +39,7 @@ public:
         _o.forget();
         return *this;
     }
+    // Releases the values.
     virtual ~TDataStreamBase() { release(); }
 
     // Appends a copy of the value. The first node of an empty stream is also the read position;
@@ -68,8 +72,11 @@ public:
         return p_node ? p_node->template get<T>() : data_variant_detail::neutral_value<T>();
     }
 
+    // Moves the read position back to the first value.
     void rewind() const { mp_curr = mp_head; }
+    // Whether the stream holds no value.
     bool is_empty() const { return mp_head == nullptr; }
+    // Whether every value has been read.
     bool end_of_stream() const { return mp_curr == nullptr; }
 
     // Destroys the values from the head on and gives the nodes back from the tail on, as a
@@ -123,6 +130,7 @@ class HUID;
 // The arguments of events.
 typedef Loki::TL::MakeTypelist<int, float, void *, vec2_t, CMaterial *, CFont *, point_t, string, wstring,
                                HUID const *>::Result TWindowStreamTypes;
+// The stream of events.
 typedef TDataStreamBase<TWindowStreamTypes> CWindowDataStream;
 
 } // namespace qorui
@@ -142,6 +150,7 @@ typedef Loki::TL::MakeTypelist<
     int, long long, float, double, void *, vec3_t, matr4_t, string,
     std::basic_string<unsigned short, std::char_traits<unsigned short>, std::allocator<unsigned short>>,
     LuaPlus::LuaObject>::Result TCommonStreamTypes;
+// The stream of list items' user data.
 typedef TDataStreamBase<TCommonStreamTypes> CCommonDataStream;
 
 } // namespace qorui

@@ -25,16 +25,22 @@ class ITimeProfiler;
 // withdraws that interface. Fetch through a getter at each use; never store the result.
 class CEngineInterfaces : public IInterfaceServerListener {
 public:
+    // Empty: no server, nothing cached.
     CEngineInterfaces();
+    // Stops listening to the server.
     virtual ~CEngineInterfaces();
     CEngineInterfaces(CEngineInterfaces const &) = delete;
     CEngineInterfaces &operator=(CEngineInterfaces const &) = delete;
 
     // Subscribes to the server's withdrawals; called by each CUserInterface::init.
     void set_server(IInterfaceServer *_p_server);
+    // The server given by set_server; null before.
     IInterfaceServer *get_server() const { return mp_server; }
 
-    // With _critical true a missing interface is reported as a critical error.
+    // The engine's interface of that kind, fetched at the first call and kept until the engine
+    // withdraws it; null when the server has none. With _critical true a missing interface is
+    // reported as a critical error.
+    // @{
     ILoadProcessor *get_load_processor(bool _critical);
     IInputSystem *get_input_system(bool _critical);
     ISystemTimer *get_system_timer(bool _critical);
@@ -50,6 +56,7 @@ public:
     IServerGameAPI *get_server_game_api(bool _critical);
     ITimeProfiler *get_time_profiler(bool _critical);
     ILogManager *get_log_manager(bool _critical);
+    // @}
 
     // How many pointers are cached now.
     unsigned get_cached_count() const { return static_cast<unsigned>(m_cached.size()); }

@@ -23,15 +23,21 @@ class CStatsPage;
 // The user-interface service: owns the desktop and the stats pages and forwards the engine's input.
 class CUserInterface : public IUserInterface, public IPointerListener, public IKeyListener {
 public:
+    // Sets the fields only; the engine and the server are untouched until init.
     CUserInterface();
+    // Deletes the stats pages, last first, and the desktop if shutdown didn't.
     virtual ~CUserInterface();
     CUserInterface(CUserInterface const &) = delete;
     CUserInterface &operator=(CUserInterface const &) = delete;
 
+    // qor_uid::USER_INTERFACE, version 1.
+    // @{
     SInterfaceUID get_uid() const override { return qor_uid::USER_INTERFACE; }
     int get_version() const override { return 1; }
+    // @}
 
     // Lifecycle
+
     void init(bool _hide_console) override;
     void shutdown() override;
     void update(int _time) override;
@@ -49,6 +55,7 @@ public:
     void *get_reserved() override { return mp_reserved; }
 
     // Stats pages
+
     IStatsPage *create_stats_page(char const *_name) override;
     unsigned get_stats_pages_count() override;
     IStatsPage *get_stats_page(unsigned _idx) override;
@@ -56,22 +63,38 @@ public:
     IStatsPage *get_current_stats_page() override;
 
     // Input from the engine
+
+    // Forwarded to the desktop, when there is one.
+    // @{
     void on_button_down(unsigned _button) override;
     void on_button_up(unsigned _button) override;
     void on_pointer_move(vec2_t const &_movement) override;
     void on_wheel(float _rotation) override;
+    // @}
+    // Forwarded to the desktop; then the key 0xC0 hides the console when it is the active
+    // window, and otherwise shows and activates it.
     void on_key_down(unsigned _key, unsigned _extra) override;
+    // Forwarded to the desktop, when there is one.
     void on_key_up(unsigned _key) override;
+    // Forwarded to the desktop, except 0x60 and 0x7E, the characters of the console key.
     void on_char(unsigned _code) override;
 
     // The work of the commands "ui_export", "ui_import" and "print_stats_page".
+
+    // Saves the desktop's tree to the layout file (category 16); nothing without a desktop.
     void export_layout(char const *_file);
+    // Loads the layout file into the desktop's tree, then gives the desktop its background
+    // picture and the console its saved position and size from the configuration.
     void import_layout(char const *_file);
+    // Logs the current stats page without its colour tags and writes it to the dump file
+    // "stats_<page>_<level>_<nnnn>.txt"; only a log line when no page is shown.
     void print_stats_page();
 
     // The screen size read at init, in real pixels.
+    // @{
     int get_screen_w() const { return m_scr_w; }
     int get_screen_h() const { return m_scr_h; }
+    // @}
 
     // The engine's server, handed in by RegisterInterface; init gives it to the cache of
     // interfaces.

@@ -12,7 +12,7 @@
 //
 //     class CWindow : public CEventDispatcher {
 //         ...send_event...
-//         QOR_CLASS_ID(CWindow, void, "Window") // the root: no chain below it
+//         QOR_CLASS_ID_ROOT(CWindow, "Window") // the root: no chain below it
 //         ...attach_child...
 //     };
 //
@@ -25,7 +25,7 @@
 // although it derives from CEventDispatcher, and a class with an interface in front of its window
 // base names the window base (QOR_CLASS_ID(CConsole, CDialog, "Console")). In the root the line
 // declares the two virtual operations, so it stands where their slots belong; in derived classes
-// it overrides them.
+// it overrides them, and says so.
 #pragma once
 #include "ui_huid.h"
 
@@ -47,20 +47,26 @@ void *find_in_chain([[maybe_unused]] TClass *_p_object, [[maybe_unused]] char *_
 
 } // namespace class_id_detail
 
-#define QOR_CLASS_ID(_class, _next, _name)                                                                   \
+// The members of a class's identity, as above: class_id, find_class_by_id and get_class_id, the
+// virtual ones marked by _overrides (empty in the root, override elsewhere).
+#define QOR_CLASS_ID_MEMBERS(_class, _next, _name, _overrides)                                               \
 public:                                                                                                      \
     static char *class_id() {                                                                                \
         static char s_id;                                                                                    \
         return &s_id;                                                                                        \
     }                                                                                                        \
-    virtual void *find_class_by_id(char *_id) {                                                              \
+    virtual void *find_class_by_id(char *_id) _overrides {                                                   \
         if (_id == class_id()) return static_cast<_class *>(this);                                           \
         return ::qorui::class_id_detail::find_in_chain<_next>(this, _id);                                    \
     }                                                                                                        \
-    virtual ::qorui::HUID const &get_class_id() {                                                            \
+    virtual ::qorui::HUID const &get_class_id() _overrides {                                                 \
         static ::qorui::HUID const s_name(_name);                                                            \
         return s_name;                                                                                       \
     }
+// The identity of the root of the chain, which declares the virtual operations.
+#define QOR_CLASS_ID_ROOT(_class, _name) QOR_CLASS_ID_MEMBERS(_class, void, _name, )
+// The identity of a class whose chain goes on with _next, which overrides them.
+#define QOR_CLASS_ID(_class, _next, _name) QOR_CLASS_ID_MEMBERS(_class, _next, _name, override)
 
 // The object seen as T if T is its class or in its chain; otherwise, and for null, null.
 template <class T, class TObject>

@@ -19,6 +19,7 @@ namespace qorui {
 
 class CEditBox;
 
+// The developer console: a history pane of every log message above a one-line command box.
 class CConsole : public IConsole, public CDialog {
 public:
     // Lines of the history pane; older lines fall off the front.
@@ -27,12 +28,18 @@ public:
     // that one less stands at rest.
     static unsigned int const mn_max_commands = 1024;
 
+    // A translucent dialog, always on top, at least 128 by 128, with the edit boxes "history"
+    // (scrollable, tags shown) and "command" (one line, tags shown as typed), each with a
+    // "courier" font of its own.
     CConsole(CDesktop *_p_desktop, char const *_name);
+    // The boxes go with the window tree.
     virtual ~CConsole() {}
 
     QOR_CLASS_ID(CConsole, CDialog, "Console")
 
     // IConsole: the same object as the window
+
+    // EVENT_SHOW or EVENT_HIDE to the console window.
     void show(bool _show) override;
     bool is_show() override { return !is_hidden(); }
     CConsole *get_console() override { return this; }
@@ -40,21 +47,41 @@ public:
     void clear() override;
 
     // The parts, for the owner and for tests
+
+    // The history pane and the command box, children of the console.
+    // @{
     CEditBox *get_history() { return mp_history; }
     CEditBox *get_command() { return mp_command; }
+    // @}
+    // The number of lines kept for recall.
     unsigned int get_commands_count() const { return static_cast<unsigned int>(m_commands.size()); }
 
 protected:
+    // Behind the visual window's, also while hidden: every log message not yet shown goes to the
+    // history, oldest first.
     virtual void on_event_update(CWndEvent const *_p_event) override;
+    // The dialog's only.
     virtual void on_event_show(CWndEvent const *_p_event) override;
+    // Behind the dialog's: drops a half-typed line.
     virtual void on_event_hide(CWndEvent const *_p_event) override;
+    // Shows the command box's caret and brings the pointer back (enabled and shown).
     virtual void on_event_activate(CWndEvent const *_p_event) override;
+    // Hides the command box's caret.
     virtual void on_event_deactivate(CWndEvent const *_p_event) override;
+    // Behind the dialog's: the history fills the client area below the caption, the command box
+    // stands two pixels below it.
     virtual void on_event_resized(CWndEvent const *_p_event) override;
+    // Maximises the console, or restores a maximised one.
     virtual void on_event_double_click(CWndEvent const *_p_event) override;
+    // The dialog's only: dragging moves the console.
     virtual void on_event_drag(CWndEvent const *_p_event) override;
+    // Adds the wide string of the event to the history as a line, also when the history isn't
+    // editable; anybody may send it.
     virtual void on_event_set_text(CWndEvent const *_p_event) override;
+    // Tab completes, return runs the line, page up and down scroll the history by a line, up and
+    // down recall earlier lines; other keys go on to the command box.
     virtual void on_event_key_down(CWndEvent const *_p_event) override;
+    // Characters other than tab go on to the command box.
     virtual void on_event_char(CWndEvent const *_p_event) override;
 
     // The line becomes the next name (command first, then variable) that starts with the name in

@@ -23,13 +23,16 @@ class CFontsFactory;
 // The metrics of a grid of character cells in one texture, read from a "nehe" font file.
 class CCharset {
 public:
+    // One character's cell in texture space; its height is the charset's.
     struct SChar {
         float x; // left edge of the cell
         float y; // upper edge of the cell
         float w; // the character's width
     };
 
+    // The name the charset has in "fonts.lua".
     char const *get_name() const { return m_name.c_str(); }
+    // The height of every character in texture space (1/16 unless the file says otherwise).
     float get_height() const { return m_height; }
     // Null for a charset without characters; a code that is missing gets the lowest code's cell.
     SChar const *get_char_description(unsigned short _code) const {
@@ -41,8 +44,13 @@ public:
 
 protected:
     friend class CFontsFactory;
+    // Empty; the factory makes charsets.
     CCharset();
+    // Only the factory deletes charsets, at process end.
     virtual ~CCharset() {}
+    // Takes the name and reads the font file that the charset's table names (a "file_type" of
+    // "nehe" and a "file_name"); a table without them is reported as an error and leaves the
+    // charset empty.
     void init(char const *_p_name, LuaPlus::LuaObject _lo);
 
 private:
@@ -67,19 +75,28 @@ private:
 // A charset, the material that shows its texture and a size in pixels per texture unit.
 class CFont {
 public:
+    // Destroys the font's material; the charset stays with the factory.
     virtual ~CFont();
 
+    // The name the font has in "fonts.lua"; layouts save fonts by it.
     char const *get_name() const { return m_name.c_str(); }
+    // Pixels per unit of texture space (320 until the font's table or a caller sets it).
+    // @{
     float get_size() const { return m_size; }
     void set_size(float _size) { m_size = _size; }
+    // @}
+    // The charset's cell of the code, as CCharset gives it.
     CCharset::SChar const *get_char_description(unsigned short _code) const;
+    // The shared charset; null for a font made without one.
     CCharset const *get_charset() const { return mp_charset; }
     // The one material, for any code.
     CMaterial *get_char_material(unsigned short _code);
+    // The charset's height in texture space; times the size, the line height in pixels.
     float get_height() const;
 
 protected:
     friend class CFontsFactory;
+    // A font of the shared charset, without a material yet; the factory adds it.
     CFont(CCharset *_p_charset, char const *_name);
 
 private:
@@ -92,6 +109,7 @@ private:
 // Makes charsets and fonts from the tables of "fonts.lua".
 class CFontsFactory {
 public:
+    // No charsets.
     CFontsFactory() {}
     // The charsets live to the end of the process.
     virtual ~CFontsFactory() {}
@@ -109,6 +127,7 @@ private:
     qor_vector<CCharset *> m_charsets;
 };
 
+// The library's one fonts factory, built at the first call.
 CFontsFactory &get_fonts_factory();
 
 } // namespace qorui

@@ -20,11 +20,15 @@ public:
     static size_t const k_max_name = 119;
 
     // Compared by hash only, so "Window" == "WINDOW". The order is that of the unsigned hash.
+    // @{
     bool operator==(HUID const &_o) const { return m_hash == _o.m_hash; }
     bool operator!=(HUID const &_o) const { return m_hash != _o.m_hash; }
     bool operator<(HUID const &_o) const { return m_hash < _o.m_hash; }
+    // @}
 
+    // The name as given (at most k_max_name bytes), zero-terminated.
     char const *GetName() const { return m_name; }
+    // The 64-bit hash of the whole name, with A to Z folded to lower case.
     uint64_t get_hash() const { return m_hash; }
 
 private:
@@ -76,6 +80,7 @@ private:
     X(FNT_NAME_BUTTON_PUSHED)                                                                                \
     X(FNT_NAME_BUTTON_CHECKED)
 
+// Declares one static name; undefined again below.
 #define QOR_DECLARE_STATIC_HUID(_id) extern HUID const _id;
 QOR_STATIC_HUIDS(QOR_DECLARE_STATIC_HUID)
 #undef QOR_DECLARE_STATIC_HUID

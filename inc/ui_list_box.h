@@ -26,41 +26,71 @@ public:
     // Margins of 4, one column without title or width, and a hidden vertical scroll bar as the child
     // "scroll bar vert". The bar is as wide as a layout or the owner makes it.
     CListBox(CDesktop *_p_desktop, char const *_name);
+    // The rows go with the list; the bar goes with the window tree.
     virtual ~CListBox();
 
     QOR_CLASS_ID(CListBox, CWindowVisual, "ListBox")
 
+    // Behind the visual window's keys: "items", "show_columns", "columns_h", "columns_dw",
+    // "custom_item_height", "item_icon_size", "allow_check_items" and "item_spacing". Columns
+    // and marks aren't saved.
+    // @{
     virtual void save_state(LuaPlus::LuaObject &_lo_table) override;
     virtual void load_state(LuaPlus::LuaObject &_lo_table) override;
+    // @}
 
     // Rows
+
+    // The rows and their marks: selected is the row under the pointer, checked the last clicked.
     CItems &get_items() { return m_items; }
     // The height of every row: the custom height if it is above 0, else the lines of the tallest
     // column text of all rows (at least one) in the default font.
     int get_item_height();
+    // The custom row height in pixels; 0 or less: from the content. Lays out again.
     void set_item_height(int _h);
+    // The side of the icons' squares in pixels (16 by default). Lays out again.
     void set_item_icon_size(int _size);
 
     // Columns and header. A column has no width until one is set; the header is hidden until shown.
+
+    // Appends a column without title or width and lays out again; result its index.
     unsigned int add_column();
+    // The width of column _idx in pixels, which must exist; lays out again.
     void set_column_w(unsigned int _idx, int _w);
-    // Sends nothing: a title changes no layout.
+    // The header title of column _idx, which must exist. Sends nothing: a title changes no
+    // layout.
     void set_column_title(unsigned int _idx, CString const &_title);
+    // The header's height below the top margin in pixels (20 by default). Lays out again.
     void set_columns_h(int _h);
+    // Shows or hides the header. Lays out again.
     void show_columns(bool _show);
 
     // The right margin, with the scroll bar's width added while the bar is shown.
     int get_right_margin() const;
+    // The vertical scroll bar, a child of the list; its position is in pixels.
     CScrollBar *get_scroll_bar_vert() { return mp_scroll_bar_vert; }
 
 protected:
+    // Behind the visual window's: shows the bar when the rows overflow the view, hides it when
+    // they don't.
     virtual void on_event_update(CWndEvent const *_p_event) override;
+    // Behind the visual window's: the header, the selected and checked marks
+    // (MAT_NAME_SELECTION, MAT_NAME_CHECKED), then the visible rows with their icons, the
+    // checked row in FNT_NAME_CHECKED where the list has it.
     virtual void on_event_draw(CWndEvent const *_p_event) override;
+    // Behind the visual window's: the bar's range, and the bar at the right edge below the header.
     virtual void on_event_resized(CWndEvent const *_p_event) override;
+    // Selects the row under the pointer and sends EVENT_HIGHLIGHTED to the list when it changed.
     virtual void on_event_pointer_pos(CWndEvent const *_p_event) override;
+    // Selects nothing.
     virtual void on_event_pointer_exit(CWndEvent const *_p_event) override;
+    // One row up (wheel away from the user) or down.
     virtual void on_event_wheel_rotated(CWndEvent const *_p_event) override;
+    // Checks the selected row and sends EVENT_CHECKED to the list; the checked row again does
+    // nothing.
     virtual void on_event_click(CWndEvent const *_p_event) override;
+    // Up and Down scroll one row, Page Up and Page Down one view, Home and End to the ends; those
+    // keys go no further, others pass on.
     virtual void on_event_key_down(CWndEvent const *_p_event) override;
 
 private:

@@ -14,16 +14,22 @@ namespace qorui {
 // A named client of the engine's log manager, found again when the manager changes.
 class CLogger {
 public:
-    // The prefix is cut to four characters, followed by a colon and blanks to six.
+    // The prefix is cut to four characters, followed by a colon and blanks to six. A silent
+    // logger's engine logger is switched off.
     CLogger(char const *_name, char const *_prefix, bool _silent);
 
+    // A printf-style line at level 0 (message), 1 (warning) or 2 (error), narrow (cut at 511 bytes)
+    // or 16-bit (cut at 511 units, formatted by format_units); a null format writes nothing.
+    // @{
     void log_message(char const *_format, ...) __attribute__((format(printf, 2, 3)));
     void log_message(unsigned short const *_format, ...);
     void log_warning(char const *_format, ...) __attribute__((format(printf, 2, 3)));
     void log_warning(unsigned short const *_format, ...);
     void log_error(char const *_format, ...) __attribute__((format(printf, 2, 3)));
     void log_error(unsigned short const *_format, ...);
+    // @}
 
+    // The six characters that the engine's logger puts in front of each line.
     char const *get_prefix() const { return m_prefix.c_str(); }
 
 private:
@@ -39,8 +45,12 @@ private:
     ILogManager *mp_manager; // the manager mp_logger came from
 };
 
+// "UILogger" (prefix "UI"), the library's own lines, and "ConsoleLogger" (prefix ">"), the
+// console's echo of commands; each built at its first use.
+// @{
 CLogger &ui_logger();
 CLogger &console_logger();
+// @}
 
 // The printf family for 16-bit text: "%s" takes 16-bit text, "%S" narrow text (UTF-8), "%c" one
 // unit; numeric conversions are those of the C library. Writes at most _size - 1 units and a

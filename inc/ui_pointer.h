@@ -12,10 +12,13 @@ class CDesktop;
 // A visual window placed and read by a reference point at an offset from its top left corner.
 class CReferencePointWindow : public CWindowVisual {
 public:
+    // The visual window's constructor.
     using CWindowVisual::CWindowVisual;
 
+    // Places the window so that its reference point stands at (_x, _y).
     virtual void set_pos(int _x, int _y) override;
     using CWindow::get_pos;
+    // The reference point's position relative to the parent.
     virtual point_t get_pos();
 
 protected:
@@ -28,6 +31,7 @@ class CPointer : public CReferencePointWindow {
 public:
     // Appears and vanishes at once: no fades.
     CPointer(CDesktop *_p_desktop, char const *_name);
+    // Nothing of its own to release.
     virtual ~CPointer() {}
 
     QOR_CLASS_ID(CPointer, CWindowVisual, "Pointer")
@@ -36,6 +40,7 @@ public:
     void set_hotspot(point_t const &_hotspot) { m_hotspot = _hotspot; }
 
 protected:
+    // The hot spot.
     point_t reference_offset() const override { return m_hotspot; }
 
 private:
@@ -46,12 +51,15 @@ private:
 // The text cursor; its position is its lower left corner.
 class CCursor : public CReferencePointWindow {
 public:
+    // The visual window's constructor.
     using CReferencePointWindow::CReferencePointWindow;
+    // Nothing of its own to release.
     virtual ~CCursor() {}
 
     QOR_CLASS_ID(CCursor, CWindowVisual, "Cursor")
 
 protected:
+    // The lower left corner.
     point_t reference_offset() const override { return point_t{0, get_h()}; }
 };
 

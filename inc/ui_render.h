@@ -9,40 +9,65 @@ namespace qorui {
 
 // What one frame sent to the engine, from its outermost begin_draw to its end_draw.
 struct SRenderFigures {
-    unsigned m_materials_set; // one for each drawing of the canvas, and for each font change
+    unsigned m_materials_set; // one for each drawing of the canvas, one for each text that shows a character
+    // Quads and lines drawn.
+    // @{
     unsigned m_quads;
     unsigned m_lines;
+    // @}
 };
 
 // A rectangle of desktop pixels by its edges: left and top inside, right and bottom outside.
 struct SPixelRect {
+    // The edges, in desktop pixels.
+    // @{
     int m_l, m_t, m_r, m_b;
+    // @}
 };
 
 // What windows draw through: materials, clip rectangles, quads and lines in desktop pixels.
 class IRender {
 public:
+    // Deleted by its owner; the library's one bridge lives to process end.
     virtual ~IRender() {}
+    // The desktop's size in pixels, which the whole device area stands for.
     virtual void set_resolution(int _w, int _h) = 0;
     // The desktop's size in pixels as last set; nothing outside it is ever seen.
     virtual point_t get_resolution() const = 0;
+    // Open and close a frame's 2D drawing; they nest, and each end_draw needs its begin_draw.
+    // @{
     virtual void begin_draw() = 0;
     virtual void end_draw() = 0;
+    // @}
+    // A material from a template ("ui_color", "ui_image") and five texture names (empty or null
+    // for none); the result is the renderer's handle, -1 never being a valid one.
     virtual int create_material(char const *_material_template, char const *_diffuse, char const *_bump,
                                 char const *_specular, char const *_luminosity, char const *_reflection,
                                 bool _precache_enable, bool _load_textures_from_game_save) = 0;
+    // Releases a handle of create_material.
     virtual void destroy_material(int _handle) = 0;
+    // Makes the material current for the quads and lines that follow.
     virtual void set_material(int _handle) = 0;
+    // Makes the rectangle, in desktop pixels, the clip of all drawing that follows, at once.
     virtual void set_clip_area(int _x, int _y, int _w, int _h) = 0;
+    // Saves the clip state; pop_clip_area restores what the matching push saved.
+    // @{
     virtual void push_clip_area() = 0;
     virtual void pop_clip_area() = 0;
+    // @}
+    // One quad in desktop pixels: corners p0 to p3 (upper left, lower left, lower right, upper
+    // right, as the canvas passes them), each with a texture coordinate and a colour.
     virtual void draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_p2, point_t const &_p3,
                            vec2_t const &_t0, vec2_t const &_t1, vec2_t const &_t2, vec2_t const &_t3,
                            rgba_t const &_c0, rgba_t const &_c1, rgba_t const &_c2, rgba_t const &_c3) = 0;
+    // One line of width 1 in desktop pixels, its colour running from _c_from to _c_to.
     virtual void draw_line(point_t const &_from, point_t const &_to, rgba_t const &_c_from,
                            rgba_t const &_c_to) = 0;
-    // A 3D view in the middle of a 2D frame: the 2D batch closes round it and opens again.
+    // A 3D view in the middle of a 2D frame: the 2D batch closes round it and opens again. The
+    // rectangle is in desktop pixels; the camera's viewport gets it in screen pixels. A null
+    // camera keeps its viewport.
     virtual void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) = 0;
+    // The engine's video texture of that number, handed through; null without a renderer.
     virtual IAviTexture *get_avi_texture(int _id) = 0;
     // The figures of the last frame that ended.
     virtual SRenderFigures get_frame_figures() const = 0;
@@ -55,6 +80,7 @@ public:
 // The render bridge to the engine's IRenderQOR: desktop pixels to device coordinates.
 class CRender : public IRender {
 public:
+    // All zero: no renderer, no resolution.
     CRender();
 
     void set_resolution(int _w, int _h) override;

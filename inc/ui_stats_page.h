@@ -17,6 +17,7 @@ class CStatsPage : public IStatsPage {
 public:
     enum { MAX_STRINGS = 75 }; // lines of a page, and the bound on a line number
 
+    // The service deletes its pages at process end.
     virtual ~CStatsPage() {}
 
     // Each argument is cut to 0 .. 1 and times 255: 1 or more gives 255, 0 or less gives 0.
@@ -31,6 +32,7 @@ public:
     // Empties every line; the 75 lines stay.
     void clear() override;
 
+    // The 75 lines, each beginning with its colour tag.
     CText const &get_text() const { return m_text; }
 
 private:

@@ -15,24 +15,38 @@ public:
 
     // A negative size means the whole source.
     CString() {}
+    // From UTF-8: the first _size bytes, converted through str2wcs and so cut at 511 units. A null
+    // pointer reports and gives the empty string.
+    // @{
     CString(char const *_p_str, int _size = -1);
     CString(string const &_str, int _size = -1);
+    // @}
+    // The first _size units of the source; a size beyond the source reports and takes all of it.
+    // A null pointer reports and gives the empty string.
+    // @{
     CString(unsigned short const *_p_str, int _size = -1);
     CString(wstring const &_str, int _size = -1);
     CString(CString const &_str, int _size = -1);
+    // @}
+    // Nothing beyond the string's own storage.
     virtual ~CString() {}
 
+    // Copies the text and its UTF-8 form.
     CString &operator=(CString const &_str);
 
     // Converts at most _size units (511 for a negative size) into one static buffer that the next
     // call overwrites; longer text is cut at 511 units.
+    // @{
     static unsigned short const *str2wcs(char const *_p_str, int _size = -1);
     static void str2wcs(char const *_p_str, wstring &_out, int _size = -1);
+    // @}
 
     // The UTF-8 form, valid until the next conversion of this object. For names, keys and log
     // text: the string must be shorter than 256 units.
+    // @{
     string const &get_str_c() const;
     char const *get_c() const { return get_str_c().c_str(); }
+    // @}
 
     // One unit before _pos; a negative _pos appends.
     CString &insert(unsigned short _ch, int _pos);

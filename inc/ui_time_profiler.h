@@ -15,14 +15,16 @@ namespace qorui {
 int64_t profiler_frequency();
 
 class CTimeProfilerNode;
+// Nodes in order of creation; a list, so that their addresses stay valid.
 typedef std::list<CTimeProfilerNode, qor_allocator<CTimeProfilerNode>> CTimeProfilerNodes;
 
 // One named timer of the profiler's tree: its children, count, and mean and total times.
 class CTimeProfilerNode {
 public:
+    // A zeroed node named _name, which isn't copied.
     explicit CTimeProfilerNode(char const *_name);
 
-    enum { N_SAMPLES = 64 };
+    enum { N_SAMPLES = 64 }; // durations kept for the mean
 
     char const *mp_name;           // the caller's text, not copied; must outlive the node
     int64_t m_start;               // counter at the last begin
@@ -42,10 +44,14 @@ public:
 // The engine-wide hierarchical timer, put on the interface server by the library.
 class CTimeProfiler : public ITimeProfiler {
 public:
+    // Disabled, no nodes.
     CTimeProfiler();
 
+    // qor_uid::TIME_PROFILER, version 1.
+    // @{
     SInterfaceUID get_uid() const override { return qor_uid::TIME_PROFILER; }
     int get_version() const override { return 1; }
+    // @}
 
     CTimeProfilerNode *create_node(char const *_name) override;
     CTimeProfilerNode *get_root() override { return nullptr; }
@@ -56,6 +62,7 @@ public:
     void disable() override { m_enabled = false; }
     void dump(IStatsPage *_p_page, int _reserved) override;
 
+    // Whether begin and end take time.
     bool is_enabled() const { return m_enabled; }
 
 private:

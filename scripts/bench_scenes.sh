@@ -27,7 +27,8 @@ mkdir -p "$out"
 for repeat in 1 2 3; do
   for program in qorui cegui imgui; do
     echo "run $repeat: $program"
-    taskset -c "$core" "build-scenes/bin/${program}_scenes" > "$out/$program.$repeat.txt"
+    # From the output folder: CEGUI writes its log into the working folder.
+    (cd "$out" && taskset -c "$core" "../bin/${program}_scenes" > "$program.$repeat.txt")
   done
 done
 python3 scripts/scenes_table.py "$out" \

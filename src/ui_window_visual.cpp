@@ -600,7 +600,6 @@ void CWindowVisual::load_fonts(LuaPlus::LuaObject const &_lo_fonts) {
 }
 
 // { pos = { x, y }, size = { w, h }, time = milliseconds }: where a show slides the window to.
-// { pos = { x, y }, size = { w, h }, time = milliseconds }: where a show slides the window to.
 void CWindowVisual::load_movement(LuaPlus::LuaObject const &_lo_movement) {
     SRect &d = m_movement_destination;
     read_pair(_lo_movement, "pos", d.x, d.y);

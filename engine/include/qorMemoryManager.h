@@ -56,12 +56,17 @@ int MMCheckMemoryCorrupt();
 int MMGetMemoryBlockStatus(void const *_p);
 // Writes the statistics as text lines to _path, or to stdout for null.
 void MMDumpMemoryStats(char const *_path);
+// The small-block allocator, shared by all modules; MMSmallFree ignores
+// null, MMSmallMsize gives the usable size.
+// @{
 void *MMSmallAlloc(size_t _size);
 void *MMSmallRealloc(void *_p, size_t _size);
 void MMSmallFree(void *_p);
 size_t MMSmallMsize(void *_p);
+// @}
 // The pool for that element size and count; one MMReleaseFixedPool for each call.
 SFixedPool *MMGetFixedPool(size_t _element_size, size_t _block_elements);
+// Gives back one reference to the pool record; the last release frees its blocks.
 void MMReleaseFixedPool(SFixedPool *_p_pool);
 
 } // extern "C"

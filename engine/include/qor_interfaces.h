@@ -5,23 +5,30 @@
 
 // Four 32-bit words, compared as a whole. Travels by value.
 struct SInterfaceUID {
-    uint32_t m_words[4];
+    uint32_t m_words[4]; // as the identifier tables write them
 
+    // Equal when all four words are.
+    // @{
     bool operator==(SInterfaceUID const &_o) const {
         return m_words[0] == _o.m_words[0] && m_words[1] == _o.m_words[1] &&
                m_words[2] == _o.m_words[2] && m_words[3] == _o.m_words[3];
     }
     bool operator!=(SInterfaceUID const &_o) const { return !(*this == _o); }
+    // @}
 };
 
 // What every interface on the server is: an identifier and a version.
 class IInterfaceBase {
 public:
+    // Interfaces are owned by the module that registers them.
     virtual ~IInterfaceBase() {}
+    // The identifier under which the server files the interface (one of qor_uid).
     virtual SInterfaceUID get_uid() const = 0;
+    // The version asked for by query_interface; 1 for all of the engine's interfaces.
     virtual int get_version() const = 0;
 };
 
+// What a server listener is told.
 enum EInterfaceServerAction : int32_t {
     ISA_REGISTERED = 0, // an interface has been registered
     ISA_WITHDRAWN = 1,  // the interface is being withdrawn; drop every pointer to it
@@ -30,6 +37,7 @@ enum EInterfaceServerAction : int32_t {
 // Hears of interfaces registered on the server and withdrawn from it.
 class IInterfaceServerListener {
 public:
+    // Called for each registration and withdrawal, with the interface concerned.
     virtual void _isv_action(EInterfaceServerAction _action, IInterfaceBase *_p_interface) = 0;
 
 protected:
@@ -46,8 +54,11 @@ public:
     virtual int register_interface(IInterfaceBase *_p_interface) = 0;
     // Loads a further engine module by file name (dlopen, from the modules folder first).
     virtual void load_module(int _flag, char const *_library_name) = 0;
+    // Adds or removes a listener; the caller keeps ownership.
+    // @{
     virtual void add_listener(IInterfaceServerListener *_p_listener) = 0;
     virtual void remove_listener(IInterfaceServerListener *_p_listener) = 0;
+    // @}
     // Removes the interface and tells every listener (action 1) before it goes.
     virtual void withdraw_interface(IInterfaceBase *_p_interface) = 0;
 
@@ -61,6 +72,8 @@ typedef int (*register_interface_fn)(IInterfaceServer *_p_server);
 
 // The identifiers of the engine's interfaces, each word as it lies in memory.
 namespace qor_uid {
+// One identifier for each interface the engine or the library registers.
+// @{
 constexpr SInterfaceUID LOAD_PROCESSOR = {{0x8A73F013, 0x191DC71F, 0xB13EF2B3, 0x5134D278}};
 constexpr SInterfaceUID CMD_MANAGER = {{0xC58A117C, 0x42C66E10, 0x937BFB88, 0xD5C1DECE}};
 constexpr SInterfaceUID SYSTEM_TIMER = {{0x8A73F039, 0x491DC72F, 0xB13EF4B3, 0x5134D278}};
@@ -76,6 +89,7 @@ constexpr SInterfaceUID RESOURCES_PRECACHE_MANAGER = {{0xAE3EE2F1, 0x12D1E1C9, 0
 constexpr SInterfaceUID SERVER_GAME_API = {{0xAE3EE2F1, 0x42D2E5C9, 0xEA366884, 0xE0EFA96E}};
 constexpr SInterfaceUID TIME_PROFILER = {{0xEB41FDF7, 0x4265C557, 0x783D73A7, 0x527D9782}};
 constexpr SInterfaceUID LOG_MANAGER = {{0x14F4A6F2, 0x4ECE2F66, 0x5BDC3CBA, 0xF9F4BA0F}};
+// @}
 } // namespace qor_uid
 
 // Interfaces the UI library fetches but never calls: declared so the cache can hold them.

@@ -3,37 +3,54 @@
 #pragma once
 #include <climits>
 
+// Two floats: a device position, a texture coordinate or a movement, by use.
 struct vec2_t {
+    // Across, then down or up as the use says.
+    // @{
     float x;
     float y;
+    // @}
 };
 
+// Three floats: a point or a direction in 3D.
 struct vec3_t {
+    // The three coordinates.
+    // @{
     float x;
     float y;
     float z;
+    // @}
 };
 
 // A 4 by 4 matrix of floats, row after row: 64 bytes.
 struct matr4_t {
-    float m[4][4];
+    float m[4][4]; // m[row][column]
 };
 
 // Four bytes r, g, b, a, each 0 to 255.
 class rgba_t {
 public:
+    // Red, green, blue and opacity (255 opaque).
+    // @{
     unsigned char r, g, b, a;
+    // @}
 
+    // Transparent black, or the four bytes given.
+    // @{
     rgba_t() : r(0), g(0), b(0), a(0) {}
     rgba_t(unsigned char _r, unsigned char _g, unsigned char _b, unsigned char _a)
         : r(_r), g(_g), b(_b), a(_a) {}
+    // @}
 
     // Each byte times _f, clamped to 0 .. 255 and truncated.
     rgba_t operator*(float _f) const {
         return rgba_t(scale(r, _f), scale(g, _f), scale(b, _f), scale(a, _f));
     }
+    // Equal when all four bytes are.
+    // @{
     bool operator==(rgba_t const &_o) const { return r == _o.r && g == _o.g && b == _o.b && a == _o.a; }
     bool operator!=(rgba_t const &_o) const { return !(*this == _o); }
+    // @}
 
 private:
     static unsigned char scale(unsigned char _c, float _f) {

@@ -21,9 +21,11 @@ enum ESoundState : int { SOUND_STATE_RESET = 0, SOUND_STATE_START = 1, SOUND_STA
 
 // What the interface passes: the flags of create_sound, the option each source is given once
 // right after creation, and the argument of get_volume.
+// @{
 int const SOUND_FLAGS_INTERFACE = 2;
 int const SOUND_OPTION_INTERFACE = 1;
 int const SOUND_VOLUME_OWN = 1;
+// @}
 
 // One playing sound, owned by whoever made it.
 class ISoundSource {
@@ -32,11 +34,17 @@ public:
     virtual ~ISoundSource() {}
     // One of ESoundState; _time in ms.
     virtual void set_state(int _state, float _time) = 0;
+    // Called once with SOUND_OPTION_INTERFACE right after creation.
     virtual void set_option(int _option) = 0;
+    // The volume; 1.0 is the file as recorded.
     virtual void set_volume(float _volume) = 0;
+    // The volume that set_volume gave; _which is SOUND_VOLUME_OWN.
     virtual float get_volume(int _which) = 0;
+    // Whether the sound starts again from the beginning when it ends.
+    // @{
     virtual void set_looping(bool _looping) = 0;
     virtual bool is_looping() = 0;
+    // @}
 };
 
 // The engine's sound: sources made from WAV files, in groups.

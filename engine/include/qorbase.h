@@ -17,13 +17,18 @@
 // One value of a configuration file.
 class IConfigValue {
 public:
+    // The value read as "x, y"; the defaults when the key has no content or no number.
     virtual vec2_t get_vec2(float _default_x, float _default_y) = 0;
+    // The value read as an integer; the default when the key has no content or no number.
     virtual int get_int(int _default_value) = 0;
     // Owned by the value; valid until the value changes or its file is closed.
     virtual char const *get_string(char const *_default_value) = 0;
+    // Stores "x, y" and marks the file for writing back.
     virtual void set_vec2(float _x, float _y) = 0;
     // Not used by the UI library:
+    // Stores the text as it stands.
     virtual void set_string(char const *_value) = 0;
+    // False for a key made by get_value with _create and never set.
     virtual bool has_content() const = 0;
 
 protected:
@@ -55,6 +60,7 @@ protected:
 // The engine's configuration file.
 class IGDFRegistry {
 public:
+    // The engine's GDF file; null when it couldn't be read. The registry owns it.
     virtual IConfigFile *get_config() = 0;
 
 protected:
@@ -64,9 +70,12 @@ protected:
 // A stream over one file. m_size is the file's size in bytes.
 class IFileReader {
 public:
+    // The file's size in bytes.
     unsigned m_size = 0;
 
+    // Closes the file.
     virtual ~IFileReader() {}
+    // The next read starts _position bytes from the start.
     virtual void seek(unsigned _position) = 0;
     // Result: bytes read, fewer at the end of the file.
     virtual unsigned read(unsigned _count, void *_p_buffer) = 0;
@@ -74,10 +83,10 @@ public:
 
 // One file of IFileSystem::save_files.
 struct SFileToSave {
-    int m_category;
-    char const *mp_path;
-    void const *mp_data;
-    unsigned m_size;
+    int m_category;      // the category whose folder the path is relative to
+    char const *mp_path; // the file's path in the category
+    void const *mp_data; // the bytes to write, _size of them
+    unsigned m_size;     // in bytes
 };
 
 // The engine's files by category, and its log.
@@ -104,7 +113,9 @@ protected:
     virtual ~IFileSystem() {}
 };
 
+// The engine's configuration, read at the first call; never null.
 IGDFRegistry *GetGDFRegistry();
+// The engine's files; never null.
 IFileSystem *GetFileSystem();
 // Parses a configuration file of the GDF format from the category's folder; null when it can't
 // be read. Close it with close(true).
@@ -114,7 +125,9 @@ IConfigFile *ReadConfigFile(int _category, char const *_file_name, int _reserved
 // the cache buffer; the reader itself belongs to the UI library.
 class CCachedFileReader {
 public:
+    // Reads from the start of _p_fr; with _owns_reader the reader is deleted with this object.
     CCachedFileReader(IFileReader *_p_fr, bool _owns_reader);
+    // Gives the cache buffer back.
     ~CCachedFileReader();
     CCachedFileReader(CCachedFileReader const &) = delete;
     CCachedFileReader &operator=(CCachedFileReader const &) = delete;
@@ -124,6 +137,7 @@ public:
 
     // The engine's cache buffers: *_pp_buffer and *_p_size (above 0) on success.
     static bool cache_create(void **_pp_buffer, unsigned *_p_size);
+    // Gives back a buffer of cache_create; null is ignored.
     static void cache_release(void *_p_buffer);
 
 private:
@@ -138,6 +152,7 @@ private:
 
 namespace qorbase {
 
+// The file categories of IFileSystem and LuaState::DoFile.
 enum { FILE_CATEGORY_STATS = 2, FILE_CATEGORY_CONFIG = 5, FILE_CATEGORY_FONTS = 8, FILE_CATEGORY_UI = 16 };
 
 // The GDF file that GetGDFRegistry reads at its first use, and the file that its changes are
@@ -149,6 +164,7 @@ void flush_gdf();
 
 // The folder of a category ("" for the current directory). Unknown categories map to "".
 void set_category_root(int _category, char const *_folder);
+// The folder set for the category; "" when none was set.
 char const *get_category_root(int _category);
 // Full path of a file in a category; result in _p_out, truncated to _size.
 void make_path(int _category, char const *_path, char *_p_out, unsigned _size);
@@ -166,15 +182,19 @@ char const *get_config_string(char const *_section, char const *_key, char const
 // all temporaries are complete before the first rename; a failure before the renames replaces
 // none (errno tells why). False on any failure.
 struct SFileContent {
-    std::string m_path;
-    void const *mp_data;
-    size_t m_size;
+    std::string m_path;  // the full path
+    void const *mp_data; // the bytes to write
+    size_t m_size;       // how many
 };
+// Writes the _count files of _p_files together, as above.
 bool write_files_atomically(SFileContent const *_p_files, size_t _count);
+// One file, as write_files_atomically.
 bool write_file_atomically(std::string const &_path, void const *_p_data, size_t _size);
 
 // Where IFileSystem::log writes; null restores stdout.
+// @{
 typedef void (*log_sink_t)(char const *_line, void *_user);
 void set_log_sink(log_sink_t _sink, void *_user);
+// @}
 
 } // namespace qorbase

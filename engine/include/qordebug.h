@@ -5,13 +5,18 @@
 
 namespace qordebug {
 
+// What a report is about, as the handler is told: a broken contract (assert_func), bad data
+// (warning) or a critical failure (error).
 enum EReportKind { REPORT_ASSERT = 0, REPORT_WARNING = 1, REPORT_ERROR = 2 };
 
 // Receives the formatted text of every report. Tests install one to capture reports.
 typedef void (*report_handler_t)(EReportKind _kind, char const *_text, void *_user);
 
+// A broken contract: printf-style text, written to stderr and the handler. Returns.
 void assert_func(char const *_format, ...) __attribute__((format(printf, 1, 2)));
+// Bad data after which the caller goes on with a default or a null result.
 void warning(char const *_format, ...) __attribute__((format(printf, 1, 2)));
+// A critical failure; it doesn't abort either.
 void error(char const *_format, ...) __attribute__((format(printf, 1, 2)));
 
 // Installs a handler (null restores the default); returns the previous one through the out

@@ -1,10 +1,18 @@
-// The platform layer over Linux: monotonic clocks, dlopen, and stderr for message boxes.
+// The platform layer over Linux: monotonic clocks, dlopen, stderr for message boxes, thread
+// affinity and the time stamp counter, and the processes and threads of /proc.
 #include "qor_platform.h"
 
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <dirent.h>
 #include <dlfcn.h>
+#include <limits.h>
+#include <sched.h>
+#include <sys/syscall.h>
+#include <unistd.h>
+#include <x86intrin.h>
 
 namespace qorplatform {
 
@@ -77,6 +85,109 @@ char const *last_module_error() {
 void message_box(char const *_text, char const *_caption) {
     fprintf(stderr, "%s: %s\n", _caption ? _caption : "", _text ? _text : "");
     fflush(stderr);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Threads, processors and processes
+// ---------------------------------------------------------------------------------------------
+
+uint32_t get_current_thread_id() {
+    return static_cast<uint32_t>(syscall(SYS_gettid));
+}
+
+uint32_t get_current_process_id() {
+    return static_cast<uint32_t>(getpid());
+}
+
+uint64_t get_thread_affinity_mask() {
+    cpu_set_t set;
+    CPU_ZERO(&set);
+    if (sched_getaffinity(0, sizeof(set), &set) != 0) return 0;
+    uint64_t mask = 0;
+    for (int cpu = 0; cpu < 64; ++cpu)
+        if (CPU_ISSET(cpu, &set)) mask |= uint64_t(1) << cpu;
+    return mask;
+}
+
+uint64_t set_thread_affinity_mask(uint64_t _mask) {
+    uint64_t const old_mask = get_thread_affinity_mask();
+    cpu_set_t set;
+    CPU_ZERO(&set);
+    for (int cpu = 0; cpu < 64; ++cpu)
+        if (_mask & (uint64_t(1) << cpu)) CPU_SET(cpu, &set);
+    if (old_mask == 0 || sched_setaffinity(0, sizeof(set), &set) != 0) return 0;
+    return old_mask;
+}
+
+void yield_thread() {
+    sched_yield();
+}
+
+int64_t read_time_stamp_counter() {
+    return gp_clock ? gp_clock->performance_counter() : read_hardware_time_stamp_counter();
+}
+
+int64_t read_hardware_time_stamp_counter() {
+    return static_cast<int64_t>(__rdtsc());
+}
+
+namespace {
+
+// The numbered entries of a /proc folder, as ids.
+template <class TVisit>
+bool for_each_numbered_entry(char const *_folder, TVisit _visit) {
+    DIR *p_dir = opendir(_folder);
+    if (!p_dir) return false;
+    while (dirent *p_entry = readdir(p_dir)) {
+        char *p_end = nullptr;
+        unsigned long const id = strtoul(p_entry->d_name, &p_end, 10);
+        if (p_end != p_entry->d_name && *p_end == 0 && id <= UINT32_MAX) _visit(static_cast<uint32_t>(id));
+    }
+    closedir(p_dir);
+    return true;
+}
+
+// The file name of the process's executable; its short name from "comm" when it has none that we
+// may read.
+void process_name(uint32_t _id, char *_name, size_t _size) {
+    char path[64], target[PATH_MAX];
+    snprintf(path, sizeof(path), "/proc/%u/exe", _id);
+    ssize_t const length = readlink(path, target, sizeof(target) - 1);
+    if (length > 0) {
+        target[length] = 0;
+        char const *p_slash = strrchr(target, '/');
+        snprintf(_name, _size, "%s", p_slash ? p_slash + 1 : target);
+        return;
+    }
+    _name[0] = 0;
+    snprintf(path, sizeof(path), "/proc/%u/comm", _id);
+    if (FILE *p_file = fopen(path, "r")) {
+        if (fgets(_name, static_cast<int>(_size), p_file)) _name[strcspn(_name, "\n")] = 0;
+        fclose(p_file);
+    }
+}
+
+} // namespace
+
+bool for_each_process(process_visitor_t _visit, void *_user) {
+    if (!_visit) return false;
+    return for_each_numbered_entry("/proc", [&](uint32_t _id) {
+        char name[PATH_MAX];
+        process_name(_id, name, sizeof(name));
+        _visit(_id, name, _user);
+    });
+}
+
+bool for_each_process_id(id_visitor_t _visit, void *_user) {
+    if (!_visit) return false;
+    return for_each_numbered_entry("/proc", [&](uint32_t _id) { _visit(_id, _user); });
+}
+
+bool for_each_thread(uint32_t _process_id, id_visitor_t _visit, void *_user) {
+    if (!_visit) return false;
+    char folder[64];
+    snprintf(folder, sizeof(folder), "/proc/%u/task", _process_id);
+    return for_each_numbered_entry(folder, [&](uint32_t _id) { _visit(_id, _user); });
 }
 
 } // namespace qorplatform

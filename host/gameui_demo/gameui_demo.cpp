@@ -2,7 +2,8 @@
 // "gameui_library" in the configuration. It announces itself in the log and adds three commands:
 // "gameui_demo" echoes its arguments to the log, "gameui_demo_scene" builds the demo's windows on
 // the desktop and places the console (the host runs it at start from its configuration),
-// "gameui_show_stats NAME" shows one stats page. In the scene, the button "Ask" of the second
+// "gameui_show_stats NAME" shows one stats page; the thread strip adds "gameui_threads" and
+// "gameui_threads_save" (thread_strip.h). In the scene, the button "Ask" of the second
 // dialog opens a modal message box and shows its answer.
 #include "qor_commands.h"
 #include "qor_interfaces.h"
@@ -26,6 +27,7 @@
 #include "ui_string.h"
 #include "ui_value_bar.h"
 #include "qorscriptsystem.h"
+#include "thread_strip.h"
 
 #include <string>
 
@@ -457,6 +459,7 @@ extern "C" __attribute__((visibility("default"))) int RegisterInterface(IInterfa
         p_commands->register_command("gameui_demo", cmd_gameui_demo, nullptr);
         p_commands->register_command("gameui_demo_scene", cmd_gameui_demo_scene, nullptr);
         p_commands->register_command("gameui_show_stats", cmd_gameui_show_stats, nullptr);
+        gameui_demo::register_thread_strip_commands(_p_server, p_commands);
     }
     return 1;
 }

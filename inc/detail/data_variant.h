@@ -21,28 +21,39 @@ namespace qorui {
 
 namespace data_variant_detail {
 
+// The size and the alignment of the largest type of a type list.
 template <class TList>
 struct SLargest;
 
+// The end of a list: one byte.
 template <>
 struct SLargest<Loki::NullType> {
+    // In bytes.
+    // @{
     static constexpr size_t size = 1;
     static constexpr size_t align = 1;
+    // @}
 };
 
+// The larger of the head and the rest of the list.
 template <class THead, class TTail>
 struct SLargest<Loki::Typelist<THead, TTail>> {
+    // In bytes.
+    // @{
     static constexpr size_t size = sizeof(THead) > SLargest<TTail>::size ? sizeof(THead)
                                                                          : SLargest<TTail>::size;
     static constexpr size_t align = alignof(THead) > SLargest<TTail>::align ? alignof(THead)
                                                                             : SLargest<TTail>::align;
+    // @}
 };
 
+// Destroys a T in place.
 template <class T>
 void destroy_value(void *_p_value) {
     static_cast<T *>(_p_value)->~T();
 }
 
+// The destruction of a trivially destructible value, or of one destroyed already.
 inline void destroy_nothing(void *) {}
 
 // What a read gives after a broken contract: a default value of T of its own, reset at each
@@ -56,6 +67,7 @@ T &neutral_value() {
 
 } // namespace data_variant_detail
 
+// One node of a stream over the type list TL, holding a copy of one value of one of its types.
 template <class TL>
 class CDataVariantBase : public CPooled<CDataVariantBase<TL>, 1024> {
 public:
@@ -65,6 +77,7 @@ public:
         enum { value = Loki::TL::IndexOf<TL, T>::value };
     };
 
+    // A copy of _value, which must be of one of the list's types; not linked to any node.
     template <class T>
     explicit CDataVariantBase(T const &_value)
         : m_destroy(std::is_trivially_destructible<T>::value ? &data_variant_detail::destroy_nothing
@@ -75,6 +88,7 @@ public:
                       "pool elements are aligned to a pointer");
         new (m_value) T(_value);
     }
+    // Destroys the value, unless destroy_value did so already.
     ~CDataVariantBase() { m_destroy(m_value); }
     // Destroys the value ahead of the node; the node's own destruction then does nothing more.
     void destroy_value() {
@@ -98,11 +112,13 @@ public:
         if (T *p_value = value_if<T>()) _value = *p_value;
     }
 
+    // Destroys the value held in a node's buffer.
     typedef void (*destroy_t)(void *);
 
-    destroy_t m_destroy; // first: the pool's link while the node is free
-    CDataVariantBase *mp_next;
-    int m_type;
+    destroy_t m_destroy;       // first: the pool's link while the node is free
+    CDataVariantBase *mp_next; // the next node of the stream; null at the tail
+    int m_type;                // the value's position in the type list
+    // The value, in a buffer of the largest type's size and alignment.
     alignas(data_variant_detail::SLargest<
             TL>::align) unsigned char m_value[data_variant_detail::SLargest<TL>::size];
 

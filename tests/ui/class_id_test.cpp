@@ -14,7 +14,7 @@ public:
     virtual ~CTestDispatcher() {}
 };
 class CTestWindow : public CTestDispatcher {
-    QOR_CLASS_ID(CTestWindow, void, "Window")
+    QOR_CLASS_ID_ROOT(CTestWindow, "Window")
 };
 class CTestVisual : public CTestWindow {
     QOR_CLASS_ID(CTestVisual, CTestWindow, "WindowVisual")

@@ -152,6 +152,17 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          "GameUI: answer Yes",
          nullptr,
          nullptr},
+        // The graph profiler's phases take fixed shares of the manual clock's 16 ms a frame.
+        {"wait 12\ncommand graph_profiler\nwait 30\n"
+         "move -262 303 # from the centre onto the band of 'renderer' (250, 687)\n"
+         "press\nrelease\npress\nrelease\nwait 30\n"
+         "move 0 -53    # the drop-down list of unused nodes (250, 634)\npress\nrelease\nwait 12\n"
+         "screenshot profiler.png\ncommand graph_profiler\nmove 262 -250 # back to the centre\nwait 12\n"
+         "screenshot hidden.png\n",
+         {{"profiler.png", "graph_profiler_1024x768"}, {"hidden.png", "demo_scene_1024x768"}},
+         "",
+         nullptr,
+         nullptr},
     };
     for (auto const &run : runs) {
         SCOPED_TRACE(run.m_pictures[0].second);
@@ -272,4 +283,18 @@ TEST(HostEndToEnd, AnImportedChildOfAnUnregisteredClassIsNamedInTheLog) {
     std::string const back = qortest::read_file(data + "/ui/back.lua");
     EXPECT_EQ(std::string::npos, back.find("ghost"));
     EXPECT_NE(std::string::npos, back.find("\"label\""));
+}
+
+// The thread strip over the demo scene on a recorded session of the host, so that the picture is
+// the same on every machine: a row for each of the recording's threads by the names it gave them,
+// and the rest of the system last. A recording that can't be read is reported and shows nothing.
+TEST(HostEndToEnd, TheThreadStripReplaysARecordingOverTheScene) {
+    std::string const recording = qortest::source_dir() + "/tests/host/thread_rings.txt";
+    SRun const run = run_host({"--script", script("command gameui_threads " + recording +
+                                                  "\nwait 12\nscreenshot threads.png\n"
+                                                  "command gameui_threads /no/such/rings.txt\n")});
+    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
+    run.expect_golden("threads.png", "thread_strip_replayed_1024x768");
+    EXPECT_NE(std::string::npos, run.m_result.m_output.find("Cannot open '/no/such/rings.txt'"))
+        << run.m_result.m_output;
 }
