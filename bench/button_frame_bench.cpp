@@ -13,61 +13,15 @@
 #include "ui_material.h"
 #include "ui_render.h"
 #include "ui_string.h"
+#include "vertex_copy_renderer.h"
 
 #include <benchmark/benchmark.h>
 
 #include <cstdio>
-#include <vector>
 
 using namespace qorui;
 
 namespace {
-
-// The cheapest renderer that still takes every vertex: a copy into a buffer reserved up front.
-class CVertexCopyRenderer : public IRenderQOR {
-public:
-    struct SVertex {
-        vec2_t m_pos, m_tex;
-        rgba_t m_color;
-    };
-
-    CVertexCopyRenderer() { m_vertices.reserve(1 << 18); }
-
-    SInterfaceUID get_uid() const override { return qor_uid::RENDER; }
-    int get_version() const override { return 1; }
-    void render_view(IRenderCamera *) override {}
-    void finish_view() override {}
-    void present() override {}
-    int create_material(char const *, char const *, char const *, char const *, char const *, char const *,
-                        bool, bool) override {
-        return m_next_handle++;
-    }
-    void destroy_material(int) override {}
-    IAviTexture *get_avi_texture(int) override { return nullptr; }
-    void begin_2d() override { m_vertices.clear(); }
-    void end_2d() override {}
-    void set_material(int _handle) override { m_material = _handle; }
-    void draw_quad(vec2_t const &_p0, vec2_t const &_t0, rgba_t const &_c0, vec2_t const &_p1,
-                   vec2_t const &_t1, rgba_t const &_c1, vec2_t const &_p2, vec2_t const &_t2,
-                   rgba_t const &_c2, vec2_t const &_p3, vec2_t const &_t3, rgba_t const &_c3) override {
-        if (m_vertices.size() + 4 > m_vertices.capacity()) return; // never grows inside a frame
-        m_vertices.push_back(SVertex{_p0, _t0, _c0});
-        m_vertices.push_back(SVertex{_p1, _t1, _c1});
-        m_vertices.push_back(SVertex{_p2, _t2, _c2});
-        m_vertices.push_back(SVertex{_p3, _t3, _c3});
-    }
-    void set_clip_rect(vec2_t const &, vec2_t const &) override {}
-    void push_clip_rect() override {}
-    void pop_clip_rect() override {}
-    void draw_line(vec2_t const &, rgba_t const &, vec2_t const &, rgba_t const &, float) override {}
-
-    size_t quads() const { return m_vertices.size() / 4; }
-
-private:
-    std::vector<SVertex> m_vertices;
-    int m_next_handle = 1;
-    int m_material = -1;
-};
 
 // Allocations of every heap of the memory manager so far.
 uint64_t allocations() {

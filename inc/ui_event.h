@@ -144,6 +144,14 @@ protected:
     // Each callback reads the stream from its head and sees what earlier ones overwrote; one
     // registered during the pass runs in the same pass. The receiver is this dispatcher.
     void dispatch_event(CWndEvent const *_p_event);
+    // What every callback starts with: the stream at its head, this dispatcher as the receiver.
+    void begin_callback(CWndEvent const *_p_event) {
+        _p_event->rewind();
+        _p_event->mp_receiver = this;
+    }
+    // Whether anything registered a callback for the type.
+    // Whether anything registered a callback for the type.
+    bool has_callbacks(EEventType _id) const { return !m_callbacks.empty() && m_callbacks.count(_id) > 0; }
 
 private:
     typedef std::list<CEventCallback, qor_allocator<CEventCallback>> CCallbacks;

@@ -7,6 +7,7 @@
 #pragma once
 #include "qor_memory.h"
 
+#include <cstdint>
 #include <map>
 
 namespace LuaPlus {
@@ -34,7 +35,12 @@ public:
     // The height of every character in texture space (1/16 unless the file says otherwise).
     float get_height() const { return m_height; }
     // Null for a charset without characters; a code that is missing gets the lowest code's cell.
-    SChar const *get_char_description(unsigned short _code) const;
+    SChar const *get_char_description(unsigned short _code) const {
+        uint32_t const slot = _code < m_slots.size() ? m_slots[_code] : 0;
+        return slot ? &m_cells[slot - 1] : m_cells.empty() ? nullptr : &m_cells[0];
+    }
+    // No character moves the pen to the left: a line's pen only grows.
+    bool has_no_negative_width() const { return m_no_negative_width; }
 
 protected:
     friend class CFontsFactory;
@@ -48,14 +54,21 @@ protected:
     void init(char const *_p_name, LuaPlus::LuaObject _lo);
 
 private:
+    typedef std::map<unsigned short, SChar, std::less<unsigned short>,
+                     qor_small_allocator<std::pair<unsigned short const, SChar>>>
+        CCharMap;
+
     // Reads what it can; any bad or missing token ends the reading quietly.
     void load_from_nehe(char const *_file_name);
-    void read_nehe(char const *_p_text, unsigned _length);
+    void read_nehe(char const *_p_text, unsigned _length, CCharMap &_chars);
+    void set_chars(CCharMap const &_chars);
 
     string m_name;
-    std::map<unsigned short, SChar, std::less<unsigned short>,
-             qor_small_allocator<std::pair<unsigned short const, SChar>>>
-        m_chars;
+    // The characters in the order of their codes, and for each code up to the highest one the
+    // place of its cell plus one, 0 for a code without a cell: one look-up per character.
+    qor_vector<SChar> m_cells;
+    qor_vector<uint32_t> m_slots;
+    bool m_no_negative_width;
     float m_height; // of every character, in texture space
 };
 
@@ -74,6 +87,8 @@ public:
     // @}
     // The charset's cell of the code, as CCharset gives it.
     CCharset::SChar const *get_char_description(unsigned short _code) const;
+    // The shared charset; null for a font made without one.
+    CCharset const *get_charset() const { return mp_charset; }
     // The one material, for any code.
     CMaterial *get_char_material(unsigned short _code);
     // The charset's height in texture space; times the size, the line height in pixels.

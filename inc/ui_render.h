@@ -9,11 +9,19 @@ namespace qorui {
 
 // What one frame sent to the engine, from its outermost begin_draw to its end_draw.
 struct SRenderFigures {
-    unsigned m_materials_set; // one for each drawing of the canvas, and for each font change
+    unsigned m_materials_set; // one for each drawing of the canvas, one for each text that shows a character
     // Quads and lines drawn.
     // @{
     unsigned m_quads;
     unsigned m_lines;
+    // @}
+};
+
+// A rectangle of desktop pixels by its edges: left and top inside, right and bottom outside.
+struct SPixelRect {
+    // The edges, in desktop pixels.
+    // @{
+    int m_l, m_t, m_r, m_b;
     // @}
 };
 
@@ -63,6 +71,10 @@ public:
     virtual IAviTexture *get_avi_texture(int _id) = 0;
     // The figures of the last frame that ended.
     virtual SRenderFigures get_frame_figures() const = 0;
+    // Where anything drawn now can still be seen, within the desktop: the clip area in force, or
+    // a rectangle round the areas that the engine may have in force. Drawing wholly outside it
+    // can be left out.
+    virtual SPixelRect get_visible_area() const = 0;
 };
 
 // The render bridge to the engine's IRenderQOR: desktop pixels to device coordinates.
@@ -92,6 +104,7 @@ public:
     void render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_camera) override;
     IAviTexture *get_avi_texture(int _id) override;
     SRenderFigures get_frame_figures() const override { return m_last_frame; }
+    SPixelRect get_visible_area() const override { return m_visible; }
 
     // Attaches the engine's renderer and reads the real screen size from "scr_resx", "scr_resy".
     virtual void init(IRenderQOR *_p_render);
@@ -102,6 +115,7 @@ private:
 
     vec2_t to_device(point_t const &_p) const;
     bool has_render() const;
+    SPixelRect desktop_area() const { return SPixelRect{0, 0, m_res_w, m_res_h}; }
 
     IRenderQOR *mp_render; // not owned
     int m_in_draw_2d;
@@ -114,6 +128,18 @@ private:
     int m_scr_h;
     SRenderFigures m_frame;      // counted since the outermost begin_draw
     SRenderFigures m_last_frame; // the last frame that ended
+
+    // What the engine's clip may be, as far as the bridge can tell. A pop restores either the area
+    // set before its push or the one in force before that (the engine decides), so the visible
+    // area behind a pop is the rectangle round both.
+    struct SSavedClip {
+        SPixelRect m_visible, m_before;
+    };
+    static int const k_saved_clips = 16; // deeper pushes restore the whole desktop
+    SPixelRect m_visible;                // within the desktop
+    SPixelRect m_visible_before;         // in force before the last set_clip_area
+    SSavedClip m_saved[k_saved_clips];
+    int m_pushes;
 };
 
 } // namespace qorui

@@ -209,12 +209,17 @@ protected:
 
     // Asks filter_event, refreshes the global position, runs the callbacks of the event's type
     // (the virtual handler first), then passes the event to the children, back to front, or to
-    // the parent, as its dispatch type then says.
+    // the parent, as its dispatch type then says. The hit test goes only to the children for
+    // which is_hit_test_needed says so.
     virtual void on_event(CWndEvent const *_p_event) override;
     // Whether the window takes the event: a hidden window takes only update, set text, enable,
     // disable, show, resized and resource invalidate; a disabled one only draw, activate,
     // changed, show, hide, enable, resized, resource invalidate and report point inside.
     virtual bool filter_event(CWndEvent const *_p_event);
+    // Whether the hit test has to reach the window: false only when neither the window nor a child
+    // could report the point and nothing else listens. A class whose on_event or
+    // on_event_report_point_inside does more than the default answers true.
+    virtual bool is_hit_test_needed(point_t const &_global);
 
     // EVENT_UPDATE: passes it on to the children.
     virtual void on_event_update(CWndEvent const *_p_event);
@@ -336,7 +341,9 @@ private:
     CWindow(CWindow const &) = delete;
     CWindow &operator=(CWindow const &) = delete;
 
-    void register_handlers();
+    typedef void (CWindow::*handler_t)(CWndEvent const *);
+    static handler_t handler_of(EEventType _id);
+    void pass_hit_test(CWndEvent const *_p_event);
     void align_in_parent();
     void load_children(LuaPlus::LuaObject &_lo_table);
     void load_child(LuaPlus::LuaObject &_lo_child);

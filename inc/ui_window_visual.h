@@ -170,6 +170,8 @@ protected:
     virtual void on_event(CWndEvent const *_p_event) override;
     // As the window's, but a hidden window still draws while it fades out.
     virtual bool filter_event(CWndEvent const *_p_event) override;
+    // A window with sounds takes the hit test: a sound may hang on it.
+    virtual bool is_hit_test_needed(point_t const &_global) override;
     // Behind the window's: the movement, then auto hide.
     virtual void on_event_update(CWndEvent const *_p_event) override;
     // Behind the window's: the transparency of this frame, the clip area of the window's picture

@@ -38,6 +38,18 @@ void visible_tiles(int _start, int _tile, int _count, int _from, int _to, int &_
     _last = to > from ? static_cast<int>((to + _tile - 1) / _tile) : _first;
 }
 
+// A character's width in pixels at a font size: 0 for a charset without characters.
+int char_width(CCharset const &_charset, unsigned short _ch, float _size) {
+    CCharset::SChar const *p_char = _charset.get_char_description(_ch);
+    return p_char ? to_pixels(p_char->w * _size) : 0;
+}
+
+// Whether a quad of those edges, in any order, has a part inside the area.
+bool meets(SPixelRect const &_area, int _l, int _t, int _r, int _b) {
+    return std::max(_l, _r) > _area.m_l && std::min(_l, _r) < _area.m_r && std::max(_t, _b) > _area.m_t &&
+           std::min(_t, _b) < _area.m_b;
+}
+
 bool is_scan_space(unsigned short _c) {
     return _c == ' ' || (_c >= '\t' && _c <= '\r');
 }
@@ -265,35 +277,49 @@ size_t CCanvas::read_tag(CString const &_string, size_t _i, rgba_t const &_base,
     return close + 1;
 }
 
+// One quad per character, all of the font's material: one set_material before the first quad that
+// can be seen. Characters wholly outside the visible area are only measured; once the pen has
+// passed its right edge, and no character of the charset moves the pen back, the line is done.
 void CCanvas::text_out(int _x, int _y, CString const &_string, CFont *_p_font) {
     if (!_p_font || _string.empty()) return;
+    CMaterial *p_material = _p_font->get_char_material(_string[0]);
+    CCharset const *p_charset = _p_font->get_charset();
+    IRender *p_render = get_render();
+    if (!p_material || !QOR_CHECK_AS(p_charset, "mp_charset") || !p_render) return;
     float const size = _p_font->get_size();
-    int const line_h = to_pixels(size * _p_font->get_height());
-    CMaterial *p_material = nullptr;
-    rgba_t base, current;
+    float const height = p_charset->get_height();
+    point_t const o = origin();
+    int const t = _y + o.y, b = t + to_pixels(size * height);
+    SPixelRect const visible = p_render->get_visible_area();
+    if (!meets(visible, visible.m_l, t, visible.m_r, b)) return; // the line's rows can't be seen
+    bool const pen_only_grows = p_charset->has_no_negative_width() && size >= 0.0f;
+    rgba_t const base = p_material->get_color();
+    rgba_t current = base, faded = base;
+    fade_color(faded);
+    bool material_set = false;
     int x_cur = _x;
     size_t const length = _string.length();
     for (size_t i = 0; i < length; ++i) {
-        CMaterial *p_char_material = _p_font->get_char_material(_string[i]);
-        if (!p_char_material) return; // the font has reported it
-        if (p_material != p_char_material) {
-            p_material = p_char_material;
-            if (IRender *p_render = get_render()) p_render->set_material(p_material->get_material_handle());
-            base = current = p_material->get_color();
-        }
         if (m_tags_enable && _string[i] == '<' && i + 2 < length &&
             _string.find('>', i + 1) != wstring::npos) {
             i = read_tag(_string, i, base, current);
+            faded = current;
+            fade_color(faded);
             if (i >= length) break;
         }
-        CCharset::SChar const *p_char = _p_font->get_char_description(_string[i]);
+        CCharset::SChar const *p_char = p_charset->get_char_description(_string[i]);
         if (!p_char) continue;
-        p_material->set_color(current);
-        draw_rect(x_cur, _y, to_pixels(p_char->w * size), line_h, p_char->x, p_char->y, p_char->w,
-                  _p_font->get_height(), p_material);
+        int const l = x_cur + o.x, r = l + to_pixels(p_char->w * size);
+        if (meets(visible, l, t, r, b)) {
+            if (!material_set) p_render->set_material(p_material->get_material_handle());
+            material_set = true;
+            quad(p_render, l, t, r, b, p_char->x, p_char->y, p_char->x + p_char->w, p_char->y + height,
+                 faded);
+        } else if (pen_only_grows && l >= visible.m_r) {
+            break;
+        }
         x_cur = to_pixels(static_cast<float>(x_cur) + p_char->w * size);
     }
-    if (p_material) p_material->set_color(base);
 }
 
 void CCanvas::text_out(int _x, int _y, int _spacing, CText const &_text, CFont *_p_font) {
@@ -324,19 +350,22 @@ int CCanvas::get_text_height(CString const &, CFont *_p_font) {
 }
 
 int CCanvas::get_char_width(unsigned short _ch, CFont *_p_font) {
-    if (!_p_font) return 0;
-    CCharset::SChar const *p_char = _p_font->get_char_description(_ch);
-    return p_char ? to_pixels(p_char->w * _p_font->get_size()) : 0;
+    CCharset const *p_charset = _p_font ? _p_font->get_charset() : nullptr;
+    if (_p_font && !QOR_CHECK_AS(p_charset, "mp_charset")) return 0;
+    return p_charset ? char_width(*p_charset, _ch, _p_font->get_size()) : 0;
 }
 
 int CCanvas::get_text_width(CString const &_string, CFont *_p_font, int _count) {
     if (!_p_font) return 0;
+    CCharset const *p_charset = _p_font->get_charset();
+    if (!QOR_CHECK_AS(p_charset, "mp_charset")) return 0;
+    float const size = _p_font->get_size();
     size_t const count = _count >= 0 && _string.length() >= static_cast<size_t>(_count)
                              ? static_cast<size_t>(_count)
                              : _string.length();
     long long width = 0; // each character within k_far_pixels: no overflow here
     for (size_t i = 0; i < count; ++i)
-        width += get_char_width(_string[i], _p_font);
+        width += char_width(*p_charset, _string[i], size);
     return static_cast<int>(std::clamp<long long>(width, INT_MIN, INT_MAX));
 }
 

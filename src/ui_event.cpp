@@ -52,12 +52,12 @@ void CEventDispatcher::register_callback(EEventType const &_id, CEventCallback c
 }
 
 void CEventDispatcher::dispatch_event(CWndEvent const *_p_event) {
+    if (m_callbacks.empty()) return;
     auto const found = m_callbacks.find(_p_event->get_id());
     if (found == m_callbacks.end()) return;
     // A list's links stay valid when callbacks are appended during the walk.
     for (CEventCallback &callback : found->second) {
-        _p_event->rewind();
-        _p_event->mp_receiver = this;
+        begin_callback(_p_event);
         callback(_p_event);
     }
 }

@@ -16,12 +16,18 @@ namespace qorui {
 // Charsets
 // ---------------------------------------------------------------------------------------------
 
-CCharset::CCharset() : m_height(0.0625f) {}
+CCharset::CCharset() : m_no_negative_width(true), m_height(0.0625f) {}
 
-CCharset::SChar const *CCharset::get_char_description(unsigned short _code) const {
-    if (m_chars.empty()) return nullptr;
-    auto const found = m_chars.find(_code);
-    return found != m_chars.end() ? &found->second : &m_chars.begin()->second;
+// A code without a cell is drawn with the lowest code's cell, which the table's first place holds.
+void CCharset::set_chars(CCharMap const &_chars) {
+    m_cells.clear();
+    m_slots.assign(_chars.empty() ? 0 : static_cast<size_t>(_chars.rbegin()->first) + 1, 0);
+    m_no_negative_width = true;
+    for (auto const &entry : _chars) {
+        m_cells.push_back(entry.second);
+        m_slots[entry.first] = static_cast<uint32_t>(m_cells.size());
+        m_no_negative_width = m_no_negative_width && entry.second.w >= 0.0f;
+    }
 }
 
 void CCharset::init(char const *_p_name, LuaPlus::LuaObject _lo) {
@@ -58,17 +64,19 @@ void CCharset::load_from_nehe(char const *_file_name) {
         qordebug::warning("Cannot open '%s'", _file_name);
         return;
     }
+    CCharMap chars;
     try {
-        read_nehe(static_cast<char const *>(p_content), length);
+        read_nehe(static_cast<char const *>(p_content), length, chars);
     } catch (char const *) {
         // The file ends or breaks here; what was read stays.
     }
+    set_chars(chars);
     qor_free(p_content);
 }
 
 // [common], its key = value pairs, [chars], then dimension * dimension entries code = width, row
 // by row from the top.
-void CCharset::read_nehe(char const *_p_text, unsigned _length) {
+void CCharset::read_nehe(char const *_p_text, unsigned _length, CCharMap &_chars) {
     CTokenizerRules rules(_p_text, _length, default_separators());
     CTokenizer tokenizer(rules, 7, 0);
     int dimension = 16;
@@ -100,7 +108,7 @@ void CCharset::read_nehe(char const *_p_text, unsigned _length) {
             tokenizer.expect("=");
             tokenizer.next();
             float const width = static_cast<float>(tokenizer.as_float());
-            m_chars[code] =
+            _chars[code] =
                 SChar{static_cast<float>(column) / cells, static_cast<float>(row) / cells, width / cells};
         }
     }

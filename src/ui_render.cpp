@@ -5,6 +5,9 @@
 #include "qor_commands.h"
 #include "ui_debug.h"
 
+#include <algorithm>
+#include <climits>
+
 namespace qorui {
 
 namespace {
@@ -14,11 +17,32 @@ int screen_var(IVarManagerBase *_p_vars, char const *_name) {
     return p_var ? p_var->m_int_value : 0;
 }
 
+SPixelRect intersection(SPixelRect const &_a, SPixelRect const &_b) {
+    return SPixelRect{std::max(_a.m_l, _b.m_l), std::max(_a.m_t, _b.m_t), std::min(_a.m_r, _b.m_r),
+                      std::min(_a.m_b, _b.m_b)};
+}
+
+SPixelRect bounds(SPixelRect const &_a, SPixelRect const &_b) {
+    return SPixelRect{std::min(_a.m_l, _b.m_l), std::min(_a.m_t, _b.m_t), std::max(_a.m_r, _b.m_r),
+                      std::max(_a.m_b, _b.m_b)};
+}
+
+// No half-pixel offset: the desktop's corners are exactly (-1, 1) and (1, -1). In double, a
+// product by 2 / size gives the float of (p / size - 0.5) * 2 to the last bit, without a division.
+float device_x(int _x, int _res_w) {
+    return static_cast<float>(_x * (2.0 / _res_w) - 1.0);
+}
+
+float device_y(int _y, int _res_h) {
+    return static_cast<float>(1.0 - _y * (2.0 / _res_h));
+}
+
 } // namespace
 
 CRender::CRender()
     : mp_render(nullptr), m_in_draw_2d(0), m_in_draw_3d(0), m_res_w(0), m_res_h(0), m_scale_x(0.0f),
-      m_scale_y(0.0f), m_scr_w(0), m_scr_h(0), m_frame{0, 0, 0}, m_last_frame{0, 0, 0} {}
+      m_scale_y(0.0f), m_scr_w(0), m_scr_h(0), m_frame{0, 0, 0}, m_last_frame{0, 0, 0}, m_visible{0, 0, 0, 0},
+      m_visible_before{0, 0, 0, 0}, m_saved{}, m_pushes(0) {}
 
 void CRender::init(IRenderQOR *_p_render) {
     QOR_CHECK(_p_render);
@@ -33,22 +57,25 @@ void CRender::set_resolution(int _w, int _h) {
     m_res_h = _h;
     m_scale_x = 2.0f / static_cast<float>(_w);
     m_scale_y = 2.0f / static_cast<float>(_h);
+    m_visible = m_visible_before = desktop_area();
 }
 
 bool CRender::has_render() const {
     return QOR_CHECK(mp_render);
 }
 
-// No half-pixel offset: the desktop's corners are exactly (-1, 1) and (1, -1).
 vec2_t CRender::to_device(point_t const &_p) const {
-    return vec2_t{static_cast<float>((static_cast<double>(_p.x) / m_res_w - 0.5) * 2.0),
-                  static_cast<float>((static_cast<double>(_p.y) / m_res_h - 0.5) * -2.0)};
+    return vec2_t{device_x(_p.x, m_res_w), device_y(_p.y, m_res_h)};
 }
 
 // The outermost begin starts the frame's figures, and its end keeps them.
 void CRender::begin_draw() {
     if (!has_render()) return;
-    if (m_in_draw_2d == 0) m_frame = SRenderFigures{0, 0, 0};
+    if (m_in_draw_2d == 0) {
+        m_frame = SRenderFigures{0, 0, 0};
+        m_visible = m_visible_before = desktop_area(); // the engine's clip isn't known yet
+        m_pushes = 0;
+    }
     mp_render->begin_2d();
     ++m_in_draw_2d;
 }
@@ -83,21 +110,50 @@ void CRender::set_clip_area(int _x, int _y, int _w, int _h) {
     vec2_t const position = to_device(point_t{_x, _y + _h});
     vec2_t const size{_w * m_scale_x, _h * m_scale_y};
     mp_render->set_clip_rect(position, size);
+    m_visible_before = m_visible;
+    long long const r = static_cast<long long>(_x) + std::max(_w, 0);
+    long long const b = static_cast<long long>(_y) + std::max(_h, 0);
+    m_visible = intersection(SPixelRect{_x, _y, static_cast<int>(std::min<long long>(r, INT_MAX)),
+                                        static_cast<int>(std::min<long long>(b, INT_MAX))},
+                             desktop_area());
 }
 
 void CRender::push_clip_area() {
-    if (has_render()) mp_render->push_clip_rect();
+    if (!has_render()) return;
+    mp_render->push_clip_rect();
+    if (m_pushes < k_saved_clips) m_saved[m_pushes] = SSavedClip{m_visible, m_visible_before};
+    ++m_pushes;
 }
 
 void CRender::pop_clip_area() {
-    if (has_render()) mp_render->pop_clip_rect();
+    if (!has_render()) return;
+    mp_render->pop_clip_rect();
+    bool const known = m_pushes > 0 && m_pushes <= k_saved_clips;
+    m_visible =
+        known ? bounds(m_saved[m_pushes - 1].m_visible, m_saved[m_pushes - 1].m_before) : desktop_area();
+    m_visible_before = m_visible;
+    if (m_pushes > 0) --m_pushes;
 }
 
 void CRender::draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_p2, point_t const &_p3,
                         vec2_t const &_t0, vec2_t const &_t1, vec2_t const &_t2, vec2_t const &_t3,
                         rgba_t const &_c0, rgba_t const &_c1, rgba_t const &_c2, rgba_t const &_c3) {
     if (!has_render()) return;
-    vec2_t const d0 = to_device(_p0), d1 = to_device(_p1), d2 = to_device(_p2), d3 = to_device(_p3);
+    // The corners share their coordinates with their neighbours, as an upright rectangle's do: a
+    // coordinate equal to one converted before is taken from there.
+    auto beside = [this](point_t const &_p, point_t const &_a, vec2_t const &_a_device, point_t const &_b,
+                         vec2_t const &_b_device) {
+        return vec2_t{_p.x == _a.x   ? _a_device.x
+                      : _p.x == _b.x ? _b_device.x
+                                     : device_x(_p.x, m_res_w),
+                      _p.y == _a.y   ? _a_device.y
+                      : _p.y == _b.y ? _b_device.y
+                                     : device_y(_p.y, m_res_h)};
+    };
+    vec2_t const d0 = to_device(_p0);
+    vec2_t const d1 = beside(_p1, _p0, d0, _p0, d0);
+    vec2_t const d2 = beside(_p2, _p1, d1, _p0, d0);
+    vec2_t const d3 = beside(_p3, _p2, d2, _p0, d0);
     mp_render->draw_quad(d0, _t0, _c0, d1, _t1, _c1, d2, _t2, _c2, d3, _t3, _c3);
     ++m_frame.m_quads;
 }
@@ -117,6 +173,7 @@ void CRender::render_view(int _x, int _y, int _w, int _h, IRenderCamera *_p_came
                                 _h * m_scr_h / m_res_h);
     mp_render->render_view(_p_camera);
     end_draw_3d();
+    m_visible = m_visible_before = desktop_area(); // the view may leave the engine's clip as it likes
 }
 
 IAviTexture *CRender::get_avi_texture(int _id) {

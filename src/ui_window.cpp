@@ -60,54 +60,59 @@ CWindow::CWindow(CDesktop *_p_desktop, char const *_name)
     : m_dbg_lock_hide(false), m_id(_name), mp_parent(nullptr), mp_desktop(_p_desktop), m_is_hidden(false),
       m_is_disabled(false), m_is_passive(false), m_auto_delete(false), m_pointer_capture(false),
       m_is_maximaized(false), m_always_on_top(false), m_is_modal(false), m_can_drag(false),
-      m_can_resize(true), m_alignment(ALIGNMENT_NONE), m_pos{0, 0}, m_global_pos{0, 0}, m_normal_pos{0, 0} {
-    register_handlers();
-}
+      m_can_resize(true), m_alignment(ALIGNMENT_NONE), m_pos{0, 0}, m_global_pos{0, 0}, m_normal_pos{0, 0} {}
 
-// One callback per handler, before anything else can register; each calls the virtual handler, so
-// an override takes effect without registering anything.
-void CWindow::register_handlers() {
-    typedef void (CWindow::*handler_t)(CWndEvent const *);
-    static struct {
-        EEventType m_id;
-        handler_t m_handler;
-    } const handlers[] = {
-        {EVENT_UPDATE, &CWindow::on_event_update},
-        {EVENT_DRAW, &CWindow::on_event_draw},
-        {EVENT_HIDE, &CWindow::on_event_hide},
-        {EVENT_SHOW, &CWindow::on_event_show},
-        {EVENT_SHOW_MAXIMIZED, &CWindow::on_event_show_maximized},
-        {EVENT_SHOW_NORMAL, &CWindow::on_event_show_normal},
-        {EVENT_ACTIVATE, &CWindow::on_event_activate},
-        {EVENT_DEACTIVATE, &CWindow::on_event_deactivate},
-        {EVENT_LOST_FOCUS, &CWindow::on_event_lost_focus},
-        {EVENT_ENABLE, &CWindow::on_event_enable},
-        {EVENT_DISABLE, &CWindow::on_event_disable},
-        {EVENT_RESIZE, &CWindow::on_event_resize},
-        {EVENT_RESIZED, &CWindow::on_event_resized},
-        {EVENT_DRAG_BEGIN, &CWindow::on_event_drag_begin},
-        {EVENT_DRAG, &CWindow::on_event_drag},
-        {EVENT_DRAG_END, &CWindow::on_event_drag_end},
-        {EVENT_REPORT_POINT_INSIDE, &CWindow::on_event_report_point_inside},
-        {EVENT_POINTER_ENTER, &CWindow::on_event_pointer_enter},
-        {EVENT_POINTER_EXIT, &CWindow::on_event_pointer_exit},
-        {EVENT_POINTER_MOVE, &CWindow::on_event_pointer_move},
-        {EVENT_POINTER_POS, &CWindow::on_event_pointer_pos},
-        {EVENT_POINTER_DOWN, &CWindow::on_event_pointer_down},
-        {EVENT_POINTER_UP, &CWindow::on_event_pointer_up},
-        {EVENT_WHEEL_ROTATED, &CWindow::on_event_wheel_rotated},
-        {EVENT_CLICK, &CWindow::on_event_click},
-        {EVENT_DOUBLE_CLICK, &CWindow::on_event_double_click},
-        {EVENT_CHANGED, &CWindow::on_event_changed},
-        {EVENT_SET_TEXT, &CWindow::on_event_set_text},
-        {EVENT_SET_STR, &CWindow::on_event_set_str},
-        {EVENT_KEY_DOWN, &CWindow::on_event_key_down},
-        {EVENT_KEY_UP, &CWindow::on_event_key_up},
-        {EVENT_CHAR, &CWindow::on_event_char},
-        {EVENT_RESOURCE_INVALIDATE, &CWindow::on_event_resource_invalidate},
-    };
-    for (auto const &entry : handlers)
-        register_callback(entry.m_id, CEventCallback(this, entry.m_handler));
+// The default handler of each event type, or null: every window runs it before the callbacks
+// that anything registers on the window, and since it calls the virtual handler, an override takes
+// effect without registering anything.
+CWindow::handler_t CWindow::handler_of(EEventType _id) {
+    static struct SHandlers {
+        handler_t m_by_id[EVENT_RESOURCE_INVALIDATE + 1];
+        SHandlers() : m_by_id{} {
+            static struct {
+                EEventType m_id;
+                handler_t m_handler;
+            } const handlers[] = {
+                {EVENT_UPDATE, &CWindow::on_event_update},
+                {EVENT_DRAW, &CWindow::on_event_draw},
+                {EVENT_HIDE, &CWindow::on_event_hide},
+                {EVENT_SHOW, &CWindow::on_event_show},
+                {EVENT_SHOW_MAXIMIZED, &CWindow::on_event_show_maximized},
+                {EVENT_SHOW_NORMAL, &CWindow::on_event_show_normal},
+                {EVENT_ACTIVATE, &CWindow::on_event_activate},
+                {EVENT_DEACTIVATE, &CWindow::on_event_deactivate},
+                {EVENT_LOST_FOCUS, &CWindow::on_event_lost_focus},
+                {EVENT_ENABLE, &CWindow::on_event_enable},
+                {EVENT_DISABLE, &CWindow::on_event_disable},
+                {EVENT_RESIZE, &CWindow::on_event_resize},
+                {EVENT_RESIZED, &CWindow::on_event_resized},
+                {EVENT_DRAG_BEGIN, &CWindow::on_event_drag_begin},
+                {EVENT_DRAG, &CWindow::on_event_drag},
+                {EVENT_DRAG_END, &CWindow::on_event_drag_end},
+                {EVENT_REPORT_POINT_INSIDE, &CWindow::on_event_report_point_inside},
+                {EVENT_POINTER_ENTER, &CWindow::on_event_pointer_enter},
+                {EVENT_POINTER_EXIT, &CWindow::on_event_pointer_exit},
+                {EVENT_POINTER_MOVE, &CWindow::on_event_pointer_move},
+                {EVENT_POINTER_POS, &CWindow::on_event_pointer_pos},
+                {EVENT_POINTER_DOWN, &CWindow::on_event_pointer_down},
+                {EVENT_POINTER_UP, &CWindow::on_event_pointer_up},
+                {EVENT_WHEEL_ROTATED, &CWindow::on_event_wheel_rotated},
+                {EVENT_CLICK, &CWindow::on_event_click},
+                {EVENT_DOUBLE_CLICK, &CWindow::on_event_double_click},
+                {EVENT_CHANGED, &CWindow::on_event_changed},
+                {EVENT_SET_TEXT, &CWindow::on_event_set_text},
+                {EVENT_SET_STR, &CWindow::on_event_set_str},
+                {EVENT_KEY_DOWN, &CWindow::on_event_key_down},
+                {EVENT_KEY_UP, &CWindow::on_event_key_up},
+                {EVENT_CHAR, &CWindow::on_event_char},
+                {EVENT_RESOURCE_INVALIDATE, &CWindow::on_event_resource_invalidate},
+            };
+            for (auto const &entry : handlers)
+                m_by_id[entry.m_id] = entry.m_handler;
+        }
+    } const s_handlers;
+    unsigned const id = static_cast<unsigned>(_id);
+    return id <= EVENT_RESOURCE_INVALIDATE ? s_handlers.m_by_id[id] : nullptr;
 }
 
 CWindow::~CWindow() {
@@ -144,9 +149,17 @@ void CWindow::send_event(CWindow *_p_receiver, EEventType _id, CWndEvent::EDispa
 void CWindow::on_event(CWndEvent const *_p_event) {
     if (!filter_event(_p_event)) return;
     if (mp_parent) calc_global_pos();
+    if (handler_t const handler = handler_of(_p_event->get_id())) {
+        begin_callback(_p_event);
+        (this->*handler)(_p_event);
+    }
     dispatch_event(_p_event);
     switch (_p_event->get_dispatch_type()) {
     case CWndEvent::DISPATCH_CHILDREN:
+        if (_p_event->get_id() == EVENT_REPORT_POINT_INSIDE) {
+            pass_hit_test(_p_event);
+            break;
+        }
         // The end is read anew behind each child.
         for (size_t i = 0; i < m_children.size(); ++i)
             m_children[i]->on_event(_p_event);
@@ -287,6 +300,28 @@ void CWindow::on_event_drag(CWndEvent const *_p_event) {
     point_t const movement = _p_event->get<point_t>();
     point_t const pos = get_pos();
     set_pos(pos.x + movement.x, pos.y + movement.y);
+}
+
+// The hit test goes on only to the children that could report its point or that listen to it. The
+// point is read again behind each child that took the test: its callbacks may overwrite it.
+void CWindow::pass_hit_test(CWndEvent const *_p_event) {
+    auto point = [_p_event] {
+        _p_event->rewind();
+        return _p_event->get<point_t>();
+    };
+    point_t global = point();
+    for (size_t i = 0; i < m_children.size(); ++i) {
+        if (!m_children[i]->is_hit_test_needed(global)) continue;
+        m_children[i]->on_event(_p_event);
+        global = point();
+    }
+}
+
+// Children may stand outside the window, and anything that listens to the test must hear it.
+bool CWindow::is_hit_test_needed(point_t const &_global) {
+    if (!m_children.empty() || has_callbacks(EVENT_REPORT_POINT_INSIDE)) return true;
+    calc_global_pos();
+    return is_point_inside(_global);
 }
 
 void CWindow::on_event_report_point_inside(CWndEvent const *_p_event) {

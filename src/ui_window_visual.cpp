@@ -190,7 +190,16 @@ void CWindowVisual::on_event_drag_end(CWndEvent const *_p_event) {
 }
 
 // Highest z order first, so drawn first and farthest back; equal values keep their order.
+// Behind each child of a layout: children already in order, all of them visual, are left as they
+// are without sorting them again, which is what the stable sort would do with them. (A window that
+// isn't visual compares as neither before nor after, which the sort alone knows how to place.)
 void CWindowVisual::on_child_attached() {
+    bool in_order = true;
+    for (size_t i = 0; in_order && i < m_children.size(); ++i) {
+        CWindowVisual const *p_child = as_visual(m_children[i]);
+        in_order = p_child && (i == 0 || as_visual(m_children[i - 1])->m_z_order >= p_child->m_z_order);
+    }
+    if (in_order) return;
     std::stable_sort(m_children.begin(), m_children.end(), [](CWindow *p_a, CWindow *p_b) {
         CWindowVisual const *p_va = as_visual(p_a), *p_vb = as_visual(p_b);
         return p_va && p_vb && p_va->m_z_order > p_vb->m_z_order;
@@ -277,6 +286,11 @@ void CWindowVisual::on_event_draw(CWndEvent const *_p_event) {
 bool CWindowVisual::filter_event(CWndEvent const *_p_event) {
     if (m_is_hidden && _p_event->get_id() == EVENT_DRAW && m_transparency > 0.0f) return true;
     return CWindow::filter_event(_p_event);
+}
+
+// A sound may hang on the test itself.
+bool CWindowVisual::is_hit_test_needed(point_t const &_global) {
+    return !m_sounds.empty() || CWindow::is_hit_test_needed(_global);
 }
 
 void CWindowVisual::on_event(CWndEvent const *_p_event) {
