@@ -47,6 +47,9 @@ public:
     string const &get_str_c() const;
     char const *get_c() const { return get_str_c().c_str(); }
     // @}
+    // The UTF-8 form of a text of any length, valid until the next conversion of this object: what
+    // a saved layout holds.
+    string const &get_narrow() const;
 
     // One unit before _pos; a negative _pos appends.
     CString &insert(unsigned short _ch, int _pos);

@@ -158,7 +158,11 @@ CString &CString::operator=(CString const &_str) {
 string const &CString::get_str_c() const {
     size_t const len = length();
     QOR_CHECK(len < 256);
-    encode_utf8(data(), len, m_str_c);
+    return get_narrow();
+}
+
+string const &CString::get_narrow() const {
+    encode_utf8(data(), length(), m_str_c);
     return m_str_c;
 }
 

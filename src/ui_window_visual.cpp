@@ -621,7 +621,7 @@ void CWindowVisual::load_string(LuaPlus::LuaObject &_lo_table, char const *_key,
 void CWindowVisual::save_string(LuaPlus::LuaObject &_lo_table, char const *_key, CString const &_string) {
     IUserInterface *p_ui = engine_interfaces().get_user_interface(false);
     char const *p_local_key = p_ui ? p_ui->get_local_key(_string.c_str()) : nullptr;
-    _lo_table.SetString(_key, p_local_key ? p_local_key : _string.get_c());
+    _lo_table.SetString(_key, p_local_key ? p_local_key : _string.get_narrow().c_str());
 }
 
 void CWindowVisual::load_text(LuaPlus::LuaObject &_lo_table, char const *_key, CText &_text) {

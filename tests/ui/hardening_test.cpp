@@ -246,6 +246,25 @@ TEST_F(HardeningTest, AStringsKeyTooLongForItsNarrowFormIsReportedAndSkipped) {
     EXPECT_TRUE(capture.asserts().empty());
 }
 
+// A row's text of any length goes back whole into a saved layout, as does a caption, without the
+// contract that keys and commands keep to.
+TEST_F(HardeningTest, ALongTextOfALayoutIsSavedWhole) {
+    CWindow *p_box = get_windows_factory().Create(HUID("ListBox"), &m_world.desktop(), "box");
+    ASSERT_TRUE(p_box);
+    m_world.desktop().attach_child(p_box);
+    qortest::CReportCapture capture;
+    qortest::load_state(p_box, "{ name = 'box', class_name = 'ListBox', items = { item_0 = { column_0 = "
+                               "string.rep('\\208\\175', 300) } } }");
+    LuaPlus::LuaObject const saved = qortest::saved_state(p_box);
+    LuaPlus::LuaObject const text = saved.GetByName("items").GetByName("item_0").GetByName("column_0");
+    ASSERT_TRUE(text.IsString());
+    std::string expected;
+    for (int i = 0; i < 300; ++i)
+        expected += "\xD0\xAF";
+    EXPECT_EQ(expected, text.GetString());
+    EXPECT_TRUE(capture.reports().empty());
+}
+
 // The script module stays quiet under the import: a missing layout says nothing, missing presets
 // only the library's own error.
 TEST_F(HardeningTest, AnImportReportsOnlyWhatTheLibrarySays) {
