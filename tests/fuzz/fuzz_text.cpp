@@ -5,6 +5,7 @@
 #include "ui_text.h"
 #include "ui_window_visual.h"
 
+#include <algorithm>
 #include <string>
 
 extern "C" int LLVMFuzzerTestOneInput(uint8_t const *_p_data, size_t _size) {
@@ -16,8 +17,11 @@ extern "C" int LLVMFuzzerTestOneInput(uint8_t const *_p_data, size_t _size) {
         p_wnd->set_size(150, 100);
         return p_wnd;
     }();
+    // Narrow text becomes a string through a buffer of n_max_len units: longer text is the caller's
+    // to cut, as the data paths do.
     std::string const bytes(reinterpret_cast<char const *>(_p_data), _size);
-    qorui::CString const line(bytes.c_str(), static_cast<int>(bytes.size()));
+    int const size = static_cast<int>(std::min<size_t>(bytes.size(), qorui::CString::n_max_len - 1));
+    qorui::CString const line(bytes.c_str(), size);
     qorui::CText text(line);
     text.set_alignment(_size % 2 ? qorui::ALIGNMENT_CENTER : qorui::ALIGNMENT_NONE);
     qorui::CCanvas &canvas = sp_wnd->get_canvas();
