@@ -10,6 +10,8 @@
 #include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <condition_variable>
+#include <mutex>
 #include <thread>
 #include <tuple>
 #include <vector>
@@ -293,15 +295,23 @@ TEST(ThreadMonitor, TheSamplerSeesABusyThreadBusyAndASleepingOneIdle) {
             while (!done) {
             }
         });
+        // The sleeping thread waits on a condition rather than waking on a timer: a timer in step
+        // with the sampler's looks would have it runnable at every look.
+        std::mutex mutex;
+        std::condition_variable wake;
         std::thread sleeping([&] {
             sleeping_id = qorplatform::get_current_thread_id();
-            while (!done)
-                std::this_thread::sleep_for(std::chrono::milliseconds(20));
+            std::unique_lock<std::mutex> lock(mutex);
+            wake.wait(lock, [&] { return done.load(); });
         });
         std::this_thread::sleep_for(std::chrono::milliseconds(3200));
         int status;
         ASSERT_TRUE(monitor.refresh(&status));
-        done = true;
+        {
+            std::lock_guard<std::mutex> lock(mutex);
+            done = true;
+        }
+        wake.notify_one();
         busy.join();
         sleeping.join();
 
@@ -314,7 +324,7 @@ TEST(ThreadMonitor, TheSamplerSeesABusyThreadBusyAndASleepingOneIdle) {
         // up to half of all samples, less the more work there is.
         EXPECT_GE(busy_share, 10u);
         EXPECT_FALSE(busy_bars.empty());
-        EXPECT_LE(sleeping_share, 10u);
+        EXPECT_LE(sleeping_share, 10u) << "the busy thread had " << busy_share;
 
         monitor.update_processes();
         auto const &processes = monitor.get_processes();
