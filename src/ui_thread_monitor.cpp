@@ -18,7 +18,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <ctime>
 #include <fcntl.h>
 #include <linux/perf_event.h>
 #include <mutex>
@@ -302,12 +301,6 @@ unsigned const k_perf_pages = 8;          // data pages of each processor's buff
 int const k_proc_period_ms = 20;          // a look at /proc this often
 size_t const k_proc_threads_room = 4096;  // threads in state R that a look keeps the run times of
 
-int64_t monotonic_ns() {
-    timespec now;
-    clock_gettime(CLOCK_MONOTONIC, &now);
-    return int64_t(now.tv_sec) * 1000000000 + now.tv_nsec;
-}
-
 // One processor's clock event and the buffer that the kernel writes its samples into.
 struct SPerfEvent {
     int m_fd;
@@ -329,7 +322,7 @@ struct SClockMap {
     int64_t m_tsc0 = 0, m_ns0 = 0, m_tsc1 = 0, m_ns1 = 0;
 
     static void read(int64_t &_tsc, int64_t &_ns) {
-        _ns = monotonic_ns();
+        _ns = qorplatform::read_monotonic_ns();
         _tsc = qorplatform::read_hardware_time_stamp_counter();
     }
     void begin() {

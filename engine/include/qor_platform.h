@@ -11,12 +11,15 @@ uint32_t get_tick_count();
 int64_t query_performance_counter();
 // Counts of query_performance_counter per second: always 1e9.
 int64_t query_performance_frequency();
+// Nanoseconds of the kernel's monotonic clock, read each time and never replaced by a test's clock:
+// the clock that the kernel's own time stamps (of scheduler events, for one) are in.
+int64_t read_monotonic_ns();
 
 // A clock that replaces the system's: tests set the time themselves, so fades, double clicks
 // and blinks are exact. Null restores the system clock.
 struct IClock {
     virtual ~IClock() {}
-    virtual uint32_t tick_count() = 0;        // ms
+    virtual uint32_t tick_count() = 0;         // ms
     virtual int64_t performance_counter() = 0; // ns
 };
 // Puts the clock in place of the system clock; null restores the system clock. The caller
@@ -31,9 +34,15 @@ public:
     uint32_t tick_count() override { return m_ms; }
     int64_t performance_counter() override { return m_ns; }
     // Moves both counts forward; the millisecond count wraps like the system one.
-    void advance_ms(uint32_t _ms) { m_ms += _ms; m_ns += int64_t(_ms) * 1000000; }
+    void advance_ms(uint32_t _ms) {
+        m_ms += _ms;
+        m_ns += int64_t(_ms) * 1000000;
+    }
     // Moves the nanosecond count forward; the millisecond count follows it, truncated.
-    void advance_ns(int64_t _ns) { m_ns += _ns; m_ms = uint32_t(m_ns / 1000000); }
+    void advance_ns(int64_t _ns) {
+        m_ns += _ns;
+        m_ms = uint32_t(m_ns / 1000000);
+    }
 
 private:
     uint32_t m_ms;

@@ -21,12 +21,6 @@ namespace {
 IClock *gp_clock = nullptr;
 char g_module_error[512] = "";
 
-int64_t monotonic_ns() {
-    timespec now;
-    clock_gettime(CLOCK_MONOTONIC, &now);
-    return int64_t(now.tv_sec) * 1000000000 + now.tv_nsec;
-}
-
 // The time stamp counter in nanoseconds of the monotonic clock. Where the processor's counter runs
 // at one rate whatever its power state, reading it costs a fraction of a reading of the kernel's
 // clock, which a profiler pays twice for every stretch it times. The rate is measured once, over
@@ -45,7 +39,7 @@ public:
     }
 
     int64_t now_ns() const {
-        if (!m_usable) return monotonic_ns();
+        if (!m_usable) return read_monotonic_ns();
         return m_ns0 + static_cast<int64_t>(double(int64_t(__rdtsc()) - m_tsc0) * m_ns_per_count);
     }
 
@@ -66,7 +60,7 @@ private:
     static void read_both(int64_t &_tsc, int64_t &_ns) {
         for (int attempt = 0; attempt < 100; ++attempt) {
             int64_t const before = int64_t(__rdtsc());
-            _ns = monotonic_ns();
+            _ns = read_monotonic_ns();
             int64_t const after = int64_t(__rdtsc());
             _tsc = before + (after - before) / 2;
             if (after - before < 100000) return;
@@ -91,9 +85,15 @@ void keep_error(char const *_fallback) {
 
 } // namespace
 
+int64_t read_monotonic_ns() {
+    timespec now;
+    clock_gettime(CLOCK_MONOTONIC, &now);
+    return int64_t(now.tv_sec) * 1000000000 + now.tv_nsec;
+}
+
 uint32_t get_tick_count() {
     if (gp_clock) return gp_clock->tick_count();
-    return static_cast<uint32_t>(monotonic_ns() / 1000000); // wraps, as a 32-bit tick count does
+    return static_cast<uint32_t>(read_monotonic_ns() / 1000000); // wraps, as a 32-bit tick count does
 }
 
 int64_t query_performance_counter() {
