@@ -282,6 +282,7 @@ protected:
 
 private:
     void draw(int _x, int _y, int _w, int _h);
+    CFont *get_inherited_font(HUID const &_id);
     void set_margin(int &_margin, int _value);
     void update_movement();
     void update_auto_hide();

@@ -113,30 +113,29 @@ CMaterial *CWindowVisual::get_material(HUID const &_id) {
     return found == m_materials.end() ? nullptr : found->second.mp_resource;
 }
 
+// An entry that isn't the window's own keeps the ancestor's answer, null included, so that a
+// steady frame neither walks the tree nor adds a node.
 CFont *CWindowVisual::get_font(HUID const &_id) {
     auto const found = m_fonts.find(_id);
-    if (found != m_fonts.end() && found->second.mp_resource) return found->second.mp_resource;
-    CWindowVisual *p_ancestor = nullptr;
-    for (CWindow *p_wnd = mp_parent; p_wnd && !p_ancestor; p_wnd = p_wnd->get_parent())
-        p_ancestor = as_visual(p_wnd);
-    if (!p_ancestor) return nullptr;
-    CFont *p_font = p_ancestor->get_font(_id);
-    // A font looked up before has its entry already: no new node in a steady frame.
-    if (found == m_fonts.end())
-        m_fonts.emplace(_id, SResource<CFont>{_id, p_font, false});
-    else if (!found->second.m_owned)
-        found->second.mp_resource = p_font;
+    if (found != m_fonts.end() && (found->second.mp_resource || !found->second.m_owned))
+        return found->second.mp_resource;
+    CFont *p_font = get_inherited_font(_id);
+    if (found == m_fonts.end() && mp_parent) m_fonts.emplace(_id, SResource<CFont>{_id, p_font, false});
     return p_font;
 }
 
-// Cached fonts are dropped and looked up again; parents go first, so a child finds the fresh entry.
+// The nearest visual ancestor's font of the name; null without one.
+CFont *CWindowVisual::get_inherited_font(HUID const &_id) {
+    for (CWindow *p_wnd = mp_parent; p_wnd; p_wnd = p_wnd->get_parent())
+        if (CWindowVisual *p_ancestor = as_visual(p_wnd)) return p_ancestor->get_font(_id);
+    return nullptr;
+}
+
+// Cached fonts are looked up again; parents go first, so a child finds the fresh entry.
 void CWindowVisual::on_event_resource_invalidate(CWndEvent const *_p_event) {
     CWindow::on_event_resource_invalidate(_p_event);
-    for (auto &entry : m_fonts) {
-        if (entry.second.m_owned) continue;
-        entry.second.mp_resource = nullptr;
-        get_font(entry.first);
-    }
+    for (auto &entry : m_fonts)
+        if (!entry.second.m_owned) entry.second.mp_resource = get_inherited_font(entry.first);
 }
 
 // ---------------------------------------------------------------------------------------------
