@@ -124,6 +124,11 @@ private:
     int m_res_h;
     float m_scale_x; // 2 / m_res_w
     float m_scale_y; // 2 / m_res_h
+    // The same in double, by which pixels become device coordinates without a division each.
+    // @{
+    double m_step_x;
+    double m_step_y;
+    // @}
     int m_scr_w;
     int m_scr_h;
     SRenderFigures m_frame;      // counted since the outermost begin_draw

@@ -28,21 +28,21 @@ SPixelRect bounds(SPixelRect const &_a, SPixelRect const &_b) {
 }
 
 // No half-pixel offset: the desktop's corners are exactly (-1, 1) and (1, -1). In double, a
-// product by 2 / size gives the float of (p / size - 0.5) * 2 to the last bit, without a division.
-float device_x(int _x, int _res_w) {
-    return static_cast<float>(_x * (2.0 / _res_w) - 1.0);
+// product by the step 2 / size gives the float of (p / size - 0.5) * 2 to the last bit.
+float device_x(int _x, double _step_x) {
+    return static_cast<float>(_x * _step_x - 1.0);
 }
 
-float device_y(int _y, int _res_h) {
-    return static_cast<float>(1.0 - _y * (2.0 / _res_h));
+float device_y(int _y, double _step_y) {
+    return static_cast<float>(1.0 - _y * _step_y);
 }
 
 } // namespace
 
 CRender::CRender()
     : mp_render(nullptr), m_in_draw_2d(0), m_in_draw_3d(0), m_res_w(0), m_res_h(0), m_scale_x(0.0f),
-      m_scale_y(0.0f), m_scr_w(0), m_scr_h(0), m_frame{0, 0, 0}, m_last_frame{0, 0, 0}, m_visible{0, 0, 0, 0},
-      m_visible_before{0, 0, 0, 0}, m_saved{}, m_pushes(0) {}
+      m_scale_y(0.0f), m_step_x(0.0), m_step_y(0.0), m_scr_w(0), m_scr_h(0), m_frame{0, 0, 0},
+      m_last_frame{0, 0, 0}, m_visible{0, 0, 0, 0}, m_visible_before{0, 0, 0, 0}, m_saved{}, m_pushes(0) {}
 
 void CRender::init(IRenderQOR *_p_render) {
     QOR_CHECK(_p_render);
@@ -57,6 +57,8 @@ void CRender::set_resolution(int _w, int _h) {
     m_res_h = _h;
     m_scale_x = 2.0f / static_cast<float>(_w);
     m_scale_y = 2.0f / static_cast<float>(_h);
+    m_step_x = 2.0 / _w;
+    m_step_y = 2.0 / _h;
     m_visible = m_visible_before = desktop_area();
 }
 
@@ -65,7 +67,7 @@ bool CRender::has_render() const {
 }
 
 vec2_t CRender::to_device(point_t const &_p) const {
-    return vec2_t{device_x(_p.x, m_res_w), device_y(_p.y, m_res_h)};
+    return vec2_t{device_x(_p.x, m_step_x), device_y(_p.y, m_step_y)};
 }
 
 // The outermost begin starts the frame's figures, and its end keeps them.
@@ -145,10 +147,10 @@ void CRender::draw_quad(point_t const &_p0, point_t const &_p1, point_t const &_
                          vec2_t const &_b_device) {
         return vec2_t{_p.x == _a.x   ? _a_device.x
                       : _p.x == _b.x ? _b_device.x
-                                     : device_x(_p.x, m_res_w),
+                                     : device_x(_p.x, m_step_x),
                       _p.y == _a.y   ? _a_device.y
                       : _p.y == _b.y ? _b_device.y
-                                     : device_y(_p.y, m_res_h)};
+                                     : device_y(_p.y, m_step_y)};
     };
     vec2_t const d0 = to_device(_p0);
     vec2_t const d1 = beside(_p1, _p0, d0, _p0, d0);
