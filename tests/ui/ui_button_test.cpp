@@ -1,11 +1,9 @@
-// Push buttons, check boxes, radio buttons and static texts driven by the pointer: where caption,
-// checker and label go, the checker after a click, radio groups, the text events, the missing font,
-// and the layout keys. Each state's picture is in the controls' golden.
+// Push buttons, check boxes, radio buttons and static texts driven by the pointer: caption, checker
+// and label, clicks and radio groups, the missing font, text events and layout keys.
 #include "ui_button.h"
 #include "ui_static_text.h"
 
 #include "engine_interfaces.h"
-#include "interface_server.h"
 #include "log_manager.h"
 #include "test_world.h"
 #include "ui_font.h"
@@ -32,8 +30,6 @@ protected:
         for (unsigned char red = k_on; red <= k_body; ++red)
             mp_box->add_material(*ids[red - 1], m_world.colour(red, 0, 0));
     }
-    void TearDown() override { engine_interfaces().set_server(nullptr); }
-
     CFont *font() { return m_world.desktop().get_font(FNT_NAME_DEFAULT); }
     // The red bytes of a new frame's quads, glyphs left out.
     std::vector<int> frame_reds() {
@@ -86,18 +82,7 @@ TEST_F(ButtonsTest, TheCaptionIsCentredInTheClientAreaAndSinksWhilePressedUnderT
 // Without a font a button with a caption is logged, a check box draws no label quietly and a
 // static text reports the broken contract.
 TEST_F(ButtonsTest, WithoutAFontOnlyAButtonWithACaptionIsLoggedAndAStaticTextReports) {
-    // A log of the test's own behind the library, dropped before it goes.
-    struct SOwnLog {
-        qorhost::CInterfaceServer m_server;
-        qorhost::CLogManager m_log;
-        SOwnLog() {
-            m_log.set_quiet(true);
-            m_server.register_interface(&m_log);
-            engine_interfaces().set_server(&m_server);
-        }
-        ~SOwnLog() { engine_interfaces().set_server(nullptr); }
-    } own;
-    qorhost::CLogManager &log = own.m_log;
+    qorhost::CLogManager &log = m_world.host().log();
     button("silent", 0, "");
     button("named", 120, "X");
     m_world.desktop().add_font(FNT_NAME_DEFAULT, nullptr);

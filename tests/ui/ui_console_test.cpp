@@ -1,7 +1,5 @@
-// The developer console on the test host, driven as the engine drives it: keys and characters
-// through the service's listeners, frames through update. The log of every module in the history,
-// lines run as commands or "set", names completed, lines recalled, the limits of both lists, the
-// console key and the console's geometry in the configuration.
+// The developer console on the test host, driven through the service's listeners as the engine
+// drives it: the log in the history, lines run, completed and recalled, the console key, geometry.
 #include "ui.h"
 #include "ui_console.h"
 
@@ -9,6 +7,7 @@
 #include "qorbase.h"
 #include "test_host.h"
 #include "test_support.h"
+#include "test_world.h"
 #include "ui_desktop.h"
 #include "ui_edit_box.h"
 #include "ui_value_bar.h"
@@ -97,32 +96,24 @@ protected:
 TEST_F(ConsoleTest, TheLogOfEveryModuleShowsInTheHistoryAlsoWhileHidden) {
     ILogger *p_other = host().log().create_logger("OtherModule", "Other: ");
     p_other->write("a line of another module", 0);
-    EXPECT_NE("a line of another module", last_message()); // not before the next frame
     frame();
     EXPECT_EQ("a line of another module", last_message());
     unsigned const lines = history().get_num_strings();
     frame(); // nothing new: nothing shown again
     EXPECT_EQ(lines, history().get_num_strings());
-
     // Closed with a half-typed line: the line goes; what is logged meanwhile is there on opening.
     type("half typed");
-    EXPECT_EQ("half typed", line());
     key(k_console_key);
-    EXPECT_TRUE(console().is_hidden());
     EXPECT_EQ("<none>", line());
     p_other->write("first meanwhile", 0);
     p_other->write("second meanwhile", 1);
     frame();
     key(k_console_key);
-    ASSERT_FALSE(console().is_hidden());
     unsigned const count = history().get_num_strings();
     ASSERT_GE(count, 3u);
     EXPECT_EQ("first meanwhile", history_line(count - 3));
     EXPECT_EQ("second meanwhile", history_line(count - 2));
-
-    // The console key's characters never reach the line, nor does tab; the key itself neither.
-    service().on_key_down(k_console_key, 0); // closes
-    service().on_key_down(k_console_key, 0); // opens
+    // Neither the console key's characters nor tab reach the line.
     type("a`b~c\td");
     EXPECT_EQ("abcd", line());
 }
@@ -185,17 +176,13 @@ TEST_F(ConsoleTest, UpAndDownRecallEarlierLinesAndWrap) {
     EXPECT_EQ("<none>", line());
     for (char const *p_line : {"zq_alpha 1", "zq_alpha 2", "zq_alpha 3"})
         run(p_line);
-    struct {
-        unsigned m_key;
-        char const *mp_line;
-    } const steps[] = {
-        {k_up, "zq_alpha 3"},   {k_up, "zq_alpha 2"},   {k_up, "zq_alpha 1"},   {k_up, "zq_alpha 3"},
-        {k_down, "zq_alpha 2"}, {k_down, "zq_alpha 3"}, {k_down, "zq_alpha 1"},
-    };
-    for (size_t i = 0; i < sizeof(steps) / sizeof(steps[0]); ++i) {
-        SCOPED_TRACE(i);
-        key(steps[i].m_key);
-        EXPECT_EQ(steps[i].mp_line, line());
+    // The key, and the last digit of the line it recalls.
+    std::pair<unsigned, char> const steps[] = {{k_up, '3'},   {k_up, '2'},   {k_up, '1'},  {k_up, '3'},
+                                               {k_down, '2'}, {k_down, '3'}, {k_down, '1'}};
+    int n = 0;
+    for (auto const &step : steps) {
+        key(step.first);
+        EXPECT_EQ(std::string("zq_alpha ") + step.second, line()) << "step " << n++;
     }
 }
 
@@ -224,15 +211,12 @@ TEST_F(ConsoleTest, BothListsKeepToTheirBounds) {
 // handled in full: completed (here: nothing to offer) or run.
 TEST_F(ConsoleTest, AVeryLongLineIsReportedAndStillHandled) {
     std::string const long_text(300, 'x');
-    struct {
-        std::string m_typed;
-        unsigned m_key;
-    } const rows[] = {{long_text, k_tab}, {"zq_alpha " + long_text, k_return}};
+    std::pair<std::string, unsigned> const rows[] = {{long_text, k_tab}, {"zq_alpha " + long_text, k_return}};
     for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_key);
+        SCOPED_TRACE(row.second);
         qortest::CReportCapture capture;
-        type(row.m_typed);
-        key(row.m_key);
+        type(row.first);
+        key(row.second);
         ASSERT_FALSE(capture.asserts().empty());
         EXPECT_EQ(0u, capture.asserts()[0].find("Expression:   len < 256, \nFile: "));
         key(k_console_key); // closing clears the line
@@ -247,25 +231,17 @@ TEST_F(ConsoleTest, TheConsoleKeyShowsActivatesAndHides) {
     CDesktop *p_desktop = service().get_desktop();
     CWindowVisual *p_other = new CWindowVisual(p_desktop, "other");
     p_desktop->attach_child(p_other);
-    struct {
-        char const *mp_before;
-        bool m_hidden_after;
-    } const rows[] = {{"shown and active", true}, {"hidden", false}, {"shown, another window active", false}};
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.mp_before);
-        if (std::string(row.mp_before) == "shown, another window active")
-            p_desktop->set_active_window(p_other);
+    for (int const step : {0, 1, 2}) { // shown and active, hidden, shown with another window active
+        SCOPED_TRACE(step);
+        if (step == 2) p_desktop->set_active_window(p_other);
+        p_desktop->hide_pointer(); // opening brings the pointer back
         key(k_console_key);
-        EXPECT_EQ(row.m_hidden_after, console().is_hidden());
-        if (!row.m_hidden_after) {
+        EXPECT_EQ(step == 0, console().is_hidden());
+        EXPECT_EQ(step == 0, p_desktop->get_pointer().is_hidden());
+        if (step != 0) {
             EXPECT_EQ(&console(), static_cast<CWindow *>(p_desktop->get_active_window()));
         }
     }
-    // Opening brings back a hidden pointer.
-    p_desktop->hide_pointer();
-    key(k_console_key);
-    key(k_console_key);
-    EXPECT_FALSE(p_desktop->get_pointer().is_hidden());
 
     service().shutdown();
     service().init(true); // closed from the start
@@ -277,36 +253,21 @@ TEST_F(ConsoleTest, TheConsoleKeyShowsActivatesAndHides) {
 // history and the command line fill it, the command line two pixels below the history.
 TEST_F(ConsoleTest, TheGeometryComesFromTheConfigurationAndTheBoxesFillIt) {
     host().commands().run_line("ui_import no_layout_here.lua");
-    EXPECT_EQ(50, console().get_pos().x);
-    EXPECT_EQ(60, console().get_pos().y);
-    struct {
-        int m_w, m_h;
-        int m_history[4], m_command[4]; // x, y, w, h
-    } const rows[] = {
-        {300, 200, {4, 28, 292, 144}, {4, 174, 292, 20}},
-        {50, 50, {4, 28, 120, 72}, {4, 102, 120, 20}}, // the console's least size is 128 by 128
-    };
-    for (auto const &row : rows) {
-        SCOPED_TRACE(row.m_w);
-        if (row.m_w != 300) console().set_size(row.m_w, row.m_h);
-        for (auto const &box : {std::make_pair(console().get_history(), row.m_history),
-                                std::make_pair(console().get_command(), row.m_command)}) {
-            EXPECT_EQ(box.second[0], box.first->get_pos().x) << box.first->get_name();
-            EXPECT_EQ(box.second[1], box.first->get_pos().y) << box.first->get_name();
-            EXPECT_EQ(box.second[2], box.first->get_w()) << box.first->get_name();
-            EXPECT_EQ(box.second[3], box.first->get_h()) << box.first->get_name();
-        }
-    }
+    EXPECT_EQ("50,60 300x200", qortest::place_text(&console()));
+    EXPECT_EQ("4,28 292x144", qortest::place_text(console().get_history()));
+    EXPECT_EQ("4,174 292x20", qortest::place_text(console().get_command()));
+    console().set_size(50, 50); // the console's least size is 128 by 128
+    EXPECT_EQ("4,28 120x72", qortest::place_text(console().get_history()));
+    EXPECT_EQ("4,102 120x20", qortest::place_text(console().get_command()));
 
     console().set_pos(70, 80);
     service().shutdown();
-    IConfigSection *p_section = qorbase::find_config_section("ui");
-    vec2_t const pos = p_section->get_value("console_pos", false)->get_vec2(0, 0);
-    vec2_t const size = p_section->get_value("console_size", false)->get_vec2(0, 0);
-    EXPECT_EQ(70.0f, pos.x);
-    EXPECT_EQ(80.0f, pos.y);
-    EXPECT_EQ(128.0f, size.x);
-    EXPECT_EQ(128.0f, size.y);
+    std::vector<float> saved;
+    for (char const *p_key : {"console_pos", "console_size"}) {
+        vec2_t const value = qorbase::find_config_section("ui")->get_value(p_key, false)->get_vec2(0, 0);
+        saved.insert(saved.end(), {value.x, value.y});
+    }
+    EXPECT_EQ((std::vector<float>{70, 80, 128, 128}), saved);
     service().init(false); // for TearDown
 }
 

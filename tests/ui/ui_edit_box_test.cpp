@@ -1,6 +1,5 @@
-// The edit box and its caret, driven through the desktop: keys and characters into the text, the
-// caret's place and the text's sideways shift, the blink on the test's clock, the vertical bar
-// that comes with overflow and follows each change, automatic scrolling, and layouts.
+// The edit box and its caret driven through the desktop: keys and characters, the caret's place and
+// blink, the text's shift, the vertical bar with overflow, automatic scrolling, and layouts.
 #include "ui_edit_box.h"
 
 #include "engine_interfaces.h"

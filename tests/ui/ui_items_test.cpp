@@ -3,8 +3,6 @@
 #include "ui_items.h"
 
 #include "engine_interfaces.h"
-#include "qorscriptsystem.h"
-#include "test_support.h"
 #include "test_world.h"
 #include "ui_material.h"
 
@@ -12,10 +10,8 @@
 
 #include <functional>
 #include <sstream>
-#include <string>
 
 using namespace qorui;
-using qortest::lua_table;
 
 namespace {
 
@@ -211,7 +207,7 @@ TEST(ItemsTest, BadItemsTablesLoadWhatIsReadableAndReportOnlyWhatTheyMust) {
         SCOPED_TRACE(c.mp_table);
         CItems items;
         fill(items, "old");
-        LuaPlus::LuaObject table = lua_table(c.mp_table);
+        LuaPlus::LuaObject table = qortest::lua_table(c.mp_table);
         qortest::CReportCapture capture;
         items.load_state(table, &world.desktop());
         EXPECT_EQ(c.mp_after, state(items));

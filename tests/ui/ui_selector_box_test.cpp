@@ -97,34 +97,26 @@ TEST_F(SelectorBoxTest, TheButtonsAreSquaresAsHighAsTheBoxAtItsEnds) {
     }
 }
 
-// Each button wears clones of the desktop's arrows in its three pointer states; an arrow the
+// Each button wears clones of the desktop's arrows for its three pointer states; an arrow the
 // desktop lacks leaves that state to the button's plain look.
 TEST(SelectorBox, TheButtonsWearTheDesktopsArrowsByPointerState) {
     qortest::CWorld world;
-    world.clock().advance_ms(150);
     HUID const *arrows[] = {&MAT_NAME_BUTTON_LEFT, &MAT_NAME_BUTTON_LEFT_HIGHLIGHTED,
                             &MAT_NAME_BUTTON_LEFT_PUSHED, &MAT_NAME_BUTTON_RIGHT,
                             &MAT_NAME_BUTTON_RIGHT_HIGHLIGHTED};
     for (unsigned char n = 0; n < 5; ++n) // the right pushed arrow is left out
         world.desktop().add_material(*arrows[n], world.colour(n + 1, 0, 0));
-    CSelectorBox *p_box =
-        world.place(&world.desktop(), new CSelectorBox(&world.desktop(), "box"), 40, 50, 200, 24);
+    CSelectorBox *p_box = new CSelectorBox(&world.desktop(), "box");
+    world.desktop().attach_child(p_box);
     EXPECT_NE(world.desktop().get_material(MAT_NAME_BUTTON_LEFT),
               p_box->get_left_button()->get_material(MAT_NAME_NORMAL));
-    // Pointer away, over the left, pressed there, released and over the right, pressed there.
-    std::vector<std::vector<int>> const reds = {{1, 4}, {2, 4}, {3, 4}, {1, 5}, {1, 4}};
-    for (int i = 0; i < 5; ++i) {
-        SCOPED_TRACE(i);
-        if (i == 0) world.move_to(300, 200);
-        if (i == 1) world.move_to(50, 60);
-        if (i == 2 || i == 4) world.press();
-        if (i == 3) world.release(), world.move_to(230, 60);
-        world.frame();
-        std::vector<int> drawn;
-        for (auto const &quad : world.quads())
-            drawn.push_back(quad.m_colour.r);
-        EXPECT_EQ(reds[i], drawn);
-    }
+    std::vector<int> reds;
+    for (CButton *p_button : {p_box->get_left_button(), p_box->get_right_button()})
+        for (HUID const *p_state : {&MAT_NAME_NORMAL, &MAT_NAME_HIGHLIGHTED, &MAT_NAME_PUSHED}) {
+            CMaterial *p_material = p_button->get_material(*p_state);
+            reds.push_back(p_material ? p_material->get_color().r : 0);
+        }
+    EXPECT_EQ((std::vector<int>{1, 2, 3, 4, 5, 0}), reds);
 }
 
 // The row is clipped to the room between the buttons and margins; the icon is centred in a cell
@@ -201,8 +193,7 @@ TEST_F(SelectorBoxTest, TheRowsGoThroughALayoutUnderItemsAndBadItemsKeepTheRowsA
         {"items = 5", 3, 1},
         {"items = 'row'", 3, 1},
         {"items = true", 3, 1},
-        {"items = { item_0 = 7 }", 0, -1},
-        {"items = { item_0 = { column_0 = 'x' }, item_2 = { column_0 = 'z' } }", 1, -1},
+        {"items = { item_0 = { column_0 = 'x' } }", 1, -1},
     };
     for (auto const &row : rows) {
         SCOPED_TRACE(row.m_items);
