@@ -1,6 +1,5 @@
-// qorhost on the default data, as the main job runs it: the plaque, the demo scene, input
-// scripts, layouts exported and imported, the build-version page, bad arguments, and the host's
-// files: the configuration, exports over the shipped presets, classes missing from the factory.
+// qorhost on the default data, as the main job runs it: the plaque, the demo scene, input scripts,
+// layouts exported and imported, bad arguments, the configuration and the shipped presets.
 #include "image_io.h"
 #include "test_world.h"
 
@@ -90,25 +89,18 @@ TEST(HostEndToEnd, AMissingPlaqueShowsTheMissingTextureAndBadInputStopsTheHost) 
     EXPECT_NE(std::string::npos, bad_script.m_result.m_output.find("test.script:2: unknown step 'jump'"));
 }
 
-// Input scripts on the demo scene, each picture against its golden: the first dialog dragged by
-// its background (it moves by the second movement behind the press and comes to the front); the
-// controls worked (a check box and a radio button clicked, the volume bar's scroller dragged, a line
-// typed with a backspace and a caret move); the options dialog's lists (the display modes scrolled
-// by their bar and the wheel with a row clicked, the second tab chosen, the drop-down opened and a
-// row chosen); the build-version page shown and dumped to the output folder's first numbered file;
-// the second dialog resized by its lower right corner and its message box answered.
+// Input scripts on the demo scene, each picture against its golden: a dialog dragged, the controls
+// and the lists worked, the build-version page shown and dumped, a dialog resized and answered.
 TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
     struct {
         char const *m_script;
         std::vector<std::pair<char const *, char const *>> m_pictures; // the screenshot, its golden
-        char const *m_output, *m_file, *m_content;                     // what the run writes
+        char const *m_output;                                          // a line of the run's log
     } const runs[] = {
         {"move -212 -144   # onto the dialog's background\npress\nmove 1 0\nmove 99 50\nrelease\nwait 12\n"
          "screenshot dragged.png\ncommand gameui_demo scripted\n",
          {{"dragged.png", "demo_scene_dragged_1024x768"}},
-         "gameui_demo scripted",
-         nullptr,
-         nullptr},
+         "gameui_demo scripted"},
         {"wait 12\nmove 52 -254  # from the centre onto the check box (564, 130)\npress\nrelease\n"
          "move 240 30   # the radio button 'Hard' (804, 160)\npress\nrelease\nwait 2\nscreenshot "
          "clicked.png\n"
@@ -119,9 +111,7 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          {{"clicked.png", "controls_clicked_1024x768"},
           {"dragged.png", "controls_dragged_1024x768"},
           {"typed.png", "controls_typed_1024x768"}},
-         "",
-         nullptr,
-         nullptr},
+         ""},
         {"wait 12\nmove 450 170  # from the centre onto the list's scroller (962, 554)\n"
          "press\nmove 0 1\nmove 0 59\nrelease\nmove -262 40  # a row (700, 654)\n"
          "press\nrelease\nwheel -2\nwait 2\nscreenshot list.png\n"
@@ -131,15 +121,11 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          {{"list.png", "lists_scrolled_1024x768"},
           {"opened.png", "lists_drop_down_opened_1024x768"},
           {"chosen.png", "lists_drop_down_chosen_1024x768"}},
-         "",
-         nullptr,
-         nullptr},
+         ""},
         {"wait 1\ncommand gameui_show_stats build_version\ncommand print_stats_page\nwait 12\n"
          "screenshot version.png\n",
          {{"version.png", "build_version_page_1024x768"}},
-         "Out file: 'stats_build_version_demo_0000.txt'",
-         "stats_build_version_demo_0000.txt",
-         "qorui 1.0 (demo build)\n203\n"},
+         "Out file: 'stats_build_version_demo_0000.txt'"},
         {"wait 12\nmove -44 231  # from the centre onto the bottom border (468, 615)\n"
          "press\nmove 1 0\nmove 80 60\nrelease\nwait 2\nscreenshot resized.png\n"
          "move -209 -30 # the button 'Ask' of the new layout (340, 645)\n"
@@ -149,9 +135,7 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          {{"resized.png", "dialog_resized_1024x768"},
           {"asked.png", "dialog_asked_1024x768"},
           {"answered.png", "dialog_answered_1024x768"}},
-         "GameUI: answer Yes",
-         nullptr,
-         nullptr},
+         "GameUI: answer Yes"},
         // The graph profiler's phases take fixed shares of the manual clock's 16 ms a frame.
         {"wait 12\ncommand graph_profiler\nwait 30\n"
          "move -262 303 # from the centre onto the band of 'renderer' (250, 687)\n"
@@ -160,9 +144,7 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
          "screenshot profiler.png\ncommand graph_profiler\nmove 262 -250 # back to the centre\nwait 12\n"
          "screenshot hidden.png\n",
          {{"profiler.png", "graph_profiler_1024x768"}, {"hidden.png", "demo_scene_1024x768"}},
-         "",
-         nullptr,
-         nullptr},
+         ""},
     };
     for (auto const &run : runs) {
         SCOPED_TRACE(run.m_pictures[0].second);
@@ -171,16 +153,11 @@ TEST(HostEndToEnd, InputScriptsWorkTheDemoScene) {
         EXPECT_NE(std::string::npos, result.m_result.m_output.find(run.m_output)) << result.m_result.m_output;
         for (auto const &picture : run.m_pictures)
             result.expect_golden(picture.first, picture.second);
-        if (run.m_file) {
-            EXPECT_NE(std::string::npos,
-                      qortest::read_file(result.m_out + "/" + run.m_file).find(run.m_content));
-        }
     }
 }
 
-// The demo's layout imported into an empty desktop makes the demo library's scene with the
-// configured background, and over that scene changes no window's place; exported, imported and
-// exported again, the two files are the same.
+// The demo's layout imported into an empty desktop makes the demo's scene, and over that scene
+// changes no window's place; exported, imported and exported again, the files are the same.
 TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     std::string const data = data_copy(false);
     SRun const imported = run_host({"+ui_import", "demo_layout.lua", "+ui_export", "second.lua"}, data);
@@ -195,9 +172,8 @@ TEST(HostEndToEnd, TheDemoLayoutImportsAndExportsBackUnchanged) {
     EXPECT_EQ(qortest::read_file(data + "/ui/second.lua"), qortest::read_file(data + "/ui/third.lua"));
 }
 
-// The console on the demo scene: the console key opens it (its character goes nowhere), a line
-// typed and run exports the layout into the data folder, tab completes a command's name, and the
-// key closes it again onto the scene as it was.
+// The console key opens the console (its character goes nowhere), a line run exports the layout,
+// tab completes a command's name, and the key closes it onto the scene as it was.
 TEST(HostEndToEnd, TheConsoleOpensRunsACommandCompletesANameAndCloses) {
     std::string const data = data_copy(true);
     SRun const run = run_host({"--script", script("wait 12\n"
@@ -219,27 +195,8 @@ TEST(HostEndToEnd, TheConsoleOpensRunsACommandCompletesANameAndCloses) {
     run.expect_golden("closed.png", "demo_scene_1024x768");
 }
 
-// The configuration is read from the data folder on every run: an edit after a first run takes
-// effect on the next, although the first wrote the configuration back into the output folder.
-TEST(HostEndToEnd, AnEditOfTheDataFoldersConfigurationTakesEffect) {
-    std::string const data = data_copy(true), out = qortest::make_temp_dir();
-    SRun const first = run_host({"--frames", "1"}, data, out);
-    ASSERT_EQ(0, first.m_result.m_exit_code) << first.m_result.m_output;
-    EXPECT_NE(std::string::npos, first.m_result.m_output.find("Demo scene built"));
-    std::string const gdf = qortest::read_file(data + "/qor.gdf");
-    std::string const edited = gdf.substr(0, gdf.find("startup = ")) + "startup = gameui_demo edited\n";
-    qortest::write_file(data + "/qor.gdf", edited);
-
-    SRun const second = run_host({"--frames", "1"}, data, out);
-    ASSERT_EQ(0, second.m_result.m_exit_code) << second.m_result.m_output;
-    EXPECT_NE(std::string::npos, second.m_result.m_output.find("GameUI: gameui_demo edited"));
-    EXPECT_EQ(std::string::npos, second.m_result.m_output.find("Demo scene built"));
-    EXPECT_EQ(edited, qortest::read_file(data + "/qor.gdf"));
-}
-
-// The demo's materials are all presets, so its export writes every shipped preset back: the scene
-// built again from the written presets looks as before and exports the same files, and its layout
-// imported into an empty desktop gives the scene of the shipped layout.
+// The demo's export writes every shipped preset back: built again from them the scene looks and
+// exports the same, and its layout imported into an empty desktop gives the shipped layout's scene.
 TEST(HostEndToEnd, AnExportOfTheDemoKeepsEveryPresetAndTheLook) {
     std::string const data = data_copy(true), presets = data + "/ui/ui_material_presets.lua";
     std::string const shipped = qortest::read_file(presets);
@@ -268,26 +225,8 @@ TEST(HostEndToEnd, AnExportOfTheDemoKeepsEveryPresetAndTheLook) {
         .expect_golden("frame_0012.png", "demo_layout_imported_1024x768");
 }
 
-// A layout's child of a class that no module registered is left out with its subtree, and the
-// host's log names the class; the children beside it are made.
-TEST(HostEndToEnd, AnImportedChildOfAnUnregisteredClassIsNamedInTheLog) {
-    std::string const data = data_copy(false);
-    qortest::write_file(data + "/ui/unknown.lua",
-                        "ui_windows_ini = { [11] = { name = 'ghost', class_name = 'NoSuchWindow' },\n"
-                        "  [12] = { name = 'label', class_name = 'StaticText', text = 'seen' } }\n");
-    SRun const run = run_host({"--frames", "1", "+ui_import", "unknown.lua", "+ui_export", "back.lua"}, data);
-    ASSERT_EQ(0, run.m_result.m_exit_code) << run.m_result.m_output;
-    EXPECT_NE(std::string::npos,
-              run.m_result.m_output.find("Window class not registered: NoSuchWindow ('ghost' left out)"))
-        << run.m_result.m_output;
-    std::string const back = qortest::read_file(data + "/ui/back.lua");
-    EXPECT_EQ(std::string::npos, back.find("ghost"));
-    EXPECT_NE(std::string::npos, back.find("\"label\""));
-}
-
-// The thread strip over the demo scene on a recorded session of the host, so that the picture is
-// the same on every machine: a row for each of the recording's threads by the names it gave them,
-// and the rest of the system last. A recording that can't be read is reported and shows nothing.
+// The thread strip replays a recorded session (the same picture on every machine), a row for each
+// named thread and the rest of the system last; a recording that can't be read is reported.
 TEST(HostEndToEnd, TheThreadStripReplaysARecordingOverTheScene) {
     std::string const recording = qortest::source_dir() + "/tests/host/thread_rings.txt";
     SRun const run = run_host({"--script", script("command gameui_threads " + recording +

@@ -1,15 +1,9 @@
 // Local strings: the reader of strings files in both encodings (comments, keys, quoted texts,
-// broken lines, the line limit), the buffered reader under it, the service's lookups both ways,
-// and the build-version page that the service draws after the desktop.
-#include "ui.h"
+// broken lines, the line limit) and the buffered reader under it.
 #include "ui_local_strings.h"
 
 #include "qorbase.h"
-#include "test_host.h"
 #include "test_support.h"
-#include "ui_desktop.h"
-#include "ui_font.h"
-#include "ui_stats_page.h"
 
 #include <gtest/gtest.h>
 
@@ -124,6 +118,18 @@ TEST_F(LocalStringsTest, OnlyTheLast1024LinesCount) {
     EXPECT_EQ((lines_t{k_warning_head + "4\n'BROKEN x'\n\" expected"}), capture.warnings()); // file line 10
 }
 
+// A key too long for its narrow form is bad data: reported, and the lines around it are kept.
+TEST_F(LocalStringsTest, AKeyTooLongForItsNarrowFormIsReportedAndSkipped) {
+    qortest::CReportCapture capture;
+    table_t const table =
+        read(std::string(255, 'K') + " \"fits\"\n" + std::string(256, 'L') + " \"too long\"\nOK \"yes\"\n");
+    EXPECT_EQ(2u, table.size());
+    EXPECT_EQ(1u, table.count(std::string(255, 'K')));
+    ASSERT_EQ(1u, capture.warnings().size());
+    EXPECT_EQ(0u, capture.warnings()[0].find(k_warning_head + "2\n"));
+    EXPECT_TRUE(capture.asserts().empty());
+}
+
 // The buffered reader: small reads across its buffer, a short read at the end, and a stream it
 // doesn't own left open.
 TEST_F(LocalStringsTest, TheCachedReaderGivesTheFileInOrder) {
@@ -145,104 +151,4 @@ TEST_F(LocalStringsTest, TheCachedReaderGivesTheFileInOrder) {
     p_stream->seek(1);
     EXPECT_EQ(1u, p_stream->read(1, &byte)); // a stream it doesn't own stays open
     delete p_stream;
-}
-
-// ---------------------------------------------------------------------------------------------
-// The service
-// ---------------------------------------------------------------------------------------------
-
-namespace {
-
-// The service of the test host, started on a configuration that names the strings file.
-class ServiceStringsTest : public LocalStringsTest {
-protected:
-    void SetUp() override {
-        qortest::use_host_data_folders();
-        LocalStringsTest::SetUp();
-        qortest::write_file(m_dir + "/fonts.lua",
-                            qortest::read_file(qortest::source_dir() + "/data/ui/fonts.lua"));
-    }
-    void TearDown() override {
-        service().shutdown();
-        qorbase::set_gdf_path(nullptr);
-    }
-    // Init with "strings_filename = _name" (none for null) and a strings file of those bytes.
-    void init(char const *_name, std::string const &_bytes = "") {
-        // What the running service writes back (the console's place) goes to the old file first.
-        if (m_started) service().shutdown();
-        m_started = false;
-        qorbase::set_gdf_path(nullptr);
-        qortest::write_file(m_dir + "/test.lang", _bytes);
-        std::string gdf = "[ui]\n";
-        if (_name) gdf += std::string("strings_filename = ") + _name + "\n";
-        qortest::write_file(m_dir + "/qor.gdf", gdf + "[ui_libraries]\ngameui_library = libgameui_demo.so\n");
-        qorbase::set_gdf_path((m_dir + "/qor.gdf").c_str());
-        service().init(true);
-        m_started = true;
-    }
-    std::u16string text(char const *_key) { return units(service().get_local_string(_key)); }
-    std::string key(std::u16string const &_text) {
-        wstring const text(_text.begin(), _text.end());
-        char const *p_key = service().get_local_key(text.c_str());
-        return p_key ? p_key : "(null)";
-    }
-    CUserInterface &service() { return *static_cast<CUserInterface *>(qortest::shared_host().ui()); }
-
-    bool m_started = false;
-};
-
-} // namespace
-
-TEST_F(ServiceStringsTest, TheTableIsLookedUpBothWaysKeptWhenAFileCannotBeOpenedAndRussianByDefault) {
-    init("test.lang", "B_SECOND \"same\"\nA_FIRST \"same\"\nOTHER \"Other\"\n");
-    EXPECT_EQ(u"Other", text("OTHER"));
-    EXPECT_EQ("OTHER", key(u"Other"));
-    EXPECT_EQ("A_FIRST", key(u"same")); // in key order, not file order
-    EXPECT_EQ("(null)", key(u"other")); // exact: no folding of case
-
-    qortest::CReportCapture capture;
-    init("missing.lang");
-    EXPECT_EQ((lines_t{"Cannot open 'missing.lang'.\nPlease specify a valid file name as a value for "
-                       "'strings_filename' parameter in GDF"}),
-              capture.warnings());
-    EXPECT_EQ(u"Other", text("OTHER"));
-    EXPECT_NE(nullptr, service().get_desktop()); // init went on
-    // Without a name, the Russian file of the data.
-    qorbase::set_category_root(qorbase::FILE_CATEGORY_UI, (qortest::source_dir() + "/data/ui").c_str());
-    init(nullptr);
-    EXPECT_EQ(u"\u041E\u041A", text("DEMO_OK"));
-    EXPECT_EQ(1u, capture.warnings().size());
-}
-
-TEST_F(ServiceStringsTest, TheBuildVersionPageIsDrawnAfterTheDesktopWhenShown) {
-    init("test.lang");
-    qorhost::CRecordingRenderer &recorder = qortest::shared_host().recorder();
-    service().draw(); // the page is made at the first drawn frame
-    CStatsPage *p_page = static_cast<CStatsPage *>(service().get_stats_page("build_version"));
-    ASSERT_NE(nullptr, p_page);
-    EXPECT_FALSE(p_page->is_show());
-    recorder.clear();
-    service().draw(); // hidden: the frame is the desktop's alone
-    size_t const desktop_calls = recorder.calls().size();
-
-    // Shown, a 2D batch of its own follows: the two lines in the fixed font at size 300.
-    CFont *p_font = service().get_desktop()->get_font(FNT_NAME_FIXED);
-    float const size = p_font->get_size();
-    p_page->show(true);
-    recorder.clear();
-    service().draw();
-    p_page->show(false);
-    std::vector<qorhost::SRenderCall> const &calls = recorder.calls();
-    ASSERT_GT(calls.size(), desktop_calls);
-    EXPECT_EQ("begin_2d", calls[desktop_calls].m_op);
-    std::vector<qorhost::SRenderCall> quads;
-    for (size_t i = desktop_calls; i < calls.size(); ++i)
-        if (calls[i].m_op == "draw_quad") quads.push_back(calls[i]);
-    ASSERT_EQ(std::string("qorui 1.0 (demo build)203").size(), quads.size());
-    EXPECT_EQ(size, p_font->get_size()); // restored
-    // The sheet stands at (20, 20): the version's first character on line 47, "203" on line 48.
-    int const line_h = static_cast<int>(300.0f * p_font->get_height());
-    EXPECT_FLOAT_EQ(-1.0f + 2.0f * 20 / 1024, quads[0].m_points[0].x);
-    EXPECT_FLOAT_EQ(1.0f - 2.0f * (20 + 47 * line_h) / 768, quads[0].m_points[0].y);
-    EXPECT_FLOAT_EQ(1.0f - 2.0f * (20 + 48 * line_h) / 768, quads[22].m_points[0].y);
 }

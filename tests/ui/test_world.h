@@ -1,9 +1,6 @@
-// One world for the library's tests: a desktop of its own on the host's software renderer, with a
-// recorder of the calls in front of it, the default fonts of the data folder, a clock that the test
-// holds, and the test host's engine interfaces (log, sound, variables, commands) behind the
-// library. Input goes through the desktop as the engine's would (pointer moves, presses, keys,
-// characters), frames are update and draw, and a frame is compared with a checked-in golden
-// picture. Beside it: readable records of events and Lua tables from text.
+// One world for the library's tests: a desktop on the host's software renderer behind a recorder,
+// the default fonts, the test's clock and the test host's engine interfaces; input through the
+// desktop, frames, golden pictures, readable records of events and Lua tables from text.
 #pragma once
 #include "host.h"
 #include "qor_platform.h"

@@ -123,8 +123,10 @@ TEST_F(CanvasTest, TextIsOneQuadPerCharacterOfWholePixelsWithTagsInterpreted) {
     EXPECT_EQ(rgba_t(9, 8, 7, 6), chars[2].m_colour);
     EXPECT_EQ(rgba_t(9, 8, 7, 6), mp_font->get_char_material('a')->get_color()); // restored
     EXPECT_FLOAT_EQ(0.5f, quad_calls()[1].m_uvs[0].x);                           // 'b': the third cell
+    // The numbers of a colour tag are read up to the end of the string, past any blanks, as the
+    // standard scan of unsigned numbers reads them.
     struct {
-        char const *mp_text;
+        std::string m_text;
         size_t m_quads;
         rgba_t m_last;
     } const rows[] = {
@@ -137,10 +139,12 @@ TEST_F(CanvasTest, TextIsOneQuadPerCharacterOfWholePixelsWithTagsInterpreted) {
         {"<color 1 2 3 4><color 5 6 7 8>x", 16, rgba_t(1, 2, 3, 4)}, // the second tag is text
         {"<color1 2 3 4>x", 1, rgba_t(1, 2, 3, 4)},                  // "color" needs no delimiter
         {"<Color 1 2 3 4>x", 1, rgba_t(9, 8, 7, 6)},                 // and is case-sensitive
+        {"<color" + std::string(300, '\t') + "+0000000000000255 1 2 3>x", 1, rgba_t(255, 1, 2, 3)},
+        {"<color -1 99999999999999999999999 -99999999999999999999999 260>x", 1, rgba_t(255, 255, 255, 4)},
     };
     for (auto const &row : rows) {
-        SCOPED_TRACE(row.mp_text);
-        chars = text_quads(row.mp_text);
+        SCOPED_TRACE(row.m_text);
+        chars = text_quads(row.m_text.c_str());
         ASSERT_EQ(row.m_quads, chars.size());
         EXPECT_EQ(row.m_last, chars.back().m_colour);
     }

@@ -1,8 +1,5 @@
-// Work that can't be seen is left out, and nothing else changes: the characters of a text that lie
-// wholly outside the clip area aren't sent (those that can be seen are sent exactly as without a
-// clip), the visible area behind a pop covers both areas the engine may restore, device
-// coordinates keep their exact values, and the hit test still reaches every window that could
-// answer or that listens.
+// Work that can't be seen is left out, and nothing else changes: culled text, the visible area
+// behind a pop, exact device coordinates, the pruned hit test and the layout's order.
 #include "engine_interfaces.h"
 #include "qorbase.h"
 #include "test_world.h"
@@ -177,8 +174,8 @@ TEST(HitTest, ReachesAChildOutsideItsParentAListenerAndAWiderOwnTest) {
     EXPECT_EQ((std::vector<std::string>{"205,205", "100,100", "305,5"}), heard);
 }
 
-// Children of a layout already in order aren't sorted again; those that aren't are, and a window
-// that isn't visual among them leaves the order to the sort.
+// A layout's children are sorted by z order, highest first (drawn first, farthest back), whether
+// or not they came in order; a window that isn't visual among them leaves the order to the sort.
 TEST(LayoutOrder, ChildrenKeepTheOrderThatTheSortGivesThem) {
     struct {
         char const *mp_children;
@@ -207,5 +204,6 @@ TEST(LayoutOrder, ChildrenKeepTheOrderThatTheSortGivesThem) {
         for (unsigned i = 0; i < p_root->get_children_count(); ++i)
             order += p_root->get_child(i)->get_name();
         EXPECT_EQ(row.mp_order, order);
+        EXPECT_TRUE(qortest::saved_state(p_root).GetByName("z_order").IsNil());
     }
 }

@@ -1,7 +1,5 @@
-// The graph profiler in the test world, timed by the clock the test holds: the tree that nesting
-// builds, the times moved into the rings per frame, rings that follow the window's width and
-// scroll, the band under the pointer, a node taken out by a double click and brought back by the
-// drop-down list, measuring switched off and on, the contract checks, and the dialog's layout.
+// The graph profiler in the test world on the test's clock: the tree, the rings and their graphs,
+// the bands under the pointer, nodes taken out and brought back, pauses, contracts and layouts.
 #include "ui_graph_profiler.h"
 
 #include "test_common.h"
@@ -21,13 +19,7 @@ using namespace qorui;
 
 namespace {
 
-struct SPoint {
-    int x, y;
-    bool operator==(SPoint const &_o) const { return x == _o.x && y == _o.y; }
-};
-std::ostream &operator<<(std::ostream &_out, SPoint const &_p) {
-    return _out << "(" << _p.x << "," << _p.y << ")";
-}
+typedef std::pair<int, int> point_pair_t;
 
 class GraphProfilerTest : public ::testing::Test {
 protected:
@@ -82,14 +74,14 @@ protected:
     }
     // The line strip that the last frame drew in _colour, as the profiler's own pixels: the start
     // of the first line, then the end of each.
-    std::vector<SPoint> strip(rgba_t const &_colour) {
+    std::vector<point_pair_t> strip(rgba_t const &_colour) {
         float const half_w = m_world_w / 2.0f, half_h = m_world_h / 2.0f;
         point_t const origin = mp_profiler->get_global_pos();
         auto pixel = [&](vec2_t const &_p) {
-            return SPoint{static_cast<int>(std::lround((_p.x + 1.0f) * half_w)) - origin.x,
-                          static_cast<int>(std::lround((1.0f - _p.y) * half_h)) - origin.y};
+            return point_pair_t{static_cast<int>(std::lround((_p.x + 1.0f) * half_w)) - origin.x,
+                                static_cast<int>(std::lround((1.0f - _p.y) * half_h)) - origin.y};
         };
-        std::vector<SPoint> points;
+        std::vector<point_pair_t> points;
         for (qorhost::SRenderCall const &call : m_world.recorder().calls()) {
             if (call.m_op != "draw_line" || !(call.m_colours[0] == _colour)) continue;
             if (points.empty()) points.push_back(pixel(call.m_points[0]));
@@ -153,17 +145,16 @@ TEST_F(GraphProfilerTest, EachFrameMovesTheNodesTimesIntoTheirRings) {
     }
 }
 
-// The ring [4000, 1000, 2000, 3000] with its next slot 1, at a new width, then one frame. A
-// narrower ring loses the end of its storage, a wider one gains zeros. The graph starts at the
-// oldest sample, one pixel an update and one of height a millisecond above the window's foot, and
-// a sample above the window stops at its top.
+// The ring [4000, 1000, 2000, 3000] (next slot 1) at a new width, then a frame: narrower loses the
+// end of its storage, wider gains zeros; the graph runs from the oldest sample, a pixel an update
+// and a millisecond, clamped at the window's top.
 TEST_F(GraphProfilerTest, TheRingFollowsTheWindowsWidthAndTheGraphScrolls) {
     struct {
         int m_w;
         unsigned m_ms;
         std::vector<uint64_t> m_ring;
         uint32_t m_pos;
-        std::vector<SPoint> m_strip;
+        std::vector<point_pair_t> m_strip;
     } const rows[] = {
         {4, 5, {4000, 5000, 2000, 3000}, 2, {{0, 140}, {0, 138}, {1, 137}, {2, 136}, {3, 135}}},
         {6,
@@ -192,10 +183,9 @@ TEST_F(GraphProfilerTest, TheRingFollowsTheWindowsWidthAndTheGraphScrolls) {
     }
 }
 
-// Three bands of (140 - 20) / 3 = 40 pixels below the drop-down list, counted from the top, the
-// one under the pointer drawn in the checked material; over the drop-down the band stays. A double
-// click takes the band's node out, to a row of the drop-down at the next update; choosing the row
-// brings it back at the update after, and the row goes.
+// Three bands of (140 - 20) / 3 = 40 pixels under the drop-down, the pointed one marked (over the
+// drop-down it stays); a double click takes its node out to a row of the drop-down, choosing the
+// row brings it back.
 TEST_F(GraphProfilerTest, ADoubleClickTakesANodeOutAndTheDropDownBringsItBack) {
     run("+a - +b -");
     frame();

@@ -184,32 +184,23 @@ TEST_F(ThreadMonitorTest, BarsAndBusyShareAtTheEdgesOfThePeriod) {
 
 // The first refresh fetches at once; the next one within 2000 ms leaves the samples alone. Before
 // the first, the counter's frequency is unknown and the activity changes nothing.
-TEST(ThreadMonitor, RefreshFetchesAtMostEveryTwoSecondsAndMeasuresTheCounterFirst) {
-    qorplatform::CManualClock clock(10000);
-    qorplatform::set_clock(&clock);
-    CThreadRingsRecording device(ring_of({{7, 70, 1}}).data());
-    CThreadMonitor monitor(&device);
+TEST_F(ThreadMonitorTest, RefreshFetchesAtMostEveryTwoSecondsAndMeasuresTheCounterFirst) {
+    std::vector<unsigned char> const first = ring_of({{7, 70, 1}}), second = ring_of({{8, 80, 1}});
+    m_device.set_buffer(first.data());
     qor_vector<SActivitySegment> segments(1, SActivitySegment{5, 6});
     unsigned per_mille = 12345;
-    monitor.get_thread_activity(7, 70, segments, 100, 2, &per_mille);
+    m_monitor.get_thread_activity(7, 70, segments, 100, 2, &per_mille);
     EXPECT_EQ(1u, segments.size());
     EXPECT_EQ(12345u, per_mille);
-
-    clock.advance_ms(16);
     int status = -1;
-    EXPECT_TRUE(monitor.refresh(&status));
-    EXPECT_EQ(0, status);
-    EXPECT_EQ(70u, monitor.get_samples()[k_ring_samples - 1].m_thread_id);
-    EXPECT_EQ(1000000000, monitor.get_ticks_per_second());
-
-    device.set_buffer(ring_of({{8, 80, 1}}).data());
-    clock.advance_ms(1999);
-    EXPECT_TRUE(monitor.refresh(&status));
-    EXPECT_EQ(70u, monitor.get_samples()[k_ring_samples - 1].m_thread_id);
-    clock.advance_ms(1);
-    EXPECT_TRUE(monitor.refresh(&status));
-    EXPECT_EQ(80u, monitor.get_samples()[k_ring_samples - 1].m_thread_id);
-    qorplatform::set_clock(nullptr);
+    for (auto const &step : std::vector<std::pair<unsigned, unsigned>>{{16, 70}, {1999, 70}, {1, 80}}) {
+        m_clock.advance_ms(step.first);
+        EXPECT_TRUE(m_monitor.refresh(&status));
+        EXPECT_EQ(0, status);
+        EXPECT_EQ(step.second, m_monitor.get_samples()[k_ring_samples - 1].m_thread_id) << step.first;
+        m_device.set_buffer(second.data());
+    }
+    EXPECT_EQ(1000000000, m_monitor.get_ticks_per_second());
 }
 
 TEST(ThreadMonitor, ADeviceThatCantBeReachedFailsTheRefreshAndKeepsTheSamples) {

@@ -86,22 +86,13 @@ TEST_F(VisualTest, TheMaterialFollowsThePointerAndTheState) {
     }
 }
 
-TEST_F(VisualTest, FontsAreInheritedAndZOrderSortsChildrenFromTheLayout) {
+// Fonts are inherited and saved only where they were set; materials aren't inherited.
+TEST_F(VisualTest, FontsAreInheritedAndSavedWhereTheyWereSet) {
     CWindowVisual *p_root = child("root");
-    qortest::load_state(p_root, ("{ name = 'root', class_name = 'WindowVisual',"
-                                 " { name = 'a', class_name = 'WindowVisual', z_order = 5 },"
-                                 " { name = 'b', class_name = 'WindowVisual', z_order = 1 },"
-                                 " { name = 'c', class_name = 'WindowVisual', z_order = 9 } }"));
-    std::string order;
-    for (unsigned i = 0; i < p_root->get_children_count(); ++i)
-        order += p_root->get_child(i)->get_name();
-    EXPECT_EQ("cab", order); // highest first: drawn first, farthest back
-    EXPECT_TRUE(qortest::saved_state(p_root).GetByName("z_order").IsNil());
-
-    CWindowVisual *p_label = static_cast<CWindowVisual *>(p_root->get_child(0u));
+    CWindowVisual *p_label = child("label", 10, 10, p_root);
     p_root->add_material(MAT_NAME_NORMAL, m_world.colour(1, 0, 0));
     EXPECT_EQ(m_world.desktop().get_font(FNT_NAME_DEFAULT), p_label->get_font(FNT_NAME_DEFAULT));
-    EXPECT_EQ(nullptr, p_label->get_material(MAT_NAME_NORMAL)); // materials aren't inherited
+    EXPECT_EQ(nullptr, p_label->get_material(MAT_NAME_NORMAL));
     CFont *p_mono = get_fonts_factory().create("courier", &m_world.desktop());
     p_root->add_font(FNT_NAME_DEFAULT, p_mono); // replaces the caches below it
     EXPECT_EQ(p_mono, p_label->get_font(FNT_NAME_DEFAULT));
