@@ -80,7 +80,8 @@ TEST_F(ButtonsTest, TheCaptionIsCentredInTheClientAreaAndSinksWhilePressedUnderT
 }
 
 // Without a font a button with a caption is logged, a check box draws no label quietly and a
-// static text reports the broken contract.
+// static text reports the broken contract. A button font given later, after the button has looked
+// for one and found none, is taken at the next frame.
 TEST_F(ButtonsTest, WithoutAFontOnlyAButtonWithACaptionIsLoggedAndAStaticTextReports) {
     qorhost::CLogManager &log = m_world.host().log();
     button("silent", 0, "");
@@ -95,6 +96,11 @@ TEST_F(ButtonsTest, WithoutAFontOnlyAButtonWithACaptionIsLoggedAndAStaticTextRep
     m_world.frame();
     ASSERT_EQ(1u, capture.asserts().size());
     EXPECT_EQ(0u, capture.asserts()[0].find("Expression:   p_font, \n")) << capture.asserts()[0];
+
+    CFont *p_button_font = get_fonts_factory().create("courier", &m_world.desktop());
+    m_world.desktop().add_font(FNT_NAME_BUTTON, p_button_font);
+    m_world.frame();
+    EXPECT_EQ(1u, m_world.glyphs(p_button_font).size());
 }
 
 // The checker stands at the left edge, centred; the label half a checker width beyond it; both are
