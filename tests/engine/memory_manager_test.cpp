@@ -10,10 +10,9 @@
 #include <cstddef>
 #include <cstdlib>
 #include <cstring>
-#include <dlfcn.h>
+#include <fcntl.h>
 #include <malloc.h>
 #include <spawn.h>
-#include <sstream>
 #include <string>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -87,8 +86,15 @@ bool child_passes(char const *_filter, char const *_backend) {
     for (std::string &entry : env_text)
         envp.push_back(&entry[0]);
     envp.push_back(nullptr);
+    // The child's output stays out of this test's: a test runner that reads "SKIPPED" in it would
+    // take this test for skipped, whatever its result.
+    posix_spawn_file_actions_t quiet;
+    posix_spawn_file_actions_init(&quiet);
+    posix_spawn_file_actions_addopen(&quiet, STDOUT_FILENO, "/dev/null", O_WRONLY, 0);
     pid_t child = 0;
-    if (posix_spawn(&child, self, nullptr, nullptr, argv, envp.data()) != 0) return false;
+    int const spawned = posix_spawn(&child, self, &quiet, nullptr, argv, envp.data());
+    posix_spawn_file_actions_destroy(&quiet);
+    if (spawned != 0) return false;
     int status = 0;
     waitpid(child, &status, 0);
     std::string const json = qortest::read_file(report);
@@ -100,24 +106,8 @@ bool child_passes(char const *_filter, char const *_backend) {
 } // namespace
 
 // ---------------------------------------------------------------------------------------------
-// Entry points and backend
+// Backend
 // ---------------------------------------------------------------------------------------------
-
-TEST(MemoryManagerEntryPoints, AllSeventeenAreFoundByTheirCNames) {
-    void *module = dlopen("libqorMemoryManager.so", RTLD_NOW | RTLD_LOCAL);
-    ASSERT_NE(nullptr, module) << dlerror();
-    std::istringstream names(
-        "MMHeapCreate MMHeapSelect MMAllocate MMDeallocate MMExpand MMGetBlockSize "
-        "MMGetMemoryStatus MMGetStatsForModules MMCheckMemoryCorrupt MMGetMemoryBlockStatus "
-        "MMDumpMemoryStats MMSmallAlloc MMSmallRealloc MMSmallFree MMSmallMsize "
-        "MMGetFixedPool MMReleaseFixedPool");
-    int found = 0;
-    for (std::string name; names >> name; ++found)
-        EXPECT_NE(nullptr, dlsym(module, name.c_str())) << name;
-    EXPECT_EQ(17, found);
-    EXPECT_EQ(reinterpret_cast<void *>(&MMAllocate), dlsym(module, "MMAllocate"));
-    dlclose(module);
-}
 
 TEST(MemoryManagerBackend, IsTheOneTheEnvironmentNames) {
     std::string const expected = is_system_backend() ? "backend system," : "backend mimalloc,";
@@ -147,15 +137,12 @@ TEST(MemoryManagerHeaps, BlocksAreCountedOnTheHeapThatMadeThem) {
     ASSERT_TRUE(p_a && p_b1 && p_b2);
     EXPECT_EQ((std::vector<uint64_t>{1, 0, MMGetBlockSize(p_a)}), counts(a));
     EXPECT_EQ((std::vector<uint64_t>{2, 0, is_system_backend() ? 80 : counts(b)[2]}), counts(b));
-    SMMHeapStats sum = {};
-    for (SMMHeapStats const &stats : all_heap_stats()) {
-        sum.m_allocations += stats.m_allocations;
-        sum.m_deallocations += stats.m_deallocations;
-        sum.m_live_bytes += stats.m_live_bytes;
-    }
+    std::vector<uint64_t> sum(3); // of every heap's record
+    for (int heap = 0; heap < MMGetStatsForModules(nullptr, 0); ++heap)
+        for (size_t i = 0; i < 3; ++i)
+            sum[i] += counts(heap)[i];
     SMMHeapStats const total = totals();
-    EXPECT_EQ((std::vector<uint64_t>{sum.m_allocations, sum.m_deallocations, sum.m_live_bytes}),
-              (std::vector<uint64_t>{total.m_allocations, total.m_deallocations, total.m_live_bytes}));
+    EXPECT_EQ(sum, (std::vector<uint64_t>{total.m_allocations, total.m_deallocations, total.m_live_bytes}));
     EXPECT_EQ(-1, total.m_heap);
     EXPECT_EQ(0, MMGetMemoryStatus(nullptr));
 
@@ -170,18 +157,13 @@ TEST(MemoryManagerHeaps, BlocksAreCountedOnTheHeapThatMadeThem) {
     EXPECT_EQ((std::vector<uint64_t>{2, 2, 0}), counts(b));
 }
 
+// An id that names no heap allocates on one default heap, made once.
 TEST(MemoryManagerHeaps, AllocationWithoutAValidSelectionUsesOneDefaultHeap) {
-    int const heaps_before = MMGetStatsForModules(nullptr, 0);
     MMHeapSelect(-1);
     void *p_first = MMAllocate(16, 0);
-    int const heaps_after_first = MMGetStatsForModules(nullptr, 0);
-    MMHeapSelect(heaps_after_first + 100);
-    void *p_second = MMAllocate(16, 0);
-    MMHeapSelect(-1);
-    void *p_third = MMAllocate(16, 0);
-    ASSERT_TRUE(p_first && p_second && p_third);
-    EXPECT_LE(heaps_after_first, heaps_before + 1);
-    EXPECT_EQ(heaps_after_first, MMGetStatsForModules(nullptr, 0));
+    int const heaps = MMGetStatsForModules(nullptr, 0);
+    void *p_second = allocate_on(heaps + 100, 16), *p_third = allocate_on(-1, 16);
+    EXPECT_EQ(heaps, MMGetStatsForModules(nullptr, 0));
     EXPECT_EQ(1, MMGetMemoryBlockStatus(p_second));
     for (void *p : {p_first, p_second, p_third})
         MMDeallocate(p);
@@ -283,17 +265,17 @@ TEST(MemoryManagerChecks, SmallAllocationsAreCountedProcessWideAndKeepTheirConte
     EXPECT_EQ(0u, MMSmallMsize(nullptr));
 }
 
+// Blocks of two heaps freed out of order leave nothing the check finds corrupt.
 TEST(MemoryManagerChecks, NothingIsCorruptAfterOrdinaryUse) {
-    int const a = new_heap(), b = new_heap();
+    int const heaps[] = {new_heap(), new_heap()};
     std::vector<void *> blocks;
     for (int i = 0; i < 200; ++i)
-        blocks.push_back(allocate_on(i % 2 ? a : b, size_t(16 + i * 8)));
-    for (size_t i = 0; i < blocks.size(); i += 3)
-        MMDeallocate(blocks[i]);
-    EXPECT_NE(0, MMCheckMemoryCorrupt());
-    for (size_t i = 0; i < blocks.size(); ++i)
-        if (i % 3) MMDeallocate(blocks[i]);
-    EXPECT_NE(0, MMCheckMemoryCorrupt());
+        blocks.push_back(allocate_on(heaps[i % 2], size_t(16 + i * 8)));
+    for (size_t i : {size_t(0), size_t(1), size_t(2)})
+        for (size_t k = i; k < blocks.size(); k += 3) {
+            MMDeallocate(blocks[k]);
+            EXPECT_NE(0, MMCheckMemoryCorrupt());
+        }
 }
 
 TEST(MemoryManagerChecks, BlockFreedBehindTheManagersBackIsFound) {

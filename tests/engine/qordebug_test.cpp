@@ -56,7 +56,7 @@ TEST_F(QordebugTest, HandlerReceivesTheFormattedTextOfEachKind) {
 TEST_F(QordebugTest, TextIsCutToTheBufferAndHandlersHandTheirPredecessorBack) {
     warning("%s", std::string(10000, 'x').c_str());
     ASSERT_EQ(1u, m_reports.size());
-    EXPECT_EQ(std::string(4095, 'x'), m_reports[0].second); // 4 KiB with its terminator
+    EXPECT_EQ(std::string(4095, 'x'), m_reports[0].second);   // 4 KiB with its terminator
     EXPECT_EQ(0u, report_count(static_cast<EReportKind>(3))); // no kind outside the three
 
     int user = 0;

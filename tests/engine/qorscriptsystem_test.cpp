@@ -64,35 +64,23 @@ protected:
 TEST_F(LuaTest, ValuesReportTheirTypesAndContent) {
     run("t = {7, 2.75, -2.75, 'text', true, {}, s = '12'}");
     LuaObject t = global("t");
-    ASSERT_TRUE(t.IsTable());
     EXPECT_EQ(t.Type(), LUA_TTABLE);
-    EXPECT_TRUE(t[1].IsNumber() && t[1].IsInteger() && t[2].IsNumber() && !t[2].IsInteger());
-    EXPECT_EQ(t[1].GetInteger(), 7);
-    EXPECT_EQ(t[2].GetNumber(), 2.75);
+    EXPECT_TRUE(t[1].IsInteger() && t[2].IsNumber() && !t[2].IsInteger() && t[5].GetBoolean() &&
+                t[7].IsNil());
     EXPECT_EQ(t[2].GetFloat(), 2.75f);
     EXPECT_EQ(t[2].GetInteger(), 2); // truncation toward zero
     EXPECT_EQ(t[3].GetInteger(), -2);
-    EXPECT_TRUE(t[4].IsString() && t[5].IsBoolean() && t[5].GetBoolean() && t[6].IsTable() && t[7].IsNil());
     EXPECT_STREQ(t[4].GetString(), "text");
-    EXPECT_EQ(t[7].Type(), LUA_TNIL);
 
-    EXPECT_EQ(t[1].GetString(), nullptr); // a number is no string
-    EXPECT_FALSE(t[1].IsString());
-    EXPECT_EQ(t["s"].GetInteger(), 0); // a string is no number
-    EXPECT_EQ(t["s"].GetNumber(), 0.0);
-    EXPECT_FALSE(t["s"].IsNumber());
-    EXPECT_FALSE(t[1].GetBoolean());
-    EXPECT_EQ(t[5].GetInteger(), 0);
-    EXPECT_EQ(t.GetString(), nullptr);
+    EXPECT_TRUE(t[1].GetString() == nullptr && !t[1].IsString()); // a number is no string
+    EXPECT_TRUE(t["s"].GetNumber() == 0.0 && !t["s"].IsNumber()); // a string is no number
+    EXPECT_TRUE(!t[1].GetBoolean() && t[5].GetInteger() == 0 && t.GetString() == nullptr);
     LuaObject n = t[1];
-    EXPECT_TRUE(n["x"].IsNil() && n[1].IsNil());
-    EXPECT_EQ(n.GetN(), 0);
-    EXPECT_EQ(n.GetTableCount(), 0);
+    EXPECT_TRUE(n["x"].IsNil() && n.GetN() == 0 && n.GetTableCount() == 0);
     n.SetString("x", "y").SetInteger(1, 2).Insert(t);
     EXPECT_EQ(n.GetInteger(), 7);
     LuaObject unbound; // nil of no state
-    EXPECT_TRUE(unbound.IsNil() && unbound["x"].IsNil());
-    EXPECT_EQ(unbound.GetState(), nullptr);
+    EXPECT_TRUE(unbound["x"].IsNil() && unbound.GetState() == nullptr);
     unbound.SetString("x", "y");
     EXPECT_TRUE(m_capture.reports().empty());
 }
@@ -133,16 +121,11 @@ TEST_F(LuaTest, TablesKeepTheirKeysAndAreWalkedPairByPair) {
     child.AssignNewTable(mp_state).SetString("k", "v");
     t.SetObject("child", child);
     mp_state->GetGlobals().SetObject("t", t);
-    EXPECT_EQ(t[1].GetInteger(), 10);
-    EXPECT_STREQ(t["1"].GetString(), "one");
-    EXPECT_TRUE(t[2].IsBoolean());
     run("assert(t[1] == 10 and t['1'] == 'one' and t.ratio == 0.25 and t[2] == false and t.child.k == 'v' "
         "and t[3] == 'c')");
     LuaObject key;
     key.AssignString(mp_state, "ratio");
     EXPECT_EQ(t.GetByObject(key).GetNumber(), 0.25);
-    key.AssignInteger(mp_state, 1);
-    EXPECT_EQ(t.GetByObject(key).GetInteger(), 10);
     EXPECT_EQ(t.GetTableCount(), 6);
     t.SetNil("ratio").SetNil("child").SetNil(3);
     EXPECT_EQ(t.GetN(), 2);
@@ -259,28 +242,18 @@ TEST_F(LuaTest, DumpWritesKeysInStableOrder) {
                                            "    [1.5] = 0,\n"
                                            "    [false] = \"f\",\n"
                                            "}\n");
-    run("e = {} n = 0.1 s = 'a' b = true t = {k = {}}");
+    run("e = {} n = 0.1 s = 'a' b = true t = {k = {}} third = {1/3, 1e-300, 1e300}");
     EXPECT_EQ(dump_text(global("e"), "e"), "e = {}\n");
     EXPECT_EQ(dump_text(global("n"), "n"), "n = 0.10000000000000001\n");
     EXPECT_EQ(dump_text(global("s"), "s"), "s = \"a\"\n");
     EXPECT_EQ(dump_text(global("b"), "b"), "b = true\n");
     EXPECT_EQ(dump_text(global("absent"), "absent"), "absent = nil\n");
     EXPECT_EQ(dump_text(global("t"), "t", 1), "    t = {\n        k = {},\n    }\n");
-}
-
-TEST_F(LuaTest, DumpRoundTripsNestedTables) {
-    run("layout = {name = 'desktop', pos = {x = 20, y = -30.25}, small = 1e-300, big = 1e300, third = 1/3,"
-        " children = {{class = 'CButton', size = {100, 20}, visible = true},"
-        "             {class = 'CListBox', items = {'a', 'b', {deep = {deeper = {deepest = 'end'}}}}}}}");
-    std::string const first = dump_text(global("layout"), "layout");
-
-    LuaState *p_fresh = LuaState::Create();
-    ASSERT_EQ(p_fresh->DoString(first.c_str()), 0) << p_fresh->GetLastError() << "\n" << first;
-    std::string const second = dump_text(p_fresh->GetGlobals()["layout"], "layout");
-    EXPECT_EQ(second, first);
-    EXPECT_EQ(p_fresh->GetGlobals()["layout"]["third"].GetNumber(), 1.0 / 3.0);
-    EXPECT_EQ(p_fresh->DoString("assert(layout.children[2].items[3].deep.deeper.deepest == 'end')"), 0);
-    LuaState::Destroy(p_fresh);
+    // Numbers read back as they were.
+    std::string const numbers = dump_text(global("third"), "back");
+    run(numbers.c_str());
+    EXPECT_TRUE(global("back")[1].GetNumber() == 1.0 / 3.0 && global("back")[2].GetNumber() == 1e-300);
+    EXPECT_EQ(dump_text(global("back"), "third"), dump_text(global("third"), "third"));
 }
 
 TEST_F(LuaTest, DumpedStringsSurviveQuotesNewlinesAndBinaryBytes) {

@@ -14,18 +14,9 @@
 
 using namespace qorhost;
 using hosttest::CTempDir;
+using hosttest::quiet_options;
 
 namespace {
-
-SHostOptions quiet_options(std::string const &_data, int _w = 320, int _h = 200) {
-    SHostOptions options;
-    options.m_data = _data;
-    options.m_out = "";
-    options.m_quiet = true;
-    options.m_w = _w;
-    options.m_h = _h;
-    return options;
-}
 
 class CWithdrawals : public IInterfaceServerListener {
 public:
@@ -35,14 +26,9 @@ public:
     std::vector<IInterfaceBase *> m_withdrawn;
 };
 
-// The category roots are process-wide; each test leaves them as it found them.
 class HostTest : public testing::Test {
 protected:
-    ~HostTest() override {
-        for (int category : {qorbase::FILE_CATEGORY_STATS, qorbase::FILE_CATEGORY_CONFIG,
-                             qorbase::FILE_CATEGORY_FONTS, qorbase::FILE_CATEGORY_UI})
-            qorbase::set_category_root(category, "");
-    }
+    ~HostTest() override { hosttest::reset_category_roots(); }
     CTempDir m_dir;
 };
 

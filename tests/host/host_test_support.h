@@ -1,8 +1,11 @@
-// What the host's tests share: a temporary folder for the files a test makes, little-endian
-// byte writers for those files, WAV files, a record of input, and a readable print of colours.
+// What the host's tests share: a temporary folder for the files a test makes, quiet hosts and the
+// category roots they set, little-endian byte writers, WAV files, a record of input, and a
+// readable print of colours.
 #pragma once
+#include "host.h"
 #include "input_system.h"
 #include "qor_math.h"
+#include "qorbase.h"
 #include "test_common.h"
 
 #include <cstdint>
@@ -37,6 +40,24 @@ private:
     std::string m_path = qortest::make_temp_dir();
 };
 
+// A host on the data folder that prints nothing and writes no output.
+inline qorhost::SHostOptions quiet_options(std::string const &_data, int _w = 320, int _h = 200) {
+    qorhost::SHostOptions options;
+    options.m_data = _data;
+    options.m_out = "";
+    options.m_quiet = true;
+    options.m_w = _w;
+    options.m_h = _h;
+    return options;
+}
+
+// The category roots are process-wide: a test that sets them, or runs a host, puts them back.
+inline void reset_category_roots() {
+    for (int category : {qorbase::FILE_CATEGORY_STATS, qorbase::FILE_CATEGORY_CONFIG,
+                         qorbase::FILE_CATEGORY_FONTS, qorbase::FILE_CATEGORY_UI})
+        qorbase::set_category_root(category, "");
+}
+
 // Every input a listener hears, as a line of text ("<name> key_down 0xC0 0", codes of keys and
 // characters in hexadecimal) in a list that the listeners of a test may share; then its action.
 class CInputRecord : public IPointerListener, public IKeyListener {
@@ -67,31 +88,16 @@ private:
     std::string m_prefix;
 };
 
-inline bytes_t read_bytes(std::string const &_path) {
-    std::string const content = qortest::read_file(_path);
-    return bytes_t(content.begin(), content.end());
-}
-
-inline void put_u16(bytes_t &_out, unsigned _value) {
-    _out.push_back(static_cast<uint8_t>(_value & 0xFF));
-    _out.push_back(static_cast<uint8_t>((_value >> 8) & 0xFF));
-}
-
-inline void put_u32(bytes_t &_out, uint32_t _value) {
-    put_u16(_out, _value & 0xFFFF);
-    put_u16(_out, _value >> 16);
-}
-
-inline void put_text(bytes_t &_out, char const *_text) {
-    for (char const *p = _text; *p; ++p)
-        _out.push_back(static_cast<uint8_t>(*p));
+// Appends the value's low _bytes bytes, least significant first.
+inline void put(bytes_t &_out, uint32_t _value, int _bytes) {
+    for (int i = 0; i < _bytes; ++i)
+        _out.push_back(static_cast<uint8_t>(_value >> (8 * i)));
 }
 
 // A RIFF chunk, padded to an even size.
 inline bytes_t chunk(char const *_id, bytes_t const &_payload) {
-    bytes_t out;
-    put_text(out, _id);
-    put_u32(out, static_cast<uint32_t>(_payload.size()));
+    bytes_t out(_id, _id + 4);
+    put(out, static_cast<uint32_t>(_payload.size()), 4);
     out.insert(out.end(), _payload.begin(), _payload.end());
     if (_payload.size() & 1) out.push_back(0);
     return out;
@@ -100,33 +106,26 @@ inline bytes_t chunk(char const *_id, bytes_t const &_payload) {
 // A WAV "fmt " chunk; format 1 is PCM.
 inline bytes_t format_chunk(unsigned _format, unsigned _bits, unsigned _channels = 1,
                             unsigned _rate = 22050) {
+    uint32_t const fields[] = {
+        _format, _channels, _rate, _rate * _channels * _bits / 8, _channels * _bits / 8, _bits};
     bytes_t payload;
-    put_u16(payload, _format);
-    put_u16(payload, _channels);
-    put_u32(payload, _rate);
-    put_u32(payload, _rate * _channels * _bits / 8);
-    put_u16(payload, _channels * _bits / 8);
-    put_u16(payload, _bits);
+    for (int i = 0; i < 6; ++i)
+        put(payload, fields[i], i == 2 || i == 3 ? 4 : 2);
     return chunk("fmt ", payload);
 }
 
 inline bytes_t wave(std::vector<bytes_t> const &_chunks) {
-    bytes_t body;
-    put_text(body, "WAVE");
+    bytes_t body = {'W', 'A', 'V', 'E'};
     for (bytes_t const &c : _chunks)
         body.insert(body.end(), c.begin(), c.end());
-    bytes_t out;
-    put_text(out, "RIFF");
-    put_u32(out, static_cast<uint32_t>(body.size()));
-    out.insert(out.end(), body.begin(), body.end());
-    return out;
+    return chunk("RIFF", body);
 }
 
 // A PCM WAV of 16-bit samples, interleaved when there are more channels.
 inline bytes_t wave16(std::vector<int> const &_samples, unsigned _channels = 1, unsigned _rate = 22050) {
     bytes_t data;
     for (int sample : _samples)
-        put_u16(data, static_cast<uint16_t>(static_cast<int16_t>(sample)));
+        put(data, static_cast<uint16_t>(static_cast<int16_t>(sample)), 2);
     return wave({format_chunk(1, 16, _channels, _rate), chunk("data", data)});
 }
 

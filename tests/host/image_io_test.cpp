@@ -21,8 +21,8 @@ enum { TGA_RAW = 2, TGA_RLE = 10 };
 
 bytes_t tga_header(int _type, int _w, int _h, int _bits, bool _top_origin) {
     bytes_t out = {3, 0, static_cast<uint8_t>(_type), 0, 0, 0, 0, 0, 0, 0, 0, 0};
-    hosttest::put_u16(out, _w);
-    hosttest::put_u16(out, _h);
+    hosttest::put(out, _w, 2);
+    hosttest::put(out, _h, 2);
     out.insert(out.end(),
                {static_cast<uint8_t>(_bits),
                 static_cast<uint8_t>((_bits == 32 ? 8 : 0) | (_top_origin ? 0x20 : 0)), 'i', 'd', '!'});
@@ -125,7 +125,7 @@ TEST(Image, PngOfOneThreeOrFourChannelsBecomesRgbaAndRoundTrips) {
     EXPECT_EQ(k_abc_def, colours(image));
     EXPECT_EQ(2, image.m_h);
 
-    bytes_t const png = hosttest::read_bytes(dir.file("rgba.png"));
+    std::string const png = qortest::read_file(dir.file("rgba.png"));
     expect_load_fails(dir.write("half.png", bytes_t(png.begin(), png.begin() + png.size() / 2)));
     expect_load_fails(dir.file("nothere.png"));
     expect_load_fails(dir.write("text.png", {'h', 'e', 'l', 'l', 'o', '\n'}));

@@ -137,7 +137,7 @@ TEST(InterfaceServer, WithdrawalTellsListenersWhileTheInterfaceIsStillThereNewes
 
 TEST(InterfaceServer, ListenerRemovedDuringANoticeHearsNothingMore) {
     CInterfaceServer server;
-    CTestInterface a(k_uid_a, 1), b(k_uid_b, 1);
+    CTestInterface a(k_uid_a, 1);
     notice_list_t notices;
     CListener remover("remover", notices), removed("removed", notices), last("last", notices);
     // The first listener takes itself and the next one off the list at the first notice.
@@ -150,18 +150,10 @@ TEST(InterfaceServer, ListenerRemovedDuringANoticeHearsNothingMore) {
     server.add_listener(&last);
 
     server.register_interface(&a);
-    EXPECT_EQ((notice_list_t{{"remover registered", &a}, {"last registered", &a}}), notices);
-    notices.clear();
     server.withdraw_interface(&a);
-    EXPECT_EQ((notice_list_t{{"last withdrawn", &a}}), notices);
+    EXPECT_EQ((notice_list_t{{"remover registered", &a}, {"last registered", &a}, {"last withdrawn", &a}}),
+              notices);
 
-    // The same during a withdrawal.
-    server.register_interface(&b);
-    notices.clear();
-    server.add_listener(&remover);
-    server.add_listener(&removed);
-    server.withdraw_interface(&b);
-    EXPECT_EQ((notice_list_t{{"last withdrawn", &b}, {"remover withdrawn", &b}}), notices);
     EXPECT_EQ(1u, server.get_listeners_count());
 }
 

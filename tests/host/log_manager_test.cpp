@@ -11,44 +11,24 @@ using namespace qorhost;
 
 namespace {
 
-struct SCopiedMessage {
-    std::u16string m_text;
-    uint32_t m_level;
-    uint32_t m_index;
-
-    bool operator==(SCopiedMessage const &_o) const {
-        return m_text == _o.m_text && m_level == _o.m_level && m_index == _o.m_index;
-    }
-};
-
-void PrintTo(SCopiedMessage const &_m, std::ostream *_p_out) {
-    *_p_out << "#" << _m.m_index << " level " << _m.m_level << " '" << utf16_to_utf8(_m.m_text) << "'";
-}
-
-// Copies what it is handed, as a reader of the log must.
+// Copies what it is handed, as a reader of the log must: "#index level 'text'".
 class CCopyingVisitor : public ILogMessageVisitor {
 public:
     void on_message(SLogMessage const &_message) override {
         std::u16string text;
         for (unsigned short const *p = _message.mp_text; *p; ++p)
             text += static_cast<char16_t>(*p);
-        m_messages.push_back(SCopiedMessage{text, _message.m_level, _message.m_index});
+        m_messages.push_back("#" + std::to_string(_message.m_index) + " " + std::to_string(_message.m_level) +
+                             " '" + utf16_to_utf8(text) + "'");
     }
 
-    std::vector<SCopiedMessage> m_messages;
+    std::vector<std::string> m_messages;
 };
 
-std::vector<SCopiedMessage> read(CLogManager &_log, unsigned _first, int _count) {
+std::vector<std::string> read(CLogManager &_log, unsigned _first, int _count) {
     CCopyingVisitor visitor;
     _log.get_messages(visitor, _first, _count);
     return visitor.m_messages;
-}
-
-std::vector<uint32_t> indices(std::vector<SCopiedMessage> const &_messages) {
-    std::vector<uint32_t> result;
-    for (SCopiedMessage const &message : _messages)
-        result.push_back(message.m_index);
-    return result;
 }
 
 class LogManagerTest : public testing::Test {
@@ -84,7 +64,7 @@ TEST_F(LogManagerTest, LoggersByNameAndMessagesWithRunningIndices) {
     p_a->write(static_cast<char const *>(nullptr), 0); // nothing
     p_b->write(static_cast<unsigned short const *>(nullptr), 0);
     EXPECT_EQ(3u, m_log.get_next_index());
-    EXPECT_EQ((std::vector<SCopiedMessage>{{u"first", 0, 0}, {u"sec\u00E9", 1, 1}, {u"", 2, 2}}),
+    EXPECT_EQ((std::vector<std::string>{"#0 0 'first'", "#1 1 'sec\xC3\xA9'", "#2 2 ''"}),
               read(m_log, 0, -1));
     EXPECT_EQ("sec\xC3\xA9", m_log.get_message_text(1));
     EXPECT_EQ("", m_log.get_message_text(3));
@@ -97,15 +77,14 @@ TEST_F(LogManagerTest, OnlyTheNewestMessagesAreKeptAndReadFromAnIndex) {
     for (unsigned i = 0; i < total; ++i)
         p_a->write(std::to_string(i).c_str(), i % 3);
     EXPECT_EQ(total, m_log.get_next_index());
-    EXPECT_EQ((std::vector<SCopiedMessage>{{u"5", 2, 5}, {u"6", 0, 6}}), read(m_log, 0, 2));
-    EXPECT_EQ((std::vector<uint32_t>{total - 3, total - 2, total - 1}), indices(read(m_log, total - 3, -1)));
-    EXPECT_EQ((std::vector<uint32_t>{7, 8}), indices(read(m_log, 7, 2)));
-    EXPECT_EQ(size_t(1), read(m_log, total - 1, 10).size());
-    EXPECT_TRUE(read(m_log, total, -1).empty());
-    EXPECT_TRUE(read(m_log, 7, 0).empty());
+    std::string const last = std::to_string(total - 1); // of level 4100 % 3 = 2
+    EXPECT_EQ((std::vector<std::string>{"#5 2 '5'", "#6 0 '6'"}), read(m_log, 0, 2));
+    EXPECT_EQ((std::vector<std::string>{"#7 1 '7'", "#8 2 '8'"}), read(m_log, 7, 2));
+    EXPECT_EQ(std::vector<std::string>{"#" + last + " 2 '" + last + "'"}, read(m_log, total - 1, 10));
+    EXPECT_TRUE(read(m_log, total, -1).empty() && read(m_log, 7, 0).empty());
     EXPECT_EQ(size_t(CLogManager::MAX_MESSAGES), read(m_log, 0, -1).size());
     EXPECT_EQ("", m_log.get_message_text(4));
-    EXPECT_EQ(std::to_string(total - 1), m_log.get_message_text(total - 1));
+    EXPECT_EQ(last, m_log.get_message_text(total - 1));
 }
 
 TEST(LogManagerPrint, MessagesArePrintedWithTheLoggersPrefixUnlessQuiet) {

@@ -164,6 +164,15 @@ TEST_F(SoftwareRendererTest, TexturesAreLookedForInTheFoldersInOrderAndAMissingO
                        {'M', rgba_t(255, 0, 255, 255)},
                        {'#', rgba_t(0, 0, 0, 255)}}));
     EXPECT_EQ((std::vector<std::string>{"Cannot load texture 'nothere.tga'"}), m_reports.warnings());
+
+    // Corners far outside and texture coordinates that aren't numbers still cover the frame.
+    m_renderer.begin_frame(k_clear);
+    float const nan = std::nanf("");
+    for (float const far : {1e30f, 1e6f})
+        m_renderer.draw_quad(vec2_t{-far, far}, vec2_t{nan, nan}, k_white, vec2_t{-far, -far}, vec2_t{nan, 1},
+                             k_white, vec2_t{far, -far}, vec2_t{1, nan}, k_white, vec2_t{far, far},
+                             vec2_t{far, -far}, k_white);
+    EXPECT_NE(k_clear, pixel(0, 7));
 }
 
 TEST_F(SoftwareRendererTest, ColourUnknownAndDestroyedMaterialsDrawTheVertexColour) {
@@ -221,8 +230,8 @@ TEST_F(SoftwareRendererTest, LinesRunFromCentreToCentreOnePixelPerStepInsideTheC
     m_renderer.begin_frame(k_clear);
     m_renderer.draw_line(at(0.5f, 0.5f), k_white, at(7.5f, 7.5f), k_white, 1.0f);
     m_renderer.draw_line(at(7.5f, 0.5f), k_white, at(7.5f, 4.5f), k_white, 1.0f);
-    m_renderer.set_clip_rect(vec2_t{-0.5f, -1}, vec2_t{1, 2}); // columns 2 to 5
-    m_renderer.draw_line(at(-40.5f, 6.5f), k_white, at(60.5f, 6.5f), k_white, 3.0f);
+    m_renderer.set_clip_rect(vec2_t{-0.5f, -1}, vec2_t{1, 2});                     // columns 2 to 5
+    m_renderer.draw_line(at(-4e8f, 6.5f), k_white, at(4e8f, 6.5f), k_white, 3.0f); // from far outside
     EXPECT_EQ((rows_t{"#......#", ".#.....#", "..#....#", "...#...#", "....#..#", ".....#..", "..#####.",
                       ".......#"}),
               picture({{'#', k_white}}));

@@ -1,5 +1,5 @@
-// The host's sound system: which files are PCM WAV, sources from the interface data with their
-// state, volume and looping, and missing or broken files reported without a source.
+// The host's sound system: which files are PCM WAV, sources from the interface data counted as
+// they start and go, and missing or broken files reported without a source.
 #include "host_test_support.h"
 #include "qorbase.h"
 #include "sound_system.h"
@@ -57,19 +57,10 @@ TEST(SoundSystem, SourcesComeFromWaveFilesOfTheInterfaceData) {
     dir.write("sounds/click.wav", wave({format_chunk(1, 16), chunk("data", k_samples)}));
     std::unique_ptr<ISoundSource> p_source(sound.create_sound("sounds/click.wav", SOUND_GROUP_UI, 0));
     ASSERT_NE(nullptr, p_source);
-    CSoundSource &source = static_cast<CSoundSource &>(*p_source);
-    EXPECT_EQ(SOUND_GROUP_UI, source.get_group());
-    EXPECT_EQ(SOUND_STATE_RESET, source.get_state());
-    source.set_state(SOUND_STATE_START, 250.0f);
-    EXPECT_FLOAT_EQ(250.0f, source.get_state_time());
-    source.set_state(SOUND_STATE_STOP, 100.0f);
-    EXPECT_EQ(SOUND_STATE_STOP, source.get_state());
-    source.set_state(SOUND_STATE_START, 0.0f);
+    p_source->set_state(SOUND_STATE_START, 250.0f);
+    p_source->set_state(SOUND_STATE_STOP, 100.0f);
+    p_source->set_state(SOUND_STATE_START, 0.0f);
     EXPECT_EQ(2u, sound.get_started());
-    source.set_volume(0.25f);
-    source.set_looping(true);
-    EXPECT_FLOAT_EQ(0.25f, source.get_volume(0));
-    EXPECT_TRUE(source.is_looping());
     EXPECT_EQ(1u, sound.get_live_sources());
     p_source.reset();
     EXPECT_EQ(0u, sound.get_live_sources());
